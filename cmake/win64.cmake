@@ -1,0 +1,6 @@
+# The same source for 64-bit Windows, which every Wine can run.
+set(CMAKE_SYSTEM_NAME Windows)
+set(CMAKE_SYSTEM_PROCESSOR x86_64)
+set(CMAKE_C_COMPILER x86_64-w64-mingw32-gcc-win32)
+set(CMAKE_CXX_COMPILER x86_64-w64-mingw32-g++-win32)
+set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)

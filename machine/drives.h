@@ -1,0 +1,36 @@
+// Drives and paths: where C:\a\b lies on the host.
+#pragma once
+
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace machine {
+
+struct Location {
+  char drive = 0;                  // upper-case letter
+  std::filesystem::path host;      // host path; its last element keeps the case on disk, or the
+                                   // case given when there is none
+  bool isRoot = false;             // the drive itself
+  bool isImage = false;            // the running program's file
+  bool exists = false;             // something stands there
+  bool parentExists = false;       // and is a directory
+  size_t dosLength = 0;            // characters of the full DOS path, for the length limits
+};
+
+// Where a path of the program leads. nullopt for a path that exists nowhere and can't be made: a
+// missing drive, a bad name, a device name, too long a path, a way out of the machine's folder.
+std::optional<Location> Locate(std::string_view dosPath);
+
+// Host path of an existing file, for readers that need no Win32 handle (version data).
+std::optional<std::filesystem::path> LocateFile(std::string_view dosPath);
+
+// Full DOS path of the running program, "" when there is none.
+std::string ImagePath();
+
+// Called by Start and Stop.
+void OpenDrives(const std::filesystem::path& folder, const std::filesystem::path& image);
+void CloseDrives();
+
+}  // namespace machine

@@ -1,0 +1,29 @@
+// Resources of an executable file: a Windows program (PE, 32 or 64 bits), or a native stub (ELF),
+// which carries the same resources as a .res file in its section ".moriv_res".
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace machine {
+
+inline constexpr char kNativeResourceSection[] = ".moriv_res";
+
+// Bytes of the file's version resource (RT_VERSION), whichever kind of executable it is. nullopt for
+// a file that is none, has none, or is damaged: every offset is checked before it is followed.
+std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& file);
+
+// A value of a version resource, as VerQueryValueA knows it: path "\\VarFileInfo\\Translation" (raw
+// bytes), "\\StringFileInfo\\040c04b0\\FileVersion" (8-bit text of the code page, without its NUL),
+// "\\" (VS_FIXEDFILEINFO). Names compare without regard to case.
+std::optional<std::vector<uint8_t>> QueryVersion(const std::vector<uint8_t>& resource,
+                                                 const std::string& path);
+
+// A resource by numbers in the .res bytes that this program carries: type (6 strings, 14 icon
+// group, 16 version ...), id. Language-neutral entries first. nullopt when there is none.
+std::optional<std::vector<uint8_t>> OwnResource(int type, int id);
+
+}  // namespace machine

@@ -1,0 +1,47 @@
+// What machine.ini says of a stand-in machine.
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <map>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "platform/win32.h"
+
+namespace machine {
+
+// One line of [faults]. `fail` makes calls fail; `stop` ends the process at the call.
+struct Fault {
+  std::string function;       // a function of the seam, by its Win32 name
+  int call = 1;               // counted from 1
+  bool fromThenOn = false;    // this call and all later ones
+  bool stop = false;
+  DWORD error = ERROR_ACCESS_DENIED;
+};
+
+// One [disk X].
+struct DiskSettings {
+  uint64_t freeBytes = uint64_t{10} << 30;  // free to the caller
+  std::optional<uint64_t> writable;         // bytes that can still be written before it is full
+  bool readOnly = false;
+};
+
+struct Settings {
+  bool ntFamily = true;  // else the 9x family
+  LANGID language = 0x0409;
+  int codePage = 1252;
+  std::string windowsDirectory = "C:\\windows";
+  std::string systemDirectory = "C:\\windows\\system32";
+  std::optional<SYSTEMTIME> now;  // else the real local time
+  std::map<char, DiskSettings> disks;  // by upper-case drive letter; a drive without one has the defaults
+  bool hasGetDiskFreeSpaceEx = true;
+  std::vector<Fault> faults;
+};
+
+// Reads a machine.ini. A missing file leaves the defaults. On bad input (an unknown section or key,
+// a value out of its form) returns false with one line in `error` that names file, line and key.
+bool ReadSettings(const std::filesystem::path& file, Settings* settings, std::string* error);
+
+}  // namespace machine
