@@ -9,14 +9,15 @@
 namespace machine {
 
 struct Location {
-  char drive = 0;                  // upper-case letter
-  std::filesystem::path host;      // host path; its last element keeps the case on disk, or the
-                                   // case given when there is none
-  bool isRoot = false;             // the drive itself
-  bool isImage = false;            // the running program's file
-  bool exists = false;             // something stands there
-  bool parentExists = false;       // and is a directory
-  size_t dosLength = 0;            // characters of the full DOS path, for the length limits
+  char drive = 0;                // upper-case letter
+  std::filesystem::path host;    // host path; its last element keeps the case on disk, or the
+                                 // case given when there is none
+  bool isRoot = false;           // the drive itself
+  bool isImage = false;          // the running program's file
+  bool exists = false;           // something stands there
+  bool parentExists = false;     // and is a directory
+  bool endsInSeparator = false;  // only a directory can stand there
+  size_t dosLength = 0;          // characters of the full DOS path, for the length limits
 };
 
 // Where a path of the program leads. nullopt for a path that exists nowhere and can't be made: a
@@ -25,6 +26,10 @@ std::optional<Location> Locate(std::string_view dosPath);
 
 // Host path of an existing file, for readers that need no Win32 handle (version data).
 std::optional<std::filesystem::path> LocateFile(std::string_view dosPath);
+
+// Whether nothing on the drive can be written, made or deleted: by its settings, or as the drive of
+// the image.
+bool IsReadOnlyDrive(char drive);
 
 // Full DOS path of the running program, "" when there is none.
 std::string ImagePath();

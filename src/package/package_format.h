@@ -15,17 +15,17 @@
 inline constexpr char kPackageMagic[] = "MORIV INSTALL DATA HEADER";
 
 struct PackageHeader {
-  uint16_t headerSize;          //   0  always 568
-  char magic[26];               //   2  kPackageMagic with its NUL
-  uint16_t recordCount;         //  28
-  uint16_t removalImageFlag;    //  30  1: every run of this image is a removal
-  uint32_t spaceNeeded;         //  32  bytes on the disk that the installed files need
-  uint32_t packageLength;       //  36  setup image: dataOffset to the end of the file;
-                                //      removal program: recordCount * 696
-  uint32_t dataOffset;          //  40  first FileRecord, and length of the executable
-  char defaultDirectory[260];   //  44
-  int32_t defaultLanguage;      // 304  a language offset, or -1
-  uint8_t reserved[260];        // 308  zero
+  uint16_t headerSize;         //   0  always 568
+  char magic[26];              //   2  kPackageMagic with its NUL
+  uint16_t recordCount;        //  28
+  uint16_t removalImageFlag;   //  30  1: every run of this image is a removal
+  uint32_t spaceNeeded;        //  32  bytes on the disk that the installed files need
+  uint32_t packageLength;      //  36  setup image: dataOffset to the end of the file;
+                               //      removal program: recordCount * 696
+  uint32_t dataOffset;         //  40  first FileRecord, and length of the executable
+  char defaultDirectory[260];  //  44
+  int32_t defaultLanguage;     // 304  a language offset, or -1
+  uint8_t reserved[260];       // 308  zero
 };
 static_assert(sizeof(PackageHeader) == 568 && offsetof(PackageHeader, spaceNeeded) == 32 &&
               offsetof(PackageHeader, defaultDirectory) == 44 &&
@@ -34,17 +34,17 @@ static_assert(sizeof(PackageHeader) == 568 && offsetof(PackageHeader, spaceNeede
 static_assert(sizeof(kPackageMagic) == sizeof(PackageHeader::magic));
 
 struct FileRecord {
-  uint16_t recordSize;          //   0  always 696
-  char fileName[32];            //   2  last element of every target path
-  char destination[260];        //  34  elements separated by ';' (engine/resolver.h)
-  char versionLanguage[128];    // 294  translation, 8 lower-case hexadecimal digits
-  int16_t versionFirst;         // 422  kVersionNotSet when not known, as the two below
-  int16_t versionSecond;        // 424
-  int16_t versionThird;         // 426
-  uint32_t fileSize;            // 428  bytes of the expanded file
-  uint32_t storedSize;          // 432  bytes of the stream behind this record, its magic included;
-                                //      0 in a removal program
-  uint8_t reserved[260];        // 436  zero
+  uint16_t recordSize;        //   0  always 696
+  char fileName[32];          //   2  last element of every target path
+  char destination[260];      //  34  elements separated by ';' (engine/resolver.h)
+  char versionLanguage[128];  // 294  translation, 8 lower-case hexadecimal digits
+  int16_t versionFirst;       // 422  kVersionNotSet when not known, as the two below
+  int16_t versionSecond;      // 424
+  int16_t versionThird;       // 426
+  uint32_t fileSize;          // 428  bytes of the expanded file
+  uint32_t storedSize;        // 432  bytes of the stream behind this record, its magic included;
+                              //      0 in a removal program
+  uint8_t reserved[260];      // 436  zero
 };
 static_assert(sizeof(FileRecord) == 696 && offsetof(FileRecord, destination) == 34 &&
               offsetof(FileRecord, versionLanguage) == 294 &&

@@ -9,7 +9,9 @@
 #ifdef _WIN32
 
 #define WIN32_LEAN_AND_MEAN
+#ifndef NOMINMAX  // the C++ library defines it too
 #define NOMINMAX
+#endif
 #include <windows.h>
 // After windows.h.
 #include <fcntl.h>
@@ -66,7 +68,7 @@ typedef HKEY* PHKEY;
 #define FALSE    0
 #define MAX_PATH 260
 
-#define INVALID_HANDLE_VALUE (reinterpret_cast<HANDLE>(static_cast<intptr_t>(-1)))
+#define INVALID_HANDLE_VALUE     (reinterpret_cast<HANDLE>(static_cast<intptr_t>(-1)))
 
 // Files
 #define GENERIC_READ             0x80000000u
@@ -104,28 +106,28 @@ typedef union {
 typedef ULARGE_INTEGER* PULARGE_INTEGER;
 
 // Registry
-#define HKEY_CLASSES_ROOT   (reinterpret_cast<HKEY>(static_cast<uintptr_t>(0x80000000u)))
-#define HKEY_LOCAL_MACHINE  (reinterpret_cast<HKEY>(static_cast<uintptr_t>(0x80000002u)))
-#define KEY_READ            0x20019u
-#define KEY_WRITE           0x20006u
-#define KEY_ALL_ACCESS      0xF003Fu
-#define REG_SZ              1u
-#define REG_EXPAND_SZ       2u
-#define REG_OPTION_NON_VOLATILE 0u
+#define HKEY_CLASSES_ROOT        (reinterpret_cast<HKEY>(static_cast<uintptr_t>(0x80000000u)))
+#define HKEY_LOCAL_MACHINE       (reinterpret_cast<HKEY>(static_cast<uintptr_t>(0x80000002u)))
+#define KEY_READ                 0x20019u
+#define KEY_WRITE                0x20006u
+#define KEY_ALL_ACCESS           0xF003Fu
+#define REG_SZ                   1u
+#define REG_EXPAND_SZ            2u
+#define REG_OPTION_NON_VOLATILE  0u
 
-#define ERROR_SUCCESS           0
-#define ERROR_FILE_NOT_FOUND    2
-#define ERROR_PATH_NOT_FOUND    3
-#define ERROR_ACCESS_DENIED     5
-#define ERROR_INVALID_HANDLE    6
-#define ERROR_SHARING_VIOLATION 32
-#define ERROR_INVALID_PARAMETER 87
-#define ERROR_DISK_FULL         112
-#define ERROR_NEGATIVE_SEEK     131
-#define ERROR_DIR_NOT_EMPTY     145
-#define ERROR_ALREADY_EXISTS    183
-#define ERROR_MORE_DATA         234
-#define ERROR_NO_MORE_ITEMS     259
+#define ERROR_SUCCESS              0
+#define ERROR_FILE_NOT_FOUND       2
+#define ERROR_PATH_NOT_FOUND       3
+#define ERROR_ACCESS_DENIED        5
+#define ERROR_INVALID_HANDLE       6
+#define ERROR_SHARING_VIOLATION    32
+#define ERROR_INVALID_PARAMETER    87
+#define ERROR_DISK_FULL            112
+#define ERROR_NEGATIVE_SEEK        131
+#define ERROR_DIR_NOT_EMPTY        145
+#define ERROR_ALREADY_EXISTS       183
+#define ERROR_MORE_DATA            234
+#define ERROR_NO_MORE_ITEMS        259
 
 // System
 #define VER_PLATFORM_WIN32_WINDOWS 1u
@@ -155,9 +157,9 @@ struct SYSTEMTIME {
 typedef SYSTEMTIME* LPSYSTEMTIME;
 
 // Windows and messages
-#define WM_SETTEXT 0x000Cu
-#define PM_REMOVE  0x0001u
-#define MB_OK      0u
+#define WM_SETTEXT                 0x000Cu
+#define PM_REMOVE                  0x0001u
+#define MB_OK                      0u
 
 struct POINT {
   LONG x;
@@ -174,12 +176,12 @@ struct MSG {
 typedef MSG* LPMSG;
 
 // The runtime's descriptor layer
-#define _O_RDONLY 0x0000
-#define _O_WRONLY 0x0001
-#define _O_BINARY 0x8000
-#define _SH_DENYNO 0x40
-#define _S_IREAD  0x0100
-#define _S_IWRITE 0x0080
+#define _O_RDONLY                  0x0000
+#define _O_WRONLY                  0x0001
+#define _O_BINARY                  0x8000
+#define _SH_DENYNO                 0x40
+#define _S_IREAD                   0x0100
+#define _S_IWRITE                  0x0080
 
 struct _stat {
   uint16_t st_mode;
@@ -211,7 +213,11 @@ int _write(int descriptor, const void* buffer, unsigned count);
 int32_t _lseek(int descriptor, int32_t offset, int origin);
 int32_t _tell(int descriptor);
 int _close(int descriptor);
+// The runtime gives one name to the function and its record.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wshadow"
 int _stat(const char* name, struct _stat* status);
+#pragma GCC diagnostic pop
 
 DWORD GetModuleFileNameA(HMODULE module, LPSTR buffer, DWORD size);
 HMODULE GetModuleHandleA(LPCSTR name);

@@ -1,0 +1,157 @@
+#include "machine/code_page.h"
+
+#include <iconv.h>
+#include <locale.h>
+#include <wctype.h>
+
+#include <array>
+#include <map>
+#include <unordered_map>
+
+#include "machine/machine.h"
+
+namespace machine {
+namespace {
+
+constexpr char32_t kReplacement = 0xFFFD;
+
+// One single-byte code page, as tables. A lead byte of a double-byte page counts as a byte without
+// a meaning: Windows goes by pairs there.
+struct CodePage {
+  std::array<char16_t, 256> unicode;
+  std::unordered_map<char32_t, unsigned char> bytes;  // the inverse of `unicode`
+  std::array<unsigned char, 256> upper;
+};
+
+// The character of one byte, or the byte's own value where the code page gives it none.
+char16_t CharacterOf(iconv_t converter, unsigned char byte) {
+  if (converter == reinterpret_cast<iconv_t>(-1)) return byte;
+  iconv(converter, nullptr, nullptr, nullptr, nullptr);
+  char in = static_cast<char>(byte);
+  char* inAt = &in;
+  size_t inLeft = 1;
+  char16_t out[2] = {};
+  char* outAt = reinterpret_cast<char*>(out);
+  size_t outLeft = sizeof(out);
+  const size_t result = iconv(converter, &inAt, &inLeft, &outAt, &outLeft);
+  const bool oneUnit = result == 0 && inLeft == 0 && outLeft == sizeof(out) - sizeof(char16_t);
+  return oneUnit ? out[0] : byte;
+}
+
+CodePage MakeCodePage(int number) {
+  CodePage page;
+  const iconv_t converter = iconv_open("UTF-16LE", ("CP" + std::to_string(number)).c_str());
+  for (unsigned byte = 0; byte < 256; ++byte) {
+    const auto index = static_cast<unsigned char>(byte);
+    page.unicode[byte] = byte < 0x80 ? index : CharacterOf(converter, index);
+    page.bytes.emplace(page.unicode[byte], index);
+  }
+  if (converter != reinterpret_cast<iconv_t>(-1)) iconv_close(converter);
+
+  const locale_t locale = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
+  for (unsigned byte = 0; byte < 256; ++byte) {
+    const wint_t character = page.unicode[byte];
+    const wint_t upper = locale != nullptr ? towupper_l(character, locale) : towupper(character);
+    const auto found = page.bytes.find(static_cast<char32_t>(upper));
+    page.upper[byte] = found != page.bytes.end() ? found->second : static_cast<unsigned char>(byte);
+  }
+  if (locale != nullptr) freelocale(locale);
+  return page;
+}
+
+const CodePage& CurrentCodePage() {
+  static std::map<int, CodePage> pages;
+  const int number = CurrentSettings().codePage;
+  auto found = pages.find(number);
+  if (found == pages.end()) found = pages.emplace(number, MakeCodePage(number)).first;
+  return found->second;
+}
+
+void AppendUtf8(char32_t character, std::string* text) {
+  const auto tail = [&](int shift) {
+    text->push_back(static_cast<char>(0x80 | ((character >> shift) & 0x3F)));
+  };
+  if (character < 0x80) {
+    text->push_back(static_cast<char>(character));
+  } else if (character < 0x800) {
+    text->push_back(static_cast<char>(0xC0 | (character >> 6)));
+    tail(0);
+  } else {
+    text->push_back(static_cast<char>(0xE0 | (character >> 12)));
+    tail(6);
+    tail(0);
+  }
+}
+
+// Takes one character off the front of `utf8`, which is not empty. A byte that begins no
+// well-formed sequence is a replacement character of its own.
+char32_t TakeCharacter(std::string_view* utf8) {
+  const auto byteAt = [&](size_t at) { return static_cast<unsigned char>((*utf8)[at]); };
+  const unsigned char first = byteAt(0);
+  const size_t length = first < 0x80                    ? 1
+                        : first >= 0xC2 && first < 0xE0 ? 2
+                        : first >= 0xE0 && first < 0xF0 ? 3
+                        : first >= 0xF0 && first < 0xF5 ? 4
+                                                        : 0;
+  char32_t character = length == 1 ? first : first & (0x7Fu >> length);
+  bool wellFormed = length != 0 && length <= utf8->size();
+  for (size_t at = 1; wellFormed && at < length; ++at) {
+    wellFormed = (byteAt(at) & 0xC0) == 0x80;
+    character = character << 6 | (byteAt(at) & 0x3F);
+  }
+  utf8->remove_prefix(wellFormed ? length : 1);
+  return wellFormed ? character : kReplacement;
+}
+
+char ByteOf(const CodePage& page, char32_t character) {
+  const auto found = page.bytes.find(character);
+  return found != page.bytes.end() ? static_cast<char>(found->second) : '?';
+}
+
+}  // namespace
+
+std::string ToUtf8(std::string_view ansi) {
+  const CodePage& page = CurrentCodePage();
+  std::string utf8;
+  for (const char byte : ansi) AppendUtf8(page.unicode[static_cast<unsigned char>(byte)], &utf8);
+  return utf8;
+}
+
+std::string FromUtf8(std::string_view utf8) {
+  const CodePage& page = CurrentCodePage();
+  std::string ansi;
+  while (!utf8.empty()) ansi.push_back(ByteOf(page, TakeCharacter(&utf8)));
+  return ansi;
+}
+
+std::string FromUtf16(std::u16string_view text) {
+  const CodePage& page = CurrentCodePage();
+  std::string ansi;
+  for (const char16_t unit : text) ansi.push_back(ByteOf(page, unit));
+  return ansi;
+}
+
+std::u16string ToUtf16(std::string_view ansi) {
+  const CodePage& page = CurrentCodePage();
+  std::u16string text;
+  for (const char byte : ansi) text.push_back(page.unicode[static_cast<unsigned char>(byte)]);
+  return text;
+}
+
+unsigned char ToUpperByte(unsigned char byte) {
+  return CurrentCodePage().upper[byte];
+}
+
+bool EqualNoCase(std::string_view a, std::string_view b) {
+  if (a.size() != b.size()) return false;
+  const CodePage& page = CurrentCodePage();
+  for (size_t at = 0; at < a.size(); ++at) {
+    if (page.upper[static_cast<unsigned char>(a[at])] !=
+        page.upper[static_cast<unsigned char>(b[at])]) {
+      return false;
+    }
+  }
+  return true;
+}
+
+}  // namespace machine

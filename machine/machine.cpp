@@ -1,0 +1,122 @@
+#include "machine/machine.h"
+
+#include "machine/code_page.h"
+#include "machine/drives.h"
+#include "machine/faults.h"
+#include "machine/open_files.h"
+#include "machine/open_objects.h"
+#include "machine/registry_store.h"
+
+namespace fs = std::filesystem;
+
+namespace machine {
+namespace {
+
+constexpr char kSettingsFile[] = "machine.ini";
+constexpr char kRegistryFile[] = "registry.reg";
+constexpr char kSystemDrive[] = "drive_c";
+
+Settings settings;
+fs::path machineFolder;  // absolute; empty when no machine runs
+
+void Close() {
+  ResetFiles();
+  CloseRegistry();
+  CloseDrives();
+  SetFaults({});
+  ForgetOpenObjects();
+  settings = Settings{};
+  machineFolder.clear();
+}
+
+bool MakeHostDirectory(const fs::path& directory, std::string* error) {
+  std::error_code failure;
+  fs::create_directories(directory, failure);
+  if (!failure && fs::is_directory(directory, failure)) return true;
+  *error = directory.string() +
+           ": cannot be made: " + (failure ? failure.message() : "it is no directory");
+  return false;
+}
+
+// Opens what the folder holds; a part that is missing has its defaults.
+bool Open(const fs::path& folder, const fs::path& image, std::string* error) {
+  if (!MakeHostDirectory(folder, error)) return false;
+  std::error_code failure;
+  machineFolder = fs::canonical(folder, failure);
+
+  if (!ReadSettings(machineFolder / kSettingsFile, &settings, error)) {
+    *error = (machineFolder / *error).string();
+    return false;
+  }
+  // The file is UTF-8, and only now is it known what code page the program has.
+  settings.windowsDirectory = FromUtf8(settings.windowsDirectory);
+  settings.systemDirectory = FromUtf8(settings.systemDirectory);
+
+  if (!LoadRegistry(machineFolder / kRegistryFile, error)) {
+    *error = (machineFolder / *error).string();
+    return false;
+  }
+  OpenDrives(machineFolder, image);
+  return true;
+}
+
+// Makes every directory of a path that is missing. What can't be made, for a drive that is not
+// there or a name that can't be, stays away: the machine has no such directory.
+void MakeDirectories(const std::string& dosPath) {
+  for (size_t end = dosPath.find('\\', 3);; end = dosPath.find('\\', end + 1)) {
+    const auto location = Locate(dosPath.substr(0, end));
+    if (!location) return;
+    std::error_code failure;
+    if (!location->exists && location->parentExists) fs::create_directory(location->host, failure);
+    if (end == std::string::npos) return;
+  }
+}
+
+bool IsFresh() {
+  std::error_code failure;
+  return !fs::exists(machineFolder / kRegistryFile, failure) ||
+         !fs::exists(machineFolder / kSystemDrive, failure);
+}
+
+bool Furnish(std::string* error) {
+  if (!MakeHostDirectory(machineFolder / kSystemDrive, error)) return false;
+  MakeDirectories(settings.windowsDirectory);
+  MakeDirectories(settings.systemDirectory);
+  MakeDirectories("C:\\Program Files");
+  std::error_code failure;
+  if (!fs::exists(machineFolder / kRegistryFile, failure)) SaveRegistry();
+  return true;
+}
+
+}  // namespace
+
+bool Start(const fs::path& folder, const fs::path& image, std::string* error) {
+  if (!Open(folder, image, error) || (IsFresh() && !Furnish(error))) {
+    Close();
+    return false;
+  }
+  SetFaults(settings.faults);
+  return true;
+}
+
+std::string Stop() {
+  std::string open = OpenObjects();
+  Close();
+  return open;
+}
+
+Settings& CurrentSettings() {
+  return settings;
+}
+
+const fs::path& Folder() {
+  return machineFolder;
+}
+
+bool MakeFresh(const fs::path& folder, std::string* error) {
+  const bool made = Open(folder, fs::path(), error) && Furnish(error);
+  Close();
+  return made;
+}
+
+}  // namespace machine

@@ -1,0 +1,53 @@
+// The native program's entry: starts the machine that MORIV_MACHINE names, runs the program on it,
+// and tells the exit code that a Linux exit status has no room for.
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+
+#include "machine/code_page.h"
+#include "machine/machine.h"
+#include "platform/win32.h"
+
+namespace {
+
+constexpr int kUnusableMachineStatus = 2;
+constexpr int kOpenObjectsStatus = 3;
+constexpr int kFirstSoftCode = 100001;
+constexpr int kShowNormally = 1;
+
+// The arguments joined by one blank each, nothing quoted.
+std::string JoinArguments(int count, char** arguments) {
+  std::string line;
+  for (int i = 1; i < count; ++i) {
+    if (i > 1) line += ' ';
+    line += arguments[i];
+  }
+  return line;
+}
+
+// 0 for a help, a success and a soft failure.
+int ExitStatus(int code) {
+  return code == 0 || code == 1 || code >= kFirstSoftCode ? 0 : 1;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  const char* const named = std::getenv("MORIV_MACHINE");
+  const std::filesystem::path folder = named != nullptr && *named != '\0' ? named : "machine";
+  std::string error;
+  if (!machine::Start(folder, "/proc/self/exe", &error)) {
+    std::fprintf(stderr, "%s\n", error.c_str());
+    return kUnusableMachineStatus;
+  }
+
+  std::string commandLine = machine::FromUtf8(JoinArguments(argc, argv));
+  const int code = WinMain(nullptr, nullptr, commandLine.data(), kShowNormally);
+  const std::string open = machine::Stop();
+
+  std::printf("exit code: %d\n", code);
+  if (open.empty()) return ExitStatus(code);
+  std::fflush(stdout);
+  std::fprintf(stderr, "open at exit: %s\n", open.c_str());
+  return kOpenObjectsStatus;
+}

@@ -1,0 +1,200 @@
+#include "machine/open_files.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <map>
+
+#include "machine/disk_room.h"
+#include "machine/file_attributes.h"
+#include "machine/machine.h"
+
+namespace machine {
+namespace {
+
+constexpr int kFirstNumber = 3;
+
+std::map<int, OpenFile> openFiles;
+int permissionMask = 0;
+
+// Each of two open files must share what the other is opened for.
+bool Conflict(const OpenMode& a, const OpenMode& b) {
+  return (a.access & ~b.share) != 0 || (b.access & ~a.share) != 0;
+}
+
+// How the system itself holds the running image. The NT family maps it and closes the file: others
+// may open it exclusively, but not for writing. The 9x family keeps it open for reading.
+OpenMode ImageHold() {
+  return {.access = CurrentSettings().ntFamily ? 0 : kRead, .share = kRead};
+}
+
+bool IsRefusedByHolders(const Location& location, const OpenMode& mode) {
+  if (location.isImage && Conflict(mode, ImageHold())) return true;
+  struct stat status;
+  if (stat(location.host.c_str(), &status) != 0) return false;
+  return std::ranges::any_of(openFiles, [&](const auto& entry) {
+    const OpenFile& file = entry.second;
+    return file.device == status.st_dev && file.inode == status.st_ino && Conflict(mode, file.mode);
+  });
+}
+
+bool CanOpen(const Location& location, const OpenMode& mode) {
+  const bool writes = mode.create || (mode.access & kWrite) != 0;
+  if (location.isRoot || (writes && IsReadOnlyDrive(location.drive))) return false;
+  if (!location.exists) return mode.create && location.parentExists && !location.endsInSeparator;
+  std::error_code error;
+  if (!std::filesystem::is_regular_file(location.host, error)) return false;
+  if (writes && IsReadOnly(location.host)) return false;
+  // To cut a file is to write it, whatever the access asked for.
+  OpenMode asked = mode;
+  if (writes) asked.access |= kWrite;
+  return !IsRefusedByHolders(location, asked);
+}
+
+int HostFlags(DWORD access) {
+  switch (access & (kRead | kWrite)) {
+    case kRead | kWrite:
+      return O_RDWR | O_CLOEXEC;
+    case kWrite:
+      return O_WRONLY | O_CLOEXEC;
+    default:
+      return O_RDONLY | O_CLOEXEC;
+  }
+}
+
+// A host descriptor on the file, cut or made if the mode says so; -1 when the host refuses.
+int OpenOnHost(const Location& location, const OpenMode& mode) {
+  if (!mode.create) return open(location.host.c_str(), HostFlags(mode.access));
+  std::error_code error;
+  const uint64_t oldSize = location.exists ? std::filesystem::file_size(location.host, error) : 0;
+  const int host = open(location.host.c_str(), HostFlags(mode.access) | O_CREAT | O_TRUNC, 0666);
+  if (host < 0) return -1;
+  GiveRoomBack(location.drive, oldSize);
+  MarkProgram(location.host);
+  SetReadOnly(location.host, mode.readOnly);
+  return host;
+}
+
+int FreeNumber() {
+  int number = kFirstNumber;
+  while (openFiles.contains(number)) ++number;
+  return number;
+}
+
+// Bytes by which a write of `count` at `position` makes the file longer; nullopt when the host's
+// positions end before it.
+std::optional<uint64_t> Growth(uint64_t size, uint64_t position, uint64_t count) {
+  if (count > static_cast<uint64_t>(INT64_MAX) - position) return std::nullopt;
+  return std::max(size, position + count) - size;
+}
+
+bool WriteAll(int host, const char* bytes, size_t count) {
+  while (count > 0) {
+    const ssize_t written = write(host, bytes, count);
+    if (written <= 0) return false;
+    bytes += written;
+    count -= static_cast<size_t>(written);
+  }
+  return true;
+}
+
+}  // namespace
+
+int OpenProgramFile(ObjectKind kind, std::string_view dosPath, const OpenMode& mode) {
+  const std::optional<Location> location = Locate(dosPath);
+  if (!location || !CanOpen(*location, mode)) return -1;
+  const int host = OpenOnHost(*location, mode);
+  struct stat status;
+  if (host < 0 || fstat(host, &status) != 0) return -1;
+
+  const int number = FreeNumber();
+  openFiles.emplace(number, OpenFile{.kind = kind,
+                                     .mode = mode,
+                                     .drive = location->drive,
+                                     .device = status.st_dev,
+                                     .inode = status.st_ino,
+                                     .host = host});
+  ObjectOpened(kind);
+  return number;
+}
+
+OpenFile* FindOpenFile(int number, ObjectKind kind) {
+  const auto entry = openFiles.find(number);
+  return entry == openFiles.end() || entry->second.kind != kind ? nullptr : &entry->second;
+}
+
+bool CloseOpenFile(int number, ObjectKind kind) {
+  const OpenFile* const file = FindOpenFile(number, kind);
+  if (file == nullptr) return false;
+  close(file->host);
+  openFiles.erase(number);
+  ObjectClosed(kind);
+  return true;
+}
+
+int& PermissionMask() {
+  return permissionMask;
+}
+
+void ResetFiles() {
+  while (!openFiles.empty()) {
+    const auto& [number, file] = *openFiles.begin();
+    CloseOpenFile(number, file.kind);
+  }
+  permissionMask = 0;
+}
+
+bool IsHeldOpen(const Location& location) {
+  return IsRefusedByHolders(location, {.access = kDelete, .share = kRead | kWrite | kDelete});
+}
+
+uint64_t FileSize(const OpenFile& file) {
+  struct stat status;
+  return fstat(file.host, &status) == 0 ? static_cast<uint64_t>(status.st_size) : 0;
+}
+
+std::optional<int64_t> MovePosition(OpenFile& file, int64_t distance, DWORD origin, int64_t limit) {
+  int64_t position = 0;
+  if (origin == FILE_CURRENT) {
+    position = lseek(file.host, 0, SEEK_CUR);
+  } else if (origin == FILE_END) {
+    position = static_cast<int64_t>(FileSize(file));
+  } else if (origin != FILE_BEGIN) {
+    return std::nullopt;
+  }
+  if (__builtin_add_overflow(position, distance, &position)) return std::nullopt;
+  if (position < 0 || position > limit) return std::nullopt;
+  if (lseek(file.host, position, SEEK_SET) != position) return std::nullopt;
+  return position;
+}
+
+std::optional<size_t> ReadBytes(OpenFile& file, void* buffer, size_t count) {
+  if ((file.mode.access & kRead) == 0) return std::nullopt;
+  size_t done = 0;
+  while (done < count) {
+    const ssize_t got = read(file.host, static_cast<char*>(buffer) + done, count - done);
+    if (got < 0) return std::nullopt;
+    if (got == 0) break;
+    done += static_cast<size_t>(got);
+  }
+  return done;
+}
+
+bool WriteBytes(OpenFile& file, const void* buffer, size_t count) {
+  if ((file.mode.access & kWrite) == 0) return false;
+  if (count == 0) return true;
+  const off_t position = lseek(file.host, 0, SEEK_CUR);
+  const uint64_t size = FileSize(file);
+  const auto growth = Growth(size, static_cast<uint64_t>(position), count);
+  if (!growth || !TakeRoom(file.drive, *growth)) return false;
+  if (WriteAll(file.host, static_cast<const char*>(buffer), count)) return true;
+
+  // The host's own disk is full: undo what went through.
+  if (ftruncate(file.host, static_cast<off_t>(size)) == 0) GiveRoomBack(file.drive, *growth);
+  lseek(file.host, position, SEEK_SET);
+  return false;
+}
+
+}  // namespace machine

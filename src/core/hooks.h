@@ -1,0 +1,28 @@
+// The two hooks between the passes and the user.
+//
+// The passes run alike in a dialog and in a silent run, and never ask which it is: they show
+// progress and poll for a stop. In a silent run no window exists; then the first does nothing and
+// the second answers 0.
+#pragma once
+
+#include "core/context.h"
+#include "platform/win32.h"
+
+inline constexpr int IDC_MESSAGE = 901;  // the dialog's message area
+
+// The dialog's state, one for the process, zero at the start. Only the dialog changes it.
+struct WizardState {
+  HWND window;               // null while no dialog exists
+  uint32_t cancelRequested;  // 1: the user has confirmed a stop
+  uint32_t busy;             // phase of the dialog's run
+  SetupContext* context;     // not owned
+};
+extern WizardState wizardState;
+
+// Shows the catalog text, with the file name under it if there is one, and keeps the id in
+// context->messageId. Context and file name may be null.
+void ShowMessage(SetupContext* context, uint32_t id, const char* fileName);
+
+// Dispatches one waiting message of the dialog, if any, and answers the cancel flag. This is the
+// only re-entry of the program: the dialog's handlers can run inside it.
+uint32_t PollCancel();

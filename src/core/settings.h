@@ -1,0 +1,47 @@
+// What the silent sequences and the dialog settle before any file is touched: language, installed
+// product, directory, disk space.
+#pragma once
+
+#include "core/context.h"
+
+// Settles language, header.defaultLanguage and currentLanguage: the command line's, else the
+// registered product's, else the package's, else the system's. Needs the package open. Returns 1,
+// or StatusBadArgument for a null context.
+StatusCode ChooseLanguage(SetupContext* context);
+
+// Sets productFound; puts the registered directory, or else one that exists (installDir, then the
+// default), in installDir, with event 1 or 2. Returns 1, also when nothing was found, or
+// StatusBadArgument for a null context.
+StatusCode FindInstalledProduct(SetupContext* context);
+
+// Makes the directory text valid, in place: itself, else the given default, which may be null and
+// is not tested, else the catalog's. Returns 1; StatusBadArgument for a null text or a size of 0;
+// -1 when the catalog's default doesn't fit; StatusBadDirectory when it is no path.
+StatusCode ChooseInstallDir(const SetupContext* context, char* directory, size_t size,
+                            const char* defaultDirectory);
+
+// The catalog's default directory. Returns 1, or -1 for a null buffer or a text that doesn't fit.
+int GetDefaultInstallDir(const SetupContext* context, char* buffer, size_t size);
+
+// Returns 1, also when the free space is unknown; StatusNoDiskSpace when the package needs more
+// than is free on the drive of installDir; StatusBadArgument for a null context.
+StatusCode CheckDiskSpace(const SetupContext* context);
+
+// Free bytes, available to the caller, on the drive of the path. False when that is unknown, as for
+// a path without a backslash.
+bool GetFreeDiskSpace(const char* path, uint64_t* bytes);
+
+// Bytes that the package needs; 0 when it can't be opened. A package that is closed is opened for
+// the look and closed again.
+uint32_t GetNeededSpace(SetupContext* context);
+
+// Whether the text can be an installation directory: 1 or 0. Cuts trailing blanks in place. Only
+// what stands behind the first ":" is tested, so that a relative path passes.
+int IsValidPath(char* path);
+
+// 1 when the character is in the set, 0 when not, -1 for a character 0 or a null or empty set.
+int CharInSet(char character, const char* set);
+
+// Megabytes, cut to one decimal behind a comma in every language; a zero decimal isn't shown.
+// Returns 1, or 0 with the buffer unchanged for a null buffer or one that is too small.
+int FormatSize(uint32_t bytes, char* buffer, size_t size);

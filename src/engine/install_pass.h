@@ -1,0 +1,27 @@
+// Puts the packaged files on the disk: each stream is expanded once, into the record's first
+// target, and copied from there to the others. What stands at a target is replaced, older or newer.
+// Nothing is rolled back: what a failed pass has written stays, but a failed expansion leaves no
+// file.
+#pragma once
+
+#include "core/context.h"
+#include "engine/target_list.h"
+
+// The pass. Needs an open package, a settled installDir and null records; called once a run. Leaves
+// all records in context->records, which the removal program is written from.
+// Returns 1 when all is done. The operation that gives up adds a fatal event; a stop by the user
+// before a record adds none.
+StatusCode InstallFiles(SetupContext* context);
+
+// Writes all targets of one record. The package file's position is on the first byte of the stream,
+// and after success behind it. Returns 1, StatusInternal for a missing argument or a size of 0, or
+// the failure of the target at which it stopped; those before it stay.
+StatusCode InstallTargets(SetupContext* context, const TargetList* list, uint32_t storedSize);
+
+// Copies over what is there. Returns 1, StatusCopyFailed, or StatusInternal for a missing or empty
+// path.
+StatusCode CopyTarget(const char* source, const char* target);
+
+// Makes every directory that leads to the file of the path. Returns 1, StatusCreateDirFailed, or
+// StatusInternal for a missing path or one below 4 characters.
+StatusCode MakeDirectories(const char* path);

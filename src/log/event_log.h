@@ -1,0 +1,18 @@
+// Turns the events of a run into lines of a text file: English, 8-bit, CR LF.
+#pragma once
+
+#include "core/event_list.h"
+
+enum class LogMode { kAppend = 0, kNew = 1 };
+
+// Writes one block, a heading with the local time and a line for each event, to the file at `path`,
+// or to the standard log, MorivLog.txt in the Windows directory, for a null or empty path. A list
+// without events leaves the file as it was. A log that can't be written is left out without a word:
+// the work of the run is done by then.
+void WriteEventLog(const EventList* list, const char* path, LogMode mode);
+
+// Appends the block to the report file; does nothing for a null or empty path.
+void WriteReportFile(const EventList* list, const char* path);
+
+// The two as every run ends with them: the standard log anew, then the report file.
+void WriteLogs(const EventList* list, const char* reportFile);

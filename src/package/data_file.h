@@ -1,0 +1,55 @@
+// A file name bound to an open file.
+//
+// A file is open in one of two ways: through a Win32 handle, asked for first, with exclusive
+// access; or through a descriptor of the runtime's low-level layer, asked for only when the first
+// way fails, which shares the file with anyone. On systems of the 9x family the running image can
+// be read in the second way alone. Positions and sizes have 32 bits.
+//
+// The class knows nothing of events and status codes: every operation answers a plain count or a
+// truth value (1 or 0).
+#pragma once
+
+#include <cstdint>
+
+#include "platform/win32.h"
+
+class DataFile {
+ public:
+  // Keeps a copy of the name. A null or empty name, or no memory for the copy, leaves the object
+  // nameless: then every open fails.
+  explicit DataFile(const char* name);
+  ~DataFile();
+  DataFile(const DataFile&) = delete;
+  DataFile& operator=(const DataFile&) = delete;
+
+  // All three answer 0, and change nothing, on an object that is open already or has no name.
+  int OpenForRead();
+  int OpenForWrite();  // the file has to exist
+  int Create();        // for reading and writing; an existing file is cut to nothing
+
+  // Bytes moved. 0 also for a null buffer, a count of 0, a closed object and a failure.
+  uint32_t Read(void* buffer, uint32_t count);
+  uint32_t Write(const void* buffer, uint32_t count);
+
+  // Size in bytes; 0 on any failure. A closed object looks its name up and stays closed. The
+  // position afterwards is of no meaning.
+  uint32_t GetSize();
+
+  int SeekTo(int32_t position);  // from the start; refused below 0, with the old position kept
+  int SeekToEnd();
+  int32_t Tell();  // -1 on failure and on a closed object
+
+  int Close();   // 1 if nothing was open; closed afterwards whatever the system answered
+  int Delete();  // closes first; 0 for a nameless object
+
+  // The name, or null. Stays owned by the object.
+  const char* GetName() const { return name_; }
+
+ private:
+  int Open(DWORD access, DWORD disposition);
+  int OpenDescriptor(DWORD access, DWORD disposition);
+
+  HANDLE handle_ = INVALID_HANDLE_VALUE;
+  int32_t descriptor_ = -1;
+  char* name_ = nullptr;  // owned
+};

@@ -1,0 +1,118 @@
+// The expander of the packaged streams: a push decoder of variable-width LZW codes.
+//
+// A stream is three bytes of magic, "PKZ", and a sequence of codes, most significant bit first,
+// with no gaps. Codes begin with 9 bits. 0 to 255 stand for themselves, 257 makes the next code one
+// bit wider, 258 forgets the table and sets the width back to 9, and from 259 on a code is an entry
+// of the table: the string of its prefix, then its suffix. The first code, and the first after a
+// 258, is a literal; each later one but 257 and 258 makes the next entry. The stream has no end
+// code: it ends with its last byte, and bits left over that make no code are dropped.
+//
+// The expander is handed blocks of any size, keeps all its state between them and can stop in the
+// middle of a code. It serves one stream. Its memory is fixed and allocated once.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+class DataFile;
+
+inline constexpr char kStreamMagic[] = "PKZ";
+inline constexpr uint32_t kStreamMagicSize = 3;
+
+class PkzExpander {
+ public:
+  PkzExpander();
+  virtual ~PkzExpander();
+  PkzExpander(const PkzExpander&) = delete;
+  PkzExpander& operator=(const PkzExpander&) = delete;
+
+  // False when there was no memory for the table; then the expander must not be used.
+  bool IsReady() const { return table_ != nullptr; }
+
+  // 1 once the stream has been found bad. All input after that is ignored.
+  int32_t failed() const { return failed_; }
+
+  // Runs over one block of the code sequence.
+  void Expand(const uint8_t* bytes, uint32_t count);
+
+ protected:
+  // Takes `count` bytes of output, which stay valid during the call alone.
+  virtual void WriteOutput(const uint8_t* bytes, uint32_t count) = 0;
+
+  void Fail() { failed_ = 1; }
+
+ private:
+  static constexpr int32_t kTableSize = 35023;
+  static constexpr int32_t kWidenCode = 257;
+  static constexpr int32_t kResetCode = 258;
+  static constexpr int32_t kFirstEntry = 259;
+  static constexpr int32_t kFirstWidth = 9;
+  static constexpr int32_t kLastWidth = 32;
+
+  struct Entry {
+    uint32_t prefix;
+    uint8_t suffix;
+  };
+
+  enum class State { kFirstCode, kNextCode, kFirstCodeAfterReset, kEmit };
+
+  // The steps of the machine answer whether to go on: not when the block has run out, and not when
+  // the stream has been found bad.
+  bool Step();
+  bool ReadFirstCode();
+  bool ReadNextCode();
+  bool Emit();
+
+  // The next code, in `code`; false when the block has run out. A code split between blocks keeps
+  // the width that it began with.
+  bool ReadCode(uint32_t* code);
+  void ResetCodes();
+  void PushByte(uint8_t byte);
+  void BuildString(uint32_t code);
+
+  int32_t failed_ = 0;
+  int32_t bitsWanted_ = 0;    // bits still missing from the code in assembly; 0: none in assembly
+  uint32_t codeValue_ = 0;    // its bits so far
+  int32_t bitsInByte_ = 0;    // unread bits of currentByte, 0 to 8
+  uint32_t currentByte_ = 0;  // with its used bits cleared
+  const uint8_t* input_ = nullptr;  // next byte of the present block; not owned
+  uint32_t inputLeft_ = 0;
+  State state_ = State::kFirstCode;
+  int32_t codeWidth_ = kFirstWidth;
+  // Owned. Entries 0 to 258 are not used. Neither cleared nor walked at a reset: an entry above
+  // nextCode can't be reached, since a code above nextCode is refused.
+  Entry* table_;
+  uint8_t stringStack_[kTableSize];  // the present string, filled from its last byte backwards
+  int32_t stringLength_ = 0;         // it ends with the last byte of stringStack
+  uint32_t previousCode_ = 0;        // widen and reset not counted
+  uint32_t firstByte_ = 0;           // of the string of previousCode
+  int32_t nextCode_ = kFirstEntry;   // next free code
+};
+
+// Tests the magic and collects the output in pieces of 1024 bytes on its way to a file.
+class PkzFileExpander : public PkzExpander {
+ public:
+  // `output` is not owned.
+  explicit PkzFileExpander(DataFile* output) : output_(output) {}
+
+  // Takes the next block of the stream. The first one has to hold the magic whole and one byte
+  // more.
+  void ExpandBlock(const uint8_t* bytes, uint32_t count);
+
+  // Writes what is collected. The destructor doesn't.
+  void Flush();
+  uint32_t bufferFill() const { return bufferFill_; }
+
+ protected:
+  // A full buffer is written when the next byte arrives, so every write but the last has exactly
+  // 1024 bytes.
+  void WriteOutput(const uint8_t* bytes, uint32_t count) override;
+
+ private:
+  static constexpr uint32_t kBufferSize = 1024;
+
+  DataFile* output_;
+  bool magicSeen_ = false;
+  uint8_t buffer_[kBufferSize] = {};
+  uint32_t bufferFill_ = 0;
+};

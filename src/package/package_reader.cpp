@@ -1,0 +1,88 @@
+#include "package/package_reader.h"
+
+#include <cstring>
+#include <new>
+
+#include "package/paths.h"
+
+namespace {
+
+StatusCode RefusePackage(SetupContext* context, uint32_t event, StatusCode status) {
+  (void)AddEvent(&context->events, event, SeverityFatal, context->packageFile->GetName());
+  ClosePackageFile(context);
+  return status;
+}
+
+bool IsGoodHeader(const PackageHeader& header) {
+  return header.headerSize == sizeof(PackageHeader) &&
+         memcmp(header.magic, kPackageMagic, sizeof(header.magic)) == 0;
+}
+
+}  // namespace
+
+StatusCode OpenPackage(SetupContext* context) {
+  if (context == nullptr) return StatusBadPackage;
+  const StatusCode status = InitEventList(&context->events);
+  return status == StatusOk ? ReadPackageHeader(context) : status;
+}
+
+StatusCode ReadPackageHeader(SetupContext* context) {
+  if (context == nullptr) return StatusBadPackage;
+  char path[kPathSize] = {};
+  if (GetImagePath(path, sizeof(path)) != StatusOk) {
+    (void)AddEvent(&context->events, EventNoImagePath, SeverityFatal, nullptr);
+    return StatusInternal;
+  }
+  DataFile* file = new (std::nothrow) DataFile(path);
+  if (file == nullptr) return StatusNoMemory;
+  context->packageFile = file;
+  if (file->OpenForRead() != 1) {
+    return RefusePackage(context, EventOpenFailed, StatusOpenFailed);
+  }
+
+  // A file shorter than a header gives a negative position, and one of 2 GiB or more gives one that
+  // has no 32-bit form: both are seeks that fail.
+  const int64_t position = static_cast<int64_t>(file->GetSize()) - int64_t{sizeof(PackageHeader)};
+  if (position > INT32_MAX || file->SeekTo(static_cast<int32_t>(position)) != 1) {
+    return RefusePackage(context, EventSeekFailed, StatusBadPackage);
+  }
+  context->header = {};
+  if (file->Read(&context->header, sizeof(PackageHeader)) != sizeof(PackageHeader) ||
+      !IsGoodHeader(context->header)) {
+    return RefusePackage(context, EventBadPackage, StatusBadPackage);
+  }
+  return StatusOk;
+}
+
+int32_t ReadFileRecord(DataFile* file, FileRecord* record) {
+  if (file == nullptr || record == nullptr) return StatusBadArgument;
+  if (file->Read(record, sizeof(FileRecord)) != sizeof(FileRecord)) return 0;
+  return record->recordSize == sizeof(FileRecord) ? int32_t{sizeof(FileRecord)} : 0;
+}
+
+StatusCode GetImagePath(char* buffer, uint32_t size) {
+  if (buffer == nullptr || size == 0) return StatusBadArgument;
+  // A result equal to the size is a path that was cut.
+  const DWORD length = GetModuleFileNameA(ModuleHandle(), buffer, size);
+  if (length == 0 || length >= size || buffer[0] == '\0') return StatusNoModulePath;
+  return StatusOk;
+}
+
+void ClosePackageFile(SetupContext* context) {
+  delete context->packageFile;
+  context->packageFile = nullptr;
+}
+
+StatusCode ReleasePackage(SetupContext* context) {
+  if (context == nullptr) return StatusBadArgument;
+  ClosePackageFile(context);
+  delete[] context->records;
+  context->records = nullptr;
+  return StatusOk;
+}
+
+StatusCode CloseSetup(SetupContext* context) {
+  if (context == nullptr) return StatusBadArgument;
+  (void)FreeEventList(&context->events);
+  return ReleasePackage(context);
+}

@@ -1,0 +1,37 @@
+// Finds and reads the package at the tail of the program's own image.
+//
+// The image is read from its end, so the program works under any file name; it is never loaded
+// whole. docs/package-format.md has the format.
+#pragma once
+
+#include "core/context.h"
+#include "package/data_file.h"
+
+// Empties the event list, then opens the image and fills context->header. Events that stood in the
+// list are dropped, not freed; the package must be closed.
+// Returns 1 with packageFile open, or with packageFile null: StatusBadPackage (also for a null
+// context), StatusOpenFailed, StatusInternal, StatusNoMemory. Adds one fatal event for each failure
+// but a null context and StatusNoMemory.
+StatusCode OpenPackage(SetupContext* context);
+
+// The same without the event list.
+StatusCode ReadPackageHeader(SetupContext* context);
+
+// Reads the record at the file's position into `record`. Returns 696, 0 when the read falls short
+// or the record is none, StatusBadArgument for a null argument.
+int32_t ReadFileRecord(DataFile* file, FileRecord* record);
+
+// Full path of the running image. Returns 1, StatusBadArgument for a null buffer or a size of 0,
+// StatusNoModulePath when the system gives none or none that fits.
+StatusCode GetImagePath(char* buffer, uint32_t size);
+
+// Closes and destroys packageFile, frees records, sets both to null. Returns 1, or
+// StatusBadArgument for a null context.
+StatusCode ReleasePackage(SetupContext* context);
+
+// Closes and destroys packageFile alone, as a pass does that can't even reach the first record.
+void ClosePackageFile(SetupContext* context);
+
+// Ends a run's record: frees the events and releases the package, which may never have been open.
+// Returns 1, or StatusBadArgument for a null context.
+StatusCode CloseSetup(SetupContext* context);

@@ -1,0 +1,31 @@
+// The few operations on paths and on the program's own module that all the passes share. Truth
+// values are 1 and 0. A path may be null or empty: then the answer is 0 unless told.
+#pragma once
+
+#include "core/status.h"
+#include "platform/text.h"
+#include "platform/win32.h"
+
+// Something stands at the path, and it is no directory / a directory.
+int FileExists(const char* path);
+int DirectoryExists(const char* path);
+
+// Delete a file, or a directory if it is empty. Return 1 or 0; StatusBadArgument for a null or
+// empty path.
+StatusCode DeleteFileChecked(const char* path);
+StatusCode RemoveDirectoryChecked(const char* path);
+
+// Appends one backslash in place, unless the text is empty, ends with one already, or fills its
+// buffer. Returns 1 if it appended, else 0.
+int AppendBackslash(char* text, size_t size);
+template <size_t N>
+int AppendBackslash(char (&text)[N]) {
+  return AppendBackslash(text, N);
+}
+
+// Copies the Windows directory. The system is asked once; the answer is kept for the life of the
+// process. Returns 0, with the buffer unchanged, when it can't be had or doesn't fit.
+int GetWindowsDir(char* buffer, size_t size);
+
+// The program's own module, which holds the catalog.
+HINSTANCE ModuleHandle();

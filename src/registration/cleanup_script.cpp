@@ -1,0 +1,57 @@
+#include "registration/cleanup_script.h"
+
+#include <memory>
+#include <new>
+
+#include "package/data_file.h"
+#include "package/paths.h"
+#include "ui/catalog.h"
+
+namespace {
+
+constexpr char kFileName[] = "Moriv.INF";
+constexpr char kDeleteSection[] = "RemoveFiles";
+constexpr char kWindowsDirNumber[] = "10";  // the INF format's number of the Windows directory
+constexpr size_t kTextSize = 2 * kCatalogTextSize;
+
+// One write for each format, whole or not at all.
+bool WriteText(DataFile* file, const char* text) {
+  const uint32_t length = static_cast<uint32_t>(strlen(text));
+  return file->Write(text, length) == length;
+}
+
+template <typename... Texts>
+bool WriteFormat(DataFile* file, const char* format, Texts... texts) {
+  char text[kTextSize];
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+  return FormatText(text, sizeof(text), format, texts...) && WriteText(file, text);
+#pragma GCC diagnostic pop
+}
+
+bool WriteLines(DataFile* file) {
+  char program[kCatalogTextSize] = {};
+  char log[kCatalogTextSize] = {};
+  LoadCatalogText(nullptr, CatalogRemovalProgram, program);
+  LoadCatalogText(nullptr, CatalogLogName, log);
+  return WriteFormat(file, "[%s]\r\n%s=%s\r\n", "Version", "Signature", "$Chicago$") &&
+         WriteFormat(file, "%s=%s\r\n", "AdvancedINF", "2.0") &&
+         WriteFormat(file, "\r\n[%s]\r\n%s=%s\r\n", kCleanupSection, "DelFiles", kDeleteSection) &&
+         WriteFormat(file, "\r\n[%s]\r\n%s\r\n", kDeleteSection, program) &&
+         WriteFormat(file, "%s\r\n", log) &&        //
+         WriteFormat(file, "%s\r\n", kFileName) &&  //
+         WriteFormat(file, "\r\n[%s]\r\n%s = %s\r\n", "DestinationDirs", kDeleteSection,
+                     kWindowsDirNumber);
+}
+
+}  // namespace
+
+int WriteCleanupScript(char* path, size_t size) {
+  char target[kPathSize] = {};
+  if (GetWindowsDir(target, sizeof(target)) != 1) return 0;
+  (void)AppendBackslash(target);
+  if (!AppendText(target, kFileName) || !CopyText(path, size, target)) return 0;
+  (void)DeleteFileChecked(target);  // one of an earlier removal goes; usually there is none
+  const std::unique_ptr<DataFile> file(new (std::nothrow) DataFile(target));
+  return file != nullptr && file->Create() == 1 && WriteLines(file.get());
+}

@@ -1,0 +1,78 @@
+#include "registration/removal_program.h"
+
+#include <memory>
+#include <new>
+
+#include "core/hooks.h"
+#include "engine/file_version.h"
+#include "package/package_reader.h"
+#include "package/paths.h"
+#include "ui/catalog.h"
+
+namespace {
+
+constexpr uint32_t kBlockSize = 1024;
+constexpr size_t kPathRoom = 2 * kPathSize;  // a directory and a name
+
+bool FormatRemovalProgramPath(char* path, size_t size) {
+  char name[sizeof(FileRecord::fileName)] = {};
+  char directory[kPathSize] = {};
+  LoadCatalogText(nullptr, CatalogRemovalProgram, name);
+  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
+         FormatText(path, size, "%s\\%s", directory, name);
+}
+
+bool CopyExecutable(DataFile* image, uint32_t length, DataFile* copy) {
+  uint8_t block[kBlockSize];
+  while (length > 0) {
+    const uint32_t count = length < kBlockSize ? length : kBlockSize;
+    if (image->Read(block, count) != count || copy->Write(block, count) != count) return false;
+    length -= count;
+  }
+  return true;
+}
+
+bool WriteRecords(FileRecord* records, uint16_t count, DataFile* copy) {
+  for (uint16_t i = 0; i < count; ++i) {
+    records[i].storedSize = 0;
+    if (copy->Write(&records[i], sizeof(FileRecord)) != sizeof(FileRecord)) return false;
+  }
+  return true;
+}
+
+bool WriteHeader(PackageHeader* header, DataFile* copy) {
+  header->removalImageFlag = 1;
+  header->packageLength = header->recordCount * uint32_t{sizeof(FileRecord)};
+  return copy->Write(header, sizeof(PackageHeader)) == sizeof(PackageHeader);
+}
+
+}  // namespace
+
+StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) {
+  if (context == nullptr || context->packageFile == nullptr) return StatusBadArgument;
+  DataFile* const image = context->packageFile;
+  // Opening it again below puts its position at byte 0, where the copy starts.
+  (void)image->Close();
+
+  FileRecord own = {};
+  if (ReadOwnFileRecord(&own) != 1) return StatusBadRecord;
+  char target[kPathRoom] = {};
+  if (!FormatRemovalProgramPath(target, sizeof(target))) return StatusWriteRemovalFailed;
+  if (path != nullptr && size > 0) (void)CopyText(path, static_cast<size_t>(size), target);
+
+  const bool replaces = FileExists(target) == 1;
+  if (replaces && DeleteFileChecked(target) != 1) return StatusDeleteFailed;
+  ShowMessage(context, replaces ? CatalogFileUpdated : CatalogFileCopied, target);
+
+  if (image->OpenForRead() != 1) return StatusOpenFailed;
+  const std::unique_ptr<DataFile> copy(new (std::nothrow) DataFile(target));
+  if (copy == nullptr) return StatusNoMemory;
+  if (copy->Create() != 1) return StatusCreateFileFailed;
+  if (!CopyExecutable(image, context->header.dataOffset, copy.get()) ||
+      !WriteRecords(context->records, context->header.recordCount, copy.get()) ||
+      !WriteHeader(&context->header, copy.get())) {
+    (void)copy->Delete();  // no partial removal program stays
+    return StatusWriteRemovalFailed;
+  }
+  return StatusOk;
+}

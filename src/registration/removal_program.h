@@ -1,0 +1,18 @@
+// The removal program: a trimmed copy of the running image in the Windows directory. The same
+// executable and the same records, but no streams, and a flag in the header that turns every run of
+// the copy into a removal.
+#pragma once
+
+#include <cstdint>
+
+#include "core/context.h"
+
+// Writes it, in place of an earlier one. Needs packageFile, and records as an install pass leaves
+// them; changes records and header in memory into those of the removal program.
+//   path  receives the full path once that is known; may be null. One that doesn't fit in `size`
+//         bytes leaves the buffer alone.
+// Returns 1, or: StatusBadArgument; StatusBadRecord when the running image has no version resource
+// with a translation and a file version; StatusDeleteFailed for an earlier one that can't go;
+// StatusOpenFailed, StatusNoMemory, StatusCreateFileFailed; StatusWriteRemovalFailed, also when
+// there is no Windows directory. No partial file stays. Adds no events.
+StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size);

@@ -1,0 +1,129 @@
+// Where paths lead: the rules of names and drives.
+#include "machine/drives.h"
+
+#include <gtest/gtest.h>
+
+#include "tests/support/test_machine.h"
+
+namespace fs = std::filesystem;
+using machine::Locate;
+
+namespace {
+
+struct GoodPath {
+  std::string path;
+  std::string host;  // in the machine's folder
+  bool exists;
+};
+
+TEST(Drives, PathsLeadToTheirFiles) {
+  TestMachine pc;
+  pc.Write("drive_c/Dir/Read Me.TXT", "x");
+  pc.Write("drive_c/both", "lower");
+  pc.Write("drive_c/BOTH", "upper");
+  pc.Write("drive_c/caf\xC3\xA9", "x");
+  pc.Write("drive_d/file", "x");
+  const GoodPath rows[] = {
+      {"C:\\Dir\\Read Me.TXT", "drive_c/Dir/Read Me.TXT", true},
+      {"c:/dIR\\READ me.txt", "drive_c/Dir/Read Me.TXT", true},
+      {"C:\\both", "drive_c/both", true},
+      {"C:\\BOTH", "drive_c/BOTH", true},
+      {"C:\\Both", "drive_c/BOTH", true},
+      {"C:\\CAF\xC9", "drive_c/caf\xC3\xA9", true},
+      {"C:\\na\xEFve", "drive_c/na\xC3\xAFve", false},
+      {"C:\\DIR\\New Name", "drive_c/Dir/New Name", false},
+      {"C:\\none\\New Name", "drive_c/none/New Name", false},
+      {"C:", "drive_c", true},
+      {"C:\\", "drive_c", true},
+      {"D:file", "drive_d/file", true},
+      {"dir", "drive_c/Dir", true},
+      {"\\dir", "drive_c/Dir", true},
+      {"C:\\Dir\\", "drive_c/Dir", true},
+      {"C:\\\\Dir\\\\\\read me.txt", "drive_c/Dir/Read Me.TXT", true},
+      {"C:\\Dir\\.\\..\\both", "drive_c/both", true},
+      {"C:\\missing\\..\\both", "drive_c/both", true},
+      {"C:\\..\\..\\..\\both", "drive_c/both", true},
+      {"D:\\..\\drive_c\\both", "drive_d/drive_c/both", false},
+      {"C:\\Dir. .\\Read Me.TXT. ", "drive_c/Dir/Read Me.TXT", true},
+      {"C:\\dir\\...", "drive_c/Dir", true},
+      {"C:\\COM0", "drive_c/COM0", false},
+      {"C:\\CONSOLE", "drive_c/CONSOLE", false},
+  };
+  for (const GoodPath& row : rows) {
+    SCOPED_TRACE(row.path);
+    const auto location = Locate(row.path);
+    ASSERT_TRUE(location.has_value());
+    EXPECT_EQ(location->host, pc.Host(row.host));
+    EXPECT_EQ(location->exists, row.exists);
+  }
+  EXPECT_TRUE(Locate("C:\\..")->isRoot);
+  EXPECT_FALSE(Locate("C:\\none\\New Name")->parentExists);
+  EXPECT_TRUE(Locate("C:\\new")->parentExists);
+}
+
+TEST(Drives, SomePathsLeadNowhere) {
+  TestMachine pc;
+  pc.Write("drive_c/file", "x");
+  pc.Write("drive_c/NUL", "x");
+  pc.Write("drive_c/what?", "x");
+  const std::string rows[] = {
+      "",           "Q:\\file",     "C:\\a<b",       "C:\\a>b",       "C:\\a\"b",
+      "C:\\a|b",    "C:\\what?",    "C:\\fil*",      "C:\\a\tb",      "C:\\a:b",
+      "ab:c",       "C:\\NUL",      "C:\\con.txt",   "C:\\aux .txt",  "C:\\prn\\x",
+      "C:\\Com1",   "C:\\LPT9.a.b", "C:\\com3 ",     "\\\\server\\x", "//server/x",
+      "C:\\file\\", "1:\\file",     "C:\\dir\\\x01",
+  };
+  for (const std::string& path : rows) EXPECT_FALSE(Locate(path).has_value()) << path;
+}
+
+TEST(Drives, LengthIsThatOfTheFullPath) {
+  TestMachine pc;
+  EXPECT_TRUE(Locate("C:\\" + std::string(256, 'a')).has_value());
+  EXPECT_FALSE(Locate("C:\\" + std::string(257, 'a')).has_value());
+  EXPECT_FALSE(Locate(std::string(257, 'a')).has_value());
+  EXPECT_TRUE(Locate("C:\\x\\..\\" + std::string(256, 'a')).has_value());
+}
+
+TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
+  TestMachine pc;
+  pc.Write("drive_c/dir/file", "x");
+  const TemporaryFolder outside;
+  std::ofstream(outside.Path() / "file") << "x";
+  fs::create_directory_symlink(pc.Host("drive_c/dir"), pc.Host("drive_c/inside"));
+  fs::create_directory_symlink(outside.Path(), pc.Host("drive_c/outside"));
+  fs::create_symlink(outside.Path() / "file", pc.Host("drive_c/outer file"));
+  fs::create_symlink("nothing", pc.Host("drive_c/dangling"));
+  fs::create_directory_symlink(outside.Path(), pc.Host("drive_e"));
+  EXPECT_TRUE(Locate("C:\\inside\\file")->exists);
+  for (const char* path : {"C:\\outside", "C:\\outside\\file", "C:\\outside\\new", "C:\\outer file",
+                           "C:\\dangling", "E:\\file"}) {
+    EXPECT_FALSE(Locate(path).has_value()) << path;
+  }
+}
+
+TEST(Drives, ImageOutsideTheDrivesIsTheOneFileOfDriveZ) {
+  TestMachine pc;
+  pc.Write("Setup.exe", "MZ");
+  pc.Write("other.exe", "MZ");
+  pc.Restart("Setup.exe");
+  EXPECT_EQ(machine::ImagePath(), "Z:\\Setup.exe");
+  EXPECT_TRUE(Locate("z:\\SETUP.EXE")->isImage);
+  EXPECT_TRUE(Locate("Z:\\")->isRoot);
+  EXPECT_FALSE(Locate("Z:\\other.exe")->exists);
+  EXPECT_FALSE(Locate("Z:\\Setup.exe\\").has_value());
+  EXPECT_TRUE(machine::IsReadOnlyDrive('Z'));
+  EXPECT_EQ(machine::LocateFile("Z:\\setup.exe"), pc.Host("Setup.exe"));
+  EXPECT_FALSE(machine::LocateFile("Z:\\").has_value());
+}
+
+TEST(Drives, ImageOnADriveHasItsPathThere) {
+  TestMachine pc;
+  pc.Write("drive_z/My Dir/Setup.exe", "MZ");
+  pc.Restart("drive_z/My Dir/Setup.exe");
+  EXPECT_EQ(machine::ImagePath(), "Z:\\My Dir\\Setup.exe");
+  EXPECT_TRUE(Locate("Z:\\my dir\\setup.exe")->isImage);
+  EXPECT_FALSE(machine::IsReadOnlyDrive('Z'));
+  EXPECT_FALSE(Locate("Z:\\my dir")->isImage);
+}
+
+}  // namespace

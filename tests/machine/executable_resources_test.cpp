@@ -1,0 +1,224 @@
+// Version resources in programs of all kinds, sound and damaged, and the version functions.
+#include "machine/executable_resources.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+
+#include "machine/resource_file.h"
+#include "platform/win32.h"
+#include "tests/support/executable_builder.h"
+#include "tests/support/test_machine.h"
+
+namespace {
+
+const std::string kVersion =
+    VersionResource({{"CompanyName", "ZEB"}, {"FileVersion", "4.1.7"}, {"Empty", ""}});
+
+std::span<const uint8_t> Bytes(const std::string& text) {
+  return {reinterpret_cast<const uint8_t*>(text.data()), text.size()};
+}
+
+class ExecutableResources : public testing::Test {
+ protected:
+  // The version resource of a file of these bytes, "" for none.
+  std::string Read(const std::string& file) const {
+    std::ofstream(Path(), std::ios::binary) << file;
+    const auto resource = machine::ReadVersionResource(Path());
+    return resource ? std::string(resource->begin(), resource->end()) : "";
+  }
+
+  std::filesystem::path Path() const { return folder_.Path() / "file.exe"; }
+
+ private:
+  TemporaryFolder folder_;
+};
+
+std::string Query(const std::string& resource, const std::string& path) {
+  const auto value =
+      machine::QueryVersion(std::vector<uint8_t>(resource.begin(), resource.end()), path);
+  return value ? std::string(value->begin(), value->end()) : "none";
+}
+
+TEST_F(ExecutableResources, AreFoundInEveryKindOfProgram) {
+  const std::string other = VersionResource({{"FileVersion", "9"}});
+  for (const bool is64 : {false, true}) {
+    EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, kVersion}})), kVersion);
+    EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, other}, {0, kVersion}})), kVersion);
+    EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, kVersion}, {0x407, other}})), kVersion);
+    EXPECT_EQ(Read(PortableExecutable(is64, 16, 2, {{0, kVersion}})), "");
+    EXPECT_EQ(Read(PortableExecutable(is64, 6, 1, {{0, kVersion}})), "");
+  }
+  const std::string resources = ResourceFile({{6, 7, 0, "odd"}, {16, 1, 0, kVersion}});
+  EXPECT_EQ(Read(NativeExecutable(".moriv_res", resources) + "a package behind it"), kVersion);
+  EXPECT_EQ(Read(NativeExecutable(".other_res", resources)), "");
+  EXPECT_EQ(Read(""), "");
+  EXPECT_EQ(Read("MZ"), "");
+  EXPECT_FALSE(machine::ReadVersionResource(Path().parent_path()));
+  EXPECT_FALSE(machine::ReadVersionResource(Path().parent_path() / "absent.exe"));
+}
+
+TEST_F(ExecutableResources, OfAFileCutShortAreNone) {
+  for (const std::string& file :
+       {PortableExecutable(false, 16, 1, {{0, kVersion}}),
+        PortableExecutable(true, 16, 1, {{0, kVersion}}),
+        NativeExecutable(".moriv_res", ResourceFile({{16, 1, 0, kVersion}}))}) {
+    ASSERT_EQ(Read(file), kVersion);
+    for (size_t size = 0; size < file.size(); ++size) {
+      // The last section header of the native program holds nothing that is read but its start.
+      if (const std::string read = Read(file.substr(0, size)); !read.empty()) {
+        EXPECT_GE(size + 64, file.size());
+        EXPECT_EQ(read, kVersion);
+      }
+    }
+  }
+}
+
+// Every byte of the structures in turn is made extreme: what comes out lies within the file. Run
+// under a sanitizer this is the proof that no offset is followed unchecked.
+TEST_F(ExecutableResources, OfADamagedFileStayWithinIt) {
+  for (const std::string& sound :
+       {PortableExecutable(false, 16, 1, {{0, kVersion}}),
+        PortableExecutable(true, 16, 1, {{0, kVersion}}),
+        NativeExecutable(".moriv_res", ResourceFile({{16, 1, 0, kVersion}}))}) {
+    for (size_t at = 0; at < sound.size(); ++at) {
+      for (const int byte : {0x00, 0x01, 0x7F, 0x80, 0xFF}) {
+        std::string file = sound;
+        file[at] = static_cast<char>(byte);
+        const std::string resource = Read(file);
+        EXPECT_LE(resource.size(), file.size());
+        Query(resource, "\\StringFileInfo\\040c04b0\\FileVersion");
+        Query(resource, "\\VarFileInfo\\Translation");
+      }
+    }
+  }
+}
+
+TEST_F(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
+  const std::string file = ResourceFile({{6, 1, 0x40C, "french"},
+                                         {6, 1, 0, "neutral"},
+                                         {6, 2, 0x40C, "only"},
+                                         {6, 2, 0x407, "late"},
+                                         {14, 1, 0, ""}});
+  const auto find = [&](int type, int id) {
+    const auto found = machine::FindInResourceFile(Bytes(file), type, id);
+    return found ? std::string(found->begin(), found->end()) : "none";
+  };
+  EXPECT_EQ(find(6, 1), "neutral");
+  EXPECT_EQ(find(6, 2), "only");
+  EXPECT_EQ(find(14, 1), "");
+  EXPECT_EQ(find(6, 3), "none");
+}
+
+TEST_F(ExecutableResources, NamedEntriesOfAResourceFileArePassedOver) {
+  ByteBuilder file;
+  file.U32(3).U32(40).Wide("PIC").U16(0).Wide("A").U16(0).Align().PadTo(40).Append("abc").Align();
+  file.Append(ResourceFile({{6, 1, 0, "behind"}}));
+  const auto found = machine::FindInResourceFile(Bytes(file.bytes()), 6, 1);
+  ASSERT_TRUE(found);
+  EXPECT_EQ(std::string(found->begin(), found->end()), "behind");
+}
+
+TEST(VersionBlock, ValuesAreFoundByPath) {
+  EXPECT_EQ(Query(kVersion, "\\StringFileInfo\\040c04b0\\FileVersion"), "4.1.7");
+  EXPECT_EQ(Query(kVersion, "\\stringfileinfo\\040C04B0\\FILEVERSION"), "4.1.7");
+  EXPECT_EQ(Query(kVersion, "\\StringFileInfo\\040c04b0\\\\FileVersion"), "4.1.7");
+  EXPECT_EQ(Query(kVersion, "\\StringFileInfo\\040904b0\\FileVersion"), "none");
+  EXPECT_EQ(Query(kVersion, "\\StringFileInfo\\040c04b0\\Absent"), "none");
+  EXPECT_EQ(Query(kVersion, "\\VarFileInfo\\Translation"), std::string("\x0C\x04\xB0\x04", 4));
+  EXPECT_EQ(Query(kVersion, "\\").size(), 52u);
+  EXPECT_EQ(Query(VersionResource({}, 0x409, 0x4E4, false), "\\VarFileInfo\\Translation"), "none");
+}
+
+TEST(VersionBlock, OddLengthsOfATextDoNoHarm) {
+  const auto withValue = [](size_t length, const std::string& value) {
+    const std::string text = VersionBlock("FileVersion", true, length, value, {});
+    const std::string table = VersionBlock("040c04b0", true, 0, "", {text});
+    return VersionBlock("VS_VERSION_INFO", false, 0, "",
+                        {VersionBlock("StringFileInfo", true, 0, "", {table})});
+  };
+  const std::string path = "\\StringFileInfo\\040c04b0\\FileVersion";
+  const std::string wide = ByteBuilder().Wide("1.2").U16(0).bytes();
+  EXPECT_EQ(Query(withValue(4, wide), path), "1.2");
+  EXPECT_EQ(Query(withValue(8, wide), path), "1.2");               // counted in bytes
+  EXPECT_EQ(Query(withValue(0xFFFF, wide), path), "1.2");          // counted beyond the block
+  EXPECT_EQ(Query(withValue(3, wide.substr(0, 6)), path), "1.2");  // without a NUL
+  EXPECT_EQ(Query(withValue(2, wide), path), "1.");
+  EXPECT_EQ(Query(withValue(0, ""), path), "");
+}
+
+class VersionFunctions : public testing::Test {
+ protected:
+  void SetUp() override {
+    machine_.Write("drive_c/a.dll", PortableExecutable(false, 16, 1, {{0, kVersion}}));
+    machine_.Write("drive_c/plain.txt", "no program");
+  }
+
+  static std::unique_ptr<uint8_t[]> Block(DWORD size) {
+    auto block = std::make_unique<uint8_t[]>(size);
+    std::fill_n(block.get(), size, uint8_t{0xCD});
+    return block;
+  }
+
+  TestMachine machine_;
+};
+
+TEST_F(VersionFunctions, AnswerFromTheBlock) {
+  DWORD handle = 1;
+  const DWORD size = GetFileVersionInfoSizeA("C:\\A.DLL", &handle);
+  ASSERT_GT(size, kVersion.size());
+  EXPECT_EQ(handle, 0u);
+  const auto block = Block(size);
+  ASSERT_EQ(GetFileVersionInfoA("C:\\A.DLL", 0, size, block.get()), TRUE);
+
+  void* value = nullptr;
+  UINT length = 0;
+  ASSERT_EQ(VerQueryValueA(block.get(), "\\StringFileInfo\\040c04b0\\FileVersion", &value, &length),
+            TRUE);
+  EXPECT_EQ(length, 6u);
+  EXPECT_STREQ(static_cast<const char*>(value), "4.1.7");
+  void* company = nullptr;
+  ASSERT_EQ(
+      VerQueryValueA(block.get(), "\\StringFileInfo\\040c04b0\\CompanyName", &company, nullptr),
+      TRUE);
+  EXPECT_STREQ(static_cast<const char*>(company), "ZEB");
+  EXPECT_STREQ(static_cast<const char*>(value), "4.1.7");  // answers do not share their room
+  ASSERT_EQ(VerQueryValueA(block.get(), "\\VarFileInfo\\Translation", &value, &length), TRUE);
+  EXPECT_EQ(std::string(static_cast<const char*>(value), length),
+            std::string("\x0C\x04\xB0\x04", 4));
+  EXPECT_EQ(VerQueryValueA(block.get(), "\\Absent", &value, &length), FALSE);
+  EXPECT_EQ(length, 0u);
+}
+
+TEST_F(VersionFunctions, NothingIsFoundInABlockThatWasNotFilled) {
+  const DWORD size = GetFileVersionInfoSizeA("C:\\a.dll", nullptr);
+  const auto block = Block(size);
+  void* value = nullptr;
+  UINT length = 0;
+  EXPECT_EQ(VerQueryValueA(block.get(), "\\", &value, &length), FALSE);
+  ASSERT_EQ(GetFileVersionInfoA("C:\\a.dll", 0, size, block.get()), TRUE);
+  EXPECT_EQ(GetFileVersionInfoA("C:\\a.dll", 0, size - 1, block.get()), FALSE);
+  EXPECT_EQ(VerQueryValueA(block.get(), "\\", &value, &length), FALSE);
+  EXPECT_EQ(GetFileVersionInfoA("C:\\plain.txt", 0, size, block.get()), FALSE);
+  EXPECT_EQ(GetFileVersionInfoSizeA("C:\\plain.txt", nullptr), 0u);
+  EXPECT_EQ(GetFileVersionInfoSizeA("C:\\absent.dll", nullptr), 0u);
+}
+
+// A text that fills the resource to its last byte, without a NUL, has the tightest copy.
+TEST_F(VersionFunctions, TextAtTheVeryEndFitsTheRoom) {
+  const std::string text = VersionBlock("T", true, 9, ByteBuilder().Wide("123456789").bytes(), {});
+  const std::string resource = VersionBlock("VS_VERSION_INFO", false, 0, "", {text});
+  machine_.Write("drive_c/tight.exe", PortableExecutable(true, 16, 1, {{0, resource}}));
+  const DWORD size = GetFileVersionInfoSizeA("C:\\tight.exe", nullptr);
+  const auto block = Block(size);
+  ASSERT_EQ(GetFileVersionInfoA("C:\\tight.exe", 0, size, block.get()), TRUE);
+  void* value = nullptr;
+  UINT length = 0;
+  ASSERT_EQ(VerQueryValueA(block.get(), "\\T", &value, &length), TRUE);
+  EXPECT_EQ(length, 10u);
+  EXPECT_STREQ(static_cast<const char*>(value), "123456789");
+  EXPECT_LE(static_cast<uint8_t*>(value) + length, block.get() + size);
+}
+
+}  // namespace

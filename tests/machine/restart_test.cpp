@@ -1,0 +1,113 @@
+// What the system does at its next start.
+#include <gtest/gtest.h>
+
+#include "machine/registry_store.h"
+#include "tests/support/test_machine.h"
+
+namespace {
+
+constexpr char kInf[] =
+    "[Version]\r\nSignature=$Chicago$\r\nAdvancedINF=2.0\r\n\r\n"
+    "[Uninstall]\r\nDelFiles=RemoveFiles\r\n\r\n"
+    "[RemoveFiles]\r\nMorivRmv.exe\r\nMorivLog.txt\r\nMoriv.INF\r\n\r\n"
+    "[DestinationDirs]\r\nRemoveFiles = 10\r\n";
+
+constexpr char kNtCommand[] =
+    "C:\\windows\\system32\\rundll32.exe setupapi.dll,InstallHinfSection Uninstall 132 "
+    "C:\\windows\\Moriv.INF";
+
+class Restart : public testing::Test {
+ protected:
+  void SetUp() override {
+    machine_.Write("drive_c/windows/MorivRmv.exe", "program");
+    machine_.Write("drive_c/windows/Other.exe", "stays");
+    machine_.Write("drive_c/windows/Moriv.INF", kInf);
+  }
+
+  static std::shared_ptr<machine::RegistryKey> RunOnce() {
+    return machine::FindKey(machine::LocalMachine(),
+                            "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce");
+  }
+
+  static void Add(const std::string& name, const std::string& command) {
+    machine::RegistryValue value;
+    value.name = name;
+    value.data.assign(command.begin(), command.end());
+    value.data.push_back(0);
+    RunOnce()->values.push_back(value);
+  }
+
+  TestMachine machine_;
+};
+
+TEST_F(Restart, DeletesWhatTheInfFileListsAndTakesTheCommandAway) {
+  Add("MorivCommand", kNtCommand);
+  EXPECT_EQ(machine::Restart(), "run MorivCommand: " + std::string(kNtCommand) +
+                                    "\n"
+                                    "  delete C:\\windows\\MorivRmv.exe\n"
+                                    "  C:\\windows\\MorivLog.txt is not there\n"
+                                    "  delete C:\\windows\\Moriv.INF\n");
+  EXPECT_FALSE(machine_.Has("drive_c/windows/MorivRmv.exe"));
+  EXPECT_FALSE(machine_.Has("drive_c/windows/Moriv.INF"));
+  EXPECT_TRUE(machine_.Has("drive_c/windows/Other.exe"));
+  EXPECT_EQ(machine_.Read("registry.reg").find("MorivCommand"), std::string::npos);
+  EXPECT_EQ(machine::Restart(), "");
+}
+
+TEST_F(Restart, UnderstandsTheOtherFamilyAndBlanksInPaths) {
+  machine::CurrentSettings().windowsDirectory = "C:\\My Windows";
+  machine_.Write("drive_c/My Windows/MorivRmv.exe", "program");
+  machine_.Write("drive_c/My Windows/Moriv.INF", kInf);
+  Add("MorivCommand",
+      "C:\\My Windows\\rundll.exe setupx.dll,InstallHinfSection Uninstall 132 "
+      "C:\\My Windows\\Moriv.INF ");
+  machine::Restart();
+  EXPECT_FALSE(machine_.Has("drive_c/My Windows/MorivRmv.exe"));
+  EXPECT_FALSE(machine_.Has("drive_c/My Windows/Moriv.INF"));
+  EXPECT_TRUE(machine_.Has("drive_c/windows/MorivRmv.exe"));
+}
+
+TEST_F(Restart, EveryValueGoesInOrderWhateverBecomesOfIt) {
+  machine_.Write("drive_c/unsigned.inf", "[Uninstall]\nDelFiles=RemoveFiles\n");
+  machine_.Write("drive_c/elsewhere.inf",
+                 "[Version]\nSignature=\"$Windows NT$\"\n[Uninstall]\nDelFiles=A,B\n"
+                 "[A]\nMorivRmv.exe\n[B]\nOther.exe\n[DestinationDirs]\nA=11\n");
+  const std::string start = "rundll32.exe setupapi.dll,InstallHinfSection ";
+  Add("First", "C:\\windows\\notepad.exe");
+  Add("Second", start + "Uninstall 132 C:\\absent.inf");
+  Add("Third", start + "Uninstall 132 C:\\unsigned.inf");
+  Add("Fourth", start + "Absent 132 C:\\windows\\Moriv.INF");
+  Add("Fifth", start + "Uninstall 132 C:\\elsewhere.inf");
+  Add("Sixth", start + "Uninstall mode C:\\windows\\Moriv.INF");
+  Add("Seventh", "not" + start + "Uninstall 132 C:\\windows\\Moriv.INF");
+  EXPECT_EQ(machine::Restart(),
+            "run First: C:\\windows\\notepad.exe\n  not understood\n"
+            "run Second: " +
+                start +
+                "Uninstall 132 C:\\absent.inf\n"
+                "  C:\\absent.inf can't be read\n"
+                "run Third: " +
+                start +
+                "Uninstall 132 C:\\unsigned.inf\n"
+                "  C:\\unsigned.inf is no INF file\n"
+                "run Fourth: " +
+                start +
+                "Absent 132 C:\\windows\\Moriv.INF\n"
+                "  C:\\windows\\Moriv.INF has no section Absent\n"
+                "run Fifth: " +
+                start +
+                "Uninstall 132 C:\\elsewhere.inf\n"
+                "  A: the directory 11 is not understood\n"
+                "  B: the directory  is not understood\n"
+                "run Sixth: " +
+                start +
+                "Uninstall mode C:\\windows\\Moriv.INF\n  not understood\n"
+                "run Seventh: not" +
+                start +
+                "Uninstall 132 C:\\windows\\Moriv.INF\n"
+                "  not understood\n");
+  EXPECT_TRUE(RunOnce()->values.empty());
+  EXPECT_TRUE(machine_.Has("drive_c/windows/MorivRmv.exe"));
+}
+
+}  // namespace

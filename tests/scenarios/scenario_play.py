@@ -1,0 +1,331 @@
+"""Plays one scenario on one machine: prepares it, starts what the scenario starts, and compares."""
+
+import difflib
+import random
+import re
+import subprocess
+from datetime import datetime, timedelta
+
+import file_tree
+import registry_text
+from package_image import Image, ImageError, damage
+from registry_text import RegistryError
+from scenario_text import ACTIONS, CHECKS, ScenarioError
+
+LOG = r'C:\windows\MorivLog.txt'
+LANGUAGES = {'English': 0, 'French': 10000, 'German': 20000, 'Italian': 30000, 'Spanish': 40000}
+
+# What a removal leaves for the system's INF installer; one scenario has it line by line.
+INF_FILE = '\r\n'.join([
+    '[Version]', 'Signature=$Chicago$', 'AdvancedINF=2.0', '', '[Uninstall]', 'DelFiles=RemoveFiles',
+    '', '[RemoveFiles]', 'MorivRmv.exe', 'MorivLog.txt', 'Moriv.INF', '', '[DestinationDirs]',
+    'RemoveFiles = 10', '']).encode('ascii')
+
+
+class ScenarioFailure(Exception):
+    """What a scenario says and what there was differ; the message has both, several lines long."""
+
+
+def play(scenario, machine, tools, folder):
+    """Raises ScenarioFailure, or ScenarioError for a scenario that can't be carried out.
+
+    tools: has `stub`, `image_tool` and `content`, see PackedImages; folder: for the images' sources.
+    """
+    player = _Player(machine, tools, folder)
+    sections = list(scenario.sections)
+    while sections:
+        section = sections.pop(0)
+        if section.keyword in ACTIONS:
+            checks = []
+            while sections and sections[0].keyword in CHECKS:
+                checks.append(sections.pop(0))
+            player.act(section, checks)
+        else:
+            player.prepare(section)
+
+
+def sample_bytes(seed, size):
+    """Bytes that a packer finds partly easy and partly hard; always the same for the same seed."""
+    source = random.Random(seed)
+    phrase = source.randbytes(23)
+    blocks, length = [], 0
+    while length < size:
+        block = source.choice([phrase * 9, source.randbytes(97), bytes(200), phrase[:7] * 20])
+        blocks.append(block)
+        length += len(block)
+    return b''.join(blocks)[:size]
+
+
+class _Player:
+    def __init__(self, machine, tools, folder):
+        self.machine = machine
+        self.tools = tools
+        self.folder = folder
+        self.images = {}      # path -> the image's bytes
+        self.originals = {}   # image path -> {file name: content}
+        self.now = None       # the machine's own time, when it is set
+
+    # Preparations
+
+    def prepare(self, section):
+        try:
+            getattr(self, '_' + section.keyword.replace(' ', '_'))(section)
+        except (ImageError, RegistryError, ValueError) as error:
+            raise ScenarioError(f'{section.place}: {error}') from error
+
+    def _given_machine(self, section):
+        self.machine.settings(section.body)
+        for line in section.body:
+            if line.startswith('now = '):
+                self.now = datetime.fromisoformat(line[len('now = '):])
+
+    def _given_files(self, section):
+        for line in section.body:
+            if line.startswith('- '):
+                self.machine.files.delete(line[2:])
+                continue
+            path, _, content = line.partition(' = ')
+            self.machine.add_drive(path[0].lower())
+            if path.endswith('\\'):
+                self.machine.files.host(path).mkdir(parents=True, exist_ok=True)
+            else:
+                words, read_only, _ = content.partition(' read-only')
+                self.machine.files.write(path, self.given_content(words, path), bool(read_only))
+
+    def _given_registry(self, section):
+        self.machine.set_registry(self.machine.registry().apply(section.body))
+
+    def _given_image(self, section):
+        path = section.argument
+        packed = PackedImage(section.body, self.given_content)
+        data = packed.make(self.tools, self.folder / path.rpartition('\\')[2])
+        self.originals[path] = packed.contents
+        self._place(path, data)
+
+    def _given_run(self, section):
+        """A run that other scenarios look at closely; here it has to succeed, no more."""
+        outcome = self.machine.run(*_program_and_arguments(section))
+        if outcome.exit_code != 1 or outcome.trouble:
+            raise ScenarioFailure(f'{section.place}: given run {section.argument}\n'
+                                  f'exit code {outcome.exit_code} {outcome.trouble}')
+
+    def _damage(self, section):
+        data = self.images[section.argument]
+        for line in section.body:
+            data = damage(data, line)
+        self._place(section.argument, data)
+
+    def _place(self, path, data):
+        self.images[path] = data
+        self.machine.add_drive(path[0].lower())
+        self.machine.files.write(path, data)
+
+    def given_content(self, text, seed):
+        """The bytes that the words behind a file's '=' stand for."""
+        if re.fullmatch(r'\d+ bytes', text):
+            return sample_bytes(seed, int(text.split()[0]))
+        if re.fullmatch('".*"', text):
+            return _unescape(text[1:-1])
+        kind, _, name = text.partition(' ')
+        content = self.tools.content(kind, name)
+        if content is None:
+            raise ValueError(f'no such content: {text}')
+        return content
+
+    # Actions
+
+    def act(self, section, checks):
+        files = self.machine.files.snapshot()
+        registry = self.machine.registry()
+        report = []
+        if section.keyword == 'restart':
+            self.machine.restart()
+            shown = exit_code = None
+        else:
+            outcome = self.machine.run(*_program_and_arguments(section))
+            shown, exit_code = outcome.shown, outcome.exit_code
+            if outcome.trouble:
+                report.append(outcome.trouble)
+        found = _Found(exit_code, shown, file_tree.changes(files, self.machine.files.snapshot()),
+                       registry_text.changes(registry, self.machine.registry()))
+        report += self._compare(found, checks, section)
+        if report:
+            raise ScenarioFailure('\n'.join([f'{section.place}: {section.keyword} {section.argument}',
+                                             *report]))
+
+    def _compare(self, found, checks, action):
+        said = {check.keyword: check for check in checks}
+        body = lambda keyword: said[keyword].body if keyword in said else []
+        if action.keyword == 'run' and 'exit' not in said:
+            raise ScenarioError(f'{action.place}: a run without an exit code')
+        report = []
+        if action.keyword == 'run':
+            actual = 'none' if found.exit_code is None else str(found.exit_code)
+            report += _difference('exit code', [said['exit'].argument], [actual])
+            report += _difference('shown', body('shown'), [f'|{line}|' for line in found.shown])
+        texts = {(c.argument or LOG): c for c in checks if c.keyword in ('log', 'text')}
+        for path, check in texts.items():
+            expected = (['heading'] if check.keyword == 'log' else []) + check.body
+            lines = self._text_lines(path, found.files, 'heading' in expected)
+            report += _difference(path, expected, lines)
+        files = {path: sign for path, sign in found.files.items() if path not in texts}
+        report += self._compare_files(body('files'), files, action.place)
+        report += _difference('registry', [line.rstrip() for line in body('registry')], found.registry)
+        return report
+
+    def _text_lines(self, path, changed, headings):
+        """The lines of a text file that the run wrote, as a text section has them; headings: with one
+        word for the four lines of a log's heading."""
+        if changed.get(path) not in ('+', '~'):
+            return [f'(the run did not write {path})']
+        text = self.machine.files.read(path).decode('cp1252', 'replace')
+        lines = []
+        parts = re.split(r'(\r\n\r\nInstalling Moriv : .*? \r\n\r\n)', text) if headings else [text]
+        for part in parts:
+            if headings and part.startswith('\r\n\r\nInstalling Moriv : '):
+                lines.append(self._heading_line(part))
+            elif part:
+                lines += [f'|{line}|' for line in part.split('\r\n')]
+                # What stands behind the last line end: nothing, as it should be.
+                if lines.pop() != '||':
+                    lines.append(f'|{part.split(chr(10))[-1]}| without a line end')
+        return lines
+
+    def _heading_line(self, text):
+        """'heading' if the time in it is good, else what it says."""
+        stamp = text.strip()[len('Installing Moriv : '):]
+        try:
+            time = datetime.strptime(stamp, '%A, %d %B %Y at : %Hh %Mm %Ss')
+        except ValueError:
+            return f'heading with the time "{stamp}"'
+        # Parsing takes any name of a day and numbers without their zero.
+        exact = time.strftime('%A, %d %B %Y at : %Hh %Mm %Ss') == stamp
+        near = abs(time - (self.now or datetime.now())) <= timedelta(minutes=0 if self.now else 10)
+        return 'heading' if exact and near else f'heading with the time "{stamp}"'
+
+    def _compare_files(self, lines, found, place):
+        expected, actual = [], []
+        for line in lines:
+            sign, path, words = _split_file_line(line, place)
+            expected.append(line)
+            if found.get(path) != sign:
+                continue
+            del found[path]
+            trouble = '' if sign == '-' or path.endswith('\\') else self._content_trouble(path, words, place)
+            actual.append(line + trouble)
+        for path, sign in found.items():
+            size = '' if sign == '-' or path.endswith('\\') else f' = {len(self.machine.files.read(path))} bytes'
+            actual.append(f'{sign} {path}{size}')
+        return _difference('files', sorted(expected), sorted(actual))
+
+    def _content_trouble(self, path, words, place):
+        expected = self._expected_content(words, place)
+        actual = self.machine.files.read(path)
+        if actual == expected:
+            return ''
+        common = min(len(actual), len(expected))
+        at = next((i for i in range(common) if actual[i] != expected[i]), common)
+        return f' BUT {len(actual)} bytes for {len(expected)}, other from byte {at} on'
+
+    def _expected_content(self, words, place):
+        if words == 'the INF file':
+            return INF_FILE
+        original = re.fullmatch(r'original (\S+)(?: of (.+))?', words)
+        if original:
+            contents = self.originals[original[2]] if original[2] else self._only_originals(place)
+            if original[1] in contents:
+                return contents[original[1]]
+        removal = re.fullmatch(r'removal program of (.+) in (\w+)', words)
+        if removal and removal[1] in self.images:
+            number = LANGUAGES.get(removal[2], removal[2])
+            return Image(self.images[removal[1]]).removal_program(int(number))
+        if re.fullmatch('".*"', words):
+            return _unescape(words[1:-1])
+        raise ScenarioError(f'{place}: no such content: {words}')
+
+    def _only_originals(self, place):
+        if len(self.originals) != 1:
+            raise ScenarioError(f'{place}: original NAME of which image?')
+        return next(iter(self.originals.values()))
+
+
+class _Found:
+    def __init__(self, exit_code, shown, files, registry):
+        self.exit_code, self.shown, self.files, self.registry = exit_code, shown, files, registry
+
+
+class PackedImage:
+    """A setup image as a 'given image' section describes it, made with the image tool."""
+
+    def __init__(self, body, given_content):
+        self.options = {'default_directory': "'C:\\Program Files\\Moriv'",
+                        'default_language': '"french"'}
+        self.flags = []       # of the image tool
+        self.files = []       # (name, destination)
+        self.contents = {}    # name -> bytes
+        for line in body:
+            if ' -> ' in line:
+                self._add_file(line, given_content)
+            else:
+                self._set_option(line)
+
+    def _add_file(self, line, given_content):
+        words, _, destination = line.partition(' -> ')
+        name, _, content = words.partition(' = ')
+        self.files.append((name, destination))
+        self.contents[name] = given_content(content, 'packed ' + name)
+
+    def _set_option(self, line):
+        name, _, value = line.partition(' = ')
+        if name == 'default directory':
+            self.options['default_directory'] = f"'{value}'"
+        elif name == 'default language':
+            self.options['default_language'] = f'"{value}"'
+        elif name == 'space needed':
+            self.options['space_needed'] = value
+        elif name == 'removal':
+            self.options['removal'] = 'true'
+        elif name == 'allow unknown macros':
+            self.flags.append('--allow-unknown-macros')
+        else:
+            raise ValueError(f'no such line of an image: {line}')
+
+    def make(self, tools, folder):
+        """The image's bytes; folder takes the sources and is made here."""
+        folder.mkdir(parents=True)
+        lines = ['[package]', *(f'{name} = {value}' for name, value in self.options.items())]
+        for name, destination in self.files:
+            (folder / name).write_bytes(self.contents[name])
+            lines += ['[[file]]', f"source = '{name}'", f"destination = '{destination}'"]
+        description, image = folder / 'package.toml', folder / 'image.packed'
+        description.write_text('\n'.join(lines) + '\n', encoding='utf-8')
+        done = subprocess.run([tools.image_tool, 'pack', description, '--stub', tools.stub,
+                               '-o', image, *self.flags], capture_output=True, text=True)
+        if done.returncode != 0:
+            raise ValueError(done.stderr.strip())
+        return image.read_bytes()
+
+
+def _program_and_arguments(section):
+    program, _, arguments = section.argument.partition(' ')
+    return program, arguments
+
+
+def _split_file_line(line, place):
+    match = re.fullmatch(r'([-+~]) (.*?)(?: = (.+))?', line)
+    if not match or (match[3] is None) != (match[1] == '-' or match[2].endswith('\\')):
+        raise ScenarioError(f'{place}: not a line of files: {line}')
+    return match[1], match[2], match[3]
+
+
+def _unescape(text):
+    escapes = {'r': '\r', 'n': '\n', 't': '\t'}
+    return re.sub(r'\\(.)', lambda m: escapes.get(m[1], m[1]), text).encode('cp1252')
+
+
+def _difference(what, expected, actual):
+    if expected == actual:
+        return []
+    diff = difflib.ndiff(expected, actual)
+    return [f'{what}: "-" is what the scenario says, "+" what there was',
+            *('    ' + line for line in diff if not line.startswith('?'))]

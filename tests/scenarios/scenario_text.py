@@ -1,0 +1,86 @@
+"""Reads scenario files (README.md has the format)."""
+
+import re
+from dataclasses import dataclass, field
+
+# What a section may be. A world's line comes first; "given" sections and "damage" prepare the machine;
+# actions start something; checks say what the action before them has to have done.
+WORLDS = ('only stand-in', 'only Wine')
+PREPARATIONS = ('given machine', 'given files', 'given registry', 'given image', 'given run',
+                'damage')
+ACTIONS = ('run', 'restart')
+CHECKS = ('exit', 'shown', 'log', 'text', 'files', 'registry')
+VERBATIM = ('shown', 'log', 'text')
+
+_KEYWORD = re.compile('(' + '|'.join(WORLDS + PREPARATIONS + ACTIONS + CHECKS) + r')(?:: |:?$| )(.*)')
+
+
+class ScenarioError(Exception):
+    """A scenario that is wrong in itself, in one line with file and line number."""
+
+
+@dataclass
+class Section:
+    keyword: str
+    argument: str            # the rest of its first line
+    place: str               # FILE:LINE, for messages
+    body: list = field(default_factory=list)
+
+
+@dataclass
+class Scenario:
+    name: str
+    title: str               # first comment line
+    only: str                # '' or the one world, 'stand-in' or 'Wine'
+    reason: str              # why only there
+    sections: list
+
+
+def parse(name, text, file_name):
+    """Raises ScenarioError, which names the line."""
+    sections, title = [], ''
+    for number, line in enumerate(text.splitlines(), 1):
+        place = f'{file_name}:{number}'
+        if line.startswith('#'):
+            title = title or line[1:].strip()
+        elif line.startswith('  ') and sections:
+            body_line = line[2:]
+            if not body_line.startswith('#'):
+                sections[-1].body.append(body_line)
+        elif line.strip():
+            match = _KEYWORD.match(line)
+            if not match:
+                raise ScenarioError(f'{place}: no such section: {line}')
+            sections.append(Section(match[1], match[2].strip(), place))
+    for section in sections:
+        if section.keyword in VERBATIM:
+            _check_verbatim(section)
+    return _scenario(name, title, sections, file_name)
+
+
+def _check_verbatim(section):
+    """'|TEXT|' is TEXT, so that blanks at a line's end are seen; 'heading' is a log's heading."""
+    for line in section.body:
+        if line != 'heading' and (len(line) < 2 or line[0] != '|' or line[-1] != '|'):
+            raise ScenarioError(f'{section.place}: a line of text stands between bars: {line}')
+
+
+def _scenario(name, title, sections, file_name):
+    only = reason = ''
+    if sections and sections[0].keyword in WORLDS:
+        only, reason = sections[0].keyword[len('only '):], sections[0].argument
+        sections = sections[1:]
+        if not reason:
+            raise ScenarioError(f'{file_name}: only one world, but no reason')
+    for section in sections:
+        if section.keyword in WORLDS:
+            raise ScenarioError(f'{section.place}: the world stands in the first section')
+        if section.keyword == 'given machine' and only != 'stand-in':
+            raise ScenarioError(f'{section.place}: only the stand-in has settings')
+    if not any(section.keyword in ACTIONS for section in sections):
+        raise ScenarioError(f'{file_name}: nothing is run')
+    for before, section in zip([None, *sections], sections):
+        after_action = before is not None and before.keyword in ACTIONS + CHECKS
+        if section.keyword in CHECKS and not after_action:
+            raise ScenarioError(f'{section.place}: a check stands behind what it checks')
+    return Scenario(name, title, only, reason, sections)

@@ -1,0 +1,160 @@
+// Small executables with a version resource, byte by byte, for tests that read them.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+class ByteBuilder {
+ public:
+  ByteBuilder& U16(uint64_t number) { return Number(number, 2); }
+  ByteBuilder& U32(uint64_t number) { return Number(number, 4); }
+  ByteBuilder& U64(uint64_t number) { return Number(number, 8); }
+  ByteBuilder& Append(std::string_view bytes) {
+    bytes_ += bytes;
+    return *this;
+  }
+  // ASCII as UTF-16, without a NUL.
+  ByteBuilder& Wide(std::string_view text) {
+    for (const char byte : text) U16(static_cast<unsigned char>(byte));
+    return *this;
+  }
+  // Zero bytes up to the offset.
+  ByteBuilder& PadTo(size_t offset) {
+    if (bytes_.size() < offset) bytes_.resize(offset);
+    return *this;
+  }
+  ByteBuilder& Align() { return PadTo((bytes_.size() + 3) & ~size_t{3}); }
+
+  const std::string& bytes() const { return bytes_; }
+
+ private:
+  ByteBuilder& Number(uint64_t number, int width) {
+    for (int byte = 0; byte < width; ++byte) {
+      bytes_ += static_cast<char>(static_cast<uint8_t>(number >> (8 * byte)));
+    }
+    return *this;
+  }
+
+  std::string bytes_;
+};
+
+// A block of a version resource. Blocks in it begin at multiples of 4, as the block itself must.
+inline std::string VersionBlock(std::string_view key, bool isText, size_t valueLength,
+                                std::string_view value, const std::vector<std::string>& children) {
+  ByteBuilder body;
+  body.U16(0).U16(valueLength).U16(isText ? 1 : 0).Wide(key).U16(0).Align().Append(value);
+  for (const std::string& child : children) body.Align().Append(child);
+  ByteBuilder block;
+  return block.U16(body.bytes().size()).Append(std::string_view(body.bytes()).substr(2)).bytes();
+}
+
+inline std::string VersionString(std::string_view key, std::string_view text) {
+  return VersionBlock(key, true, text.size() + 1, ByteBuilder().Wide(text).U16(0).bytes(), {});
+}
+
+// A version resource with one string table, named by language and code page, and with a translation
+// unless `translation` is false.
+inline std::string VersionResource(const std::vector<std::pair<std::string, std::string>>& strings,
+                                   uint16_t language = 0x040C, uint16_t codePage = 0x04B0,
+                                   bool translation = true) {
+  std::vector<std::string> blocks;
+  for (const auto& [key, text] : strings) blocks.push_back(VersionString(key, text));
+  constexpr char kDigits[] = "0123456789abcdef";
+  std::string name;
+  for (const uint16_t part : {language, codePage}) {
+    for (int shift = 12; shift >= 0; shift -= 4) name += kDigits[part >> shift & 15];
+  }
+  std::vector<std::string> children = {
+      VersionBlock("StringFileInfo", true, 0, "", {VersionBlock(name, true, 0, "", blocks)})};
+  if (translation) {
+    const std::string pair = ByteBuilder().U16(language).U16(codePage).bytes();
+    children.push_back(VersionBlock("VarFileInfo", true, 0, "",
+                                    {VersionBlock("Translation", false, 4, pair, {})}));
+  }
+  const std::string fixed = ByteBuilder().U32(0xFEEF04BD).PadTo(52).bytes();
+  return VersionBlock("VS_VERSION_INFO", false, fixed.size(), fixed, children);
+}
+
+struct Resource {
+  uint16_t type;
+  uint16_t id;
+  uint16_t language;
+  std::string data;
+};
+
+// The bytes of a .res file.
+inline std::string ResourceFile(const std::vector<Resource>& resources) {
+  ByteBuilder file;
+  file.U32(0).U32(32).U16(0xFFFF).U16(0).U16(0xFFFF).U16(0).PadTo(32);
+  for (const Resource& resource : resources) {
+    file.U32(resource.data.size()).U32(32);
+    file.U16(0xFFFF).U16(resource.type).U16(0xFFFF).U16(resource.id);
+    file.U32(0).U16(0).U16(resource.language).U32(0).U32(0).Append(resource.data).Align();
+  }
+  return file.bytes();
+}
+
+// A Windows program of headers and one section, which holds the resources of one type and id in
+// the languages given, each with its own data.
+//
+//   0    "MZ", at 60 the position of the PE header
+//   64   PE header, section header
+//   512  section: the three directories, the leaves, the data
+inline std::string PortableExecutable(
+    bool is64, uint16_t type, uint16_t id,
+    const std::vector<std::pair<uint16_t, std::string>>& languages) {
+  constexpr uint32_t kAddress = 0x1000;
+  constexpr uint32_t kPosition = 512;
+  constexpr uint32_t kDirectory = 0x80000000;
+  const size_t count = languages.size();
+  const uint64_t leaves = 24 + 24 + 16 + 8 * count;
+
+  ByteBuilder section;
+  section.PadTo(12).U16(0).U16(1).U32(type).U32(kDirectory | 24);
+  section.PadTo(24 + 12).U16(0).U16(1).U32(id).U32(kDirectory | 48);
+  section.PadTo(48 + 12).U16(0).U16(count);
+  for (size_t index = 0; index < count; ++index) {
+    section.U32(languages[index].first).U32(leaves + 16 * index);
+  }
+  uint64_t data = leaves + 16 * count;
+  for (const auto& [language, bytes] : languages) {
+    section.U32(kAddress + data).U32(bytes.size()).U32(0).U32(0);
+    data = (data + bytes.size() + 3) & ~uint64_t{3};
+  }
+  for (const auto& [language, bytes] : languages) section.Append(bytes).Align();
+
+  const size_t optional = 64 + 24;
+  const size_t directories = is64 ? 112 : 96;
+  const size_t optionalSize = directories + 16 * 8;
+  ByteBuilder file;
+  file.Append("MZ").PadTo(60).U32(64);
+  file.Append("PE").U16(0).U16(is64 ? 0x8664 : 0x14C).U16(1).PadTo(64 + 20);
+  file.U16(optionalSize).U16(0).U16(is64 ? 0x20B : 0x10B);
+  file.PadTo(optional + directories - 4).U32(16);
+  file.PadTo(optional + directories + 2 * 8).U32(kAddress).U32(section.bytes().size());
+  file.PadTo(optional + optionalSize).Append(".rsrc").PadTo(optional + optionalSize + 8);
+  file.U32(section.bytes().size()).U32(kAddress).U32(section.bytes().size()).U32(kPosition);
+  return file.PadTo(kPosition).Append(section.bytes()).bytes();
+}
+
+// A native program: ELF header, the section names, the section, the section headers.
+inline std::string NativeExecutable(std::string_view sectionName, std::string_view section) {
+  ByteBuilder names;
+  names.PadTo(1).Append(sectionName).Append(std::string_view("\0", 1));
+  const uint64_t sectionAt = 64 + names.bytes().size();
+  const uint64_t headersAt = sectionAt + section.size();
+  ByteBuilder file;
+  file.Append("\x7F").Append("ELF").Append("\x02\x01\x01").PadTo(40).U64(headersAt);
+  file.PadTo(58).U16(64).U16(3).U16(2).Append(names.bytes()).Append(section);
+  const auto header = [&](uint64_t name, uint64_t offset, uint64_t size) {
+    const size_t start = file.bytes().size();
+    file.U32(name).U32(1).PadTo(start + 24).U64(offset).U64(size).PadTo(start + 64);
+  };
+  header(0, 0, 0);
+  header(1, sectionAt, section.size());
+  header(0, 64, names.bytes().size());
+  return file.bytes();
+}

@@ -1,0 +1,72 @@
+// A stand-in machine in a temporary folder of its own, for one test.
+#pragma once
+
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <cstdint>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "machine/machine.h"
+
+class TemporaryFolder {
+ public:
+  TemporaryFolder() {
+    std::string name = (std::filesystem::temp_directory_path() / "moriv-test-XXXXXX").string();
+    EXPECT_NE(mkdtemp(name.data()), nullptr);
+    path_ = std::filesystem::canonical(name);
+  }
+  ~TemporaryFolder() { std::filesystem::remove_all(path_); }
+
+  TemporaryFolder(const TemporaryFolder&) = delete;
+  TemporaryFolder& operator=(const TemporaryFolder&) = delete;
+
+  const std::filesystem::path& Path() const { return path_; }
+
+ private:
+  std::filesystem::path path_;
+};
+
+class TestMachine {
+ public:
+  // Starts the machine with these settings, the text of machine.ini.
+  explicit TestMachine(const std::string& settings = "") {
+    if (!settings.empty()) Write("machine.ini", settings);
+    Restart();
+  }
+
+  ~TestMachine() { machine::Stop(); }
+
+  TestMachine(const TestMachine&) = delete;
+  TestMachine& operator=(const TestMachine&) = delete;
+
+  // Starts it anew, for a program whose file is `image` in the machine's folder ("" for none).
+  void Restart(const std::string& image = "") {
+    machine::Stop();
+    std::string error;
+    ASSERT_TRUE(machine::Start(folder_.Path(), image.empty() ? "" : Host(image), &error)) << error;
+  }
+
+  // Host path of a file of the machine: "drive_c/windows/a.txt".
+  std::filesystem::path Host(const std::string& path) const { return folder_.Path() / path; }
+
+  // Writes a file behind the program's back, its directories too.
+  void Write(const std::string& path, const std::string& bytes) const {
+    std::filesystem::create_directories(Host(path).parent_path());
+    std::ofstream(Host(path), std::ios::binary) << bytes;
+  }
+
+  std::string Read(const std::string& path) const {
+    std::ostringstream bytes;
+    bytes << std::ifstream(Host(path), std::ios::binary).rdbuf();
+    return bytes.str();
+  }
+
+  bool Has(const std::string& path) const { return std::filesystem::exists(Host(path)); }
+
+ private:
+  TemporaryFolder folder_;
+};

@@ -1,0 +1,229 @@
+// Packing: what an image holds, and which descriptions, sources and stubs are refused.
+
+#include "tools/image/image_builder.h"
+
+#include <string>
+
+#include "tests/tools/tool_bench.h"
+#include "tools/image/record_text.h"
+
+namespace {
+
+using ImageBuilder = ToolBench;
+
+// A description whose one file has this destination, on line 3.
+std::string WithDestination(const std::string& destination) {
+  return "[[file]]\nsource = 'a.exe'\ndestination = '" + destination + "'\n";
+}
+
+std::string WithName(const std::string& name) {
+  return "[[file]]\nsource = 'a.exe'\nname = \"" + name + "\"\ndestination = 'x'\n";
+}
+
+std::string WithDirectory(const std::string& directory) {
+  return "[package]\ndefault_directory = '" + directory + "'\n" + WithDestination("%INSTALL_DIR%");
+}
+
+struct BadDescription {
+  std::string text;
+  int line;
+  std::string said;  // part of the message
+};
+
+}  // namespace
+
+TEST_F(ImageBuilder, WritesEveryFieldOfHeaderAndRecords) {
+  PackSample();
+  const std::vector<uint8_t> stub = Read("stub.exe");
+  const std::vector<uint8_t> image = Read("image.exe");
+  EXPECT_TRUE(std::equal(stub.begin(), stub.end(), image.begin()));
+
+  const PackageHeader header = HeaderOf("image.exe");
+  EXPECT_EQ(header.headerSize, 568);
+  EXPECT_STREQ(header.magic, "MORIV INSTALL DATA HEADER");
+  EXPECT_EQ(header.recordCount, 3);
+  EXPECT_EQ(header.removalImageFlag, 0);
+  EXPECT_EQ(header.spaceNeeded, 48056u);
+  EXPECT_EQ(header.packageLength, image.size() - stub.size());
+  EXPECT_EQ(header.dataOffset, stub.size());
+  EXPECT_STREQ(header.defaultDirectory, "C:\\Program Files\\Moriv");
+  EXPECT_EQ(header.defaultLanguage, 10000);
+
+  const FileRecord fromResource = RecordOf("image.exe", 0);
+  EXPECT_STREQ(fromResource.fileName, "a.exe");
+  EXPECT_STREQ(fromResource.destination, "%INSTALL_DIR%");
+  EXPECT_STREQ(fromResource.versionLanguage, "040c04b0");
+  EXPECT_EQ(fromResource.versionFirst, 4);
+  EXPECT_EQ(fromResource.versionSecond, 1);
+  EXPECT_EQ(fromResource.versionThird, 7);
+  EXPECT_EQ(fromResource.fileSize, 45056u);
+  const FileRecord asTold = RecordOf("image.exe", 1);
+  EXPECT_STREQ(asTold.versionLanguage, "040904b0");
+  EXPECT_EQ(asTold.versionFirst, 1);
+  EXPECT_EQ(asTold.versionThird, 3);
+  const FileRecord without = RecordOf("image.exe", 2);
+  EXPECT_STREQ(without.fileName, "readme.txt");
+  EXPECT_STREQ(without.versionLanguage, "");
+  EXPECT_EQ(without.versionFirst, kVersionNotSet);
+  EXPECT_EQ(without.versionThird, kVersionNotSet);
+  EXPECT_EQ(without.storedSize, 4u);
+  EXPECT_EQ(RecordOffset("image.exe", 3), image.size() - 568);
+}
+
+TEST_F(ImageBuilder, DependsOnNothingButItsInputs) {
+  PackSample();
+  std::filesystem::create_directory(Path("elsewhere"));
+  std::filesystem::copy_file(Path("setup.toml"), Path("elsewhere/other.toml"));
+  const ToolRun run = RunImage({"pack", "@elsewhere/other.toml", "--stub", "@stub.exe", "-o",
+                                "@second.exe", "--source-dir", "@"});
+  ASSERT_EQ(run.status, 0) << run.err;
+  EXPECT_TRUE(Read("image.exe") == Read("second.exe"));
+}
+
+TEST_F(ImageBuilder, MakesARemovalProgramOfADescriptionThatSaysSo) {
+  PackSample();
+  std::string text = SampleDescription();
+  Write("removal.toml", text.insert(text.find("\n") + 1, "removal = true\n"));
+  const ToolRun packed =
+      RunImage({"pack", "@removal.toml", "--stub", "@stub.exe", "-o", "@packed.exe"});
+  ASSERT_EQ(packed.status, 0) << packed.err;
+  EXPECT_EQ(RunImage({"removal", "@image.exe", "-o", "@cut.exe"}).status, 0);
+  EXPECT_TRUE(Read("packed.exe") == Read("cut.exe"));
+}
+
+TEST_F(ImageBuilder, RefusesBadDescriptionsWithTheirLine) {
+  PackSample();
+  const std::string longPart(120, 'd');
+  const BadDescription rows[] = {
+      {"[package\n", 1, ""},
+      {"[package]\nremoval = true\nremoval = true\n", 3, "removal"},
+      {"[package]\n\ntitle = 'x'\n", 3, "unknown key \"title\""},
+      {"[packages]\n", 1, "unknown key \"packages\""},
+      {"[package]\nremoval = 1\n", 2, "removal"},
+      {"[package]\nspace_needed = -1\n", 2, "space_needed"},
+      {"[package]\nspace_needed = 2147483648\n", 2, "space_needed"},
+      {"[package]\ndefault_language = 'latin'\n", 2, "default_language"},
+      {"[package]\ndefault_language = 1\n", 2, "default_language"},
+      {"[package]\ndefault_directory = 5\n", 2, "default_directory"},
+      {"file = 'a.exe'\n", 1, "[[file]]"},
+      {"[[file]]\ndestination = 'x'\n", 1, "no \"source\""},
+      {"\n[[file]]\nsource = 'a.exe'\n", 2, "no \"destination\""},
+      {"[[file]]\nsource = 'a.exe'\ndestination = 'x'\nVersion = '1'\n", 4, "Version"},
+      {"[[file]]\nsource = 'a.exe'\ndestination = 'x'\nversion = ''\n", 4, "version"},
+      {"[[file]]\nsource = 'a.exe'\ndestination = 'x'\nlanguage = '040C04B0'\n", 4, "language"},
+      {WithName("\\u4e00"), 3, "code page"},
+      {WithName(""), 3, "empty"},
+      {WithName(std::string(32, 'n')), 3, "at most 31"},
+      {WithName("a\\\\b"), 3, "backslash"},
+      {WithName("a/b"), 3, "/"},
+      {WithName("a:b"), 3, ":"},
+      {WithName("a\\tb"), 3, "control"},
+      {WithName("a?"), 3, "?"},
+      {WithName("a."), 3, "point"},
+      {WithName("a "), 3, "blank"},
+      {WithName(".."), 3, ".."},
+      {WithName("nul"), 3, "device"},
+      {WithName("Com1.txt"), 3, "device"},
+      {WithName("LPT\\u00b2"), 3, "device"},
+      {WithName("aux .c"), 3, "device"},
+      {WithDestination(""), 3, "nowhere"},
+      {WithDestination("%INSTALL_DIR%\\.."), 3, ".."},
+      {WithDestination("a;b\\..\\c"), 3, ".."},
+      {WithDestination("C:\\x\\..\\windows"), 3, ".."},
+      {WithDestination("a\\con\\b"), 3, "device"},
+      {WithDestination("a/b"), 3, "/"},
+      {WithDestination("a\\\\b"), 3, "empty folder name"},
+      {WithDestination("\\\\server\\share"), 3, "empty folder name"},
+      {WithDestination("a|b"), 3, "|"},
+      {WithDestination("a. \\b"), 3, "blank"},
+      {WithDestination("C:"), 3, "in full"},
+      {WithDestination("%INSTALL_DIR%\\C:"), 3, "no macro there"},
+      {WithDestination("bin\\C:"), 3, "in full"},
+      {WithDestination("%PLUGIN_ALL_DIR%\\C:"), 3, ":"},
+      {WithDestination("%TARGET_DIR%\\x"), 3, "%TARGET_DIR%"},
+      {WithDestination("x\\%INSTALL_DIR%"), 3, "%INSTALL_DIR%"},
+      {WithDestination("%SYS-DIR%"), 3, "%SYS-DIR%"},
+      {WithDestination("a;A\\"), 3, "fills"},
+      {WithDestination("%INSTALL_DIR%\\bin;%CurDir%bin"), 3, "fills"},
+      {WithDestination("%PLUGIN_OPERA_DIR%;%PLUGIN_ALL_DIR%"), 3, "fills"},
+      {WithDestination(longPart + "\\" + longPart + "\\1234567890"), 3, "259"},
+      {WithDestination(std::string(260, 'x')), 3, "259"},
+      {WithDirectory("Moriv"), 2, "in full"},
+      {WithDirectory("C:\\a\\..\\b"), 2, ".."},
+      {WithDirectory("C:\\" + std::string(257, 'x')), 2, "259"},
+      {WithDirectory("C:\\" + longPart + "\\" + longPart + "\\123456789"), 5, "259"},
+      {WithName("a.exe") + WithName("A.EXE"), 8, "line 4"},
+  };
+  const std::vector<std::string> before = NamesIn(".");
+  for (const BadDescription& row : rows) {
+    Write("setup.toml", row.text);
+    const ToolRun run = RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@new.exe"});
+    EXPECT_EQ(run.status, 2) << row.text;
+    const std::string place = Path("setup.toml").string() + ":" + std::to_string(row.line) + ": ";
+    EXPECT_TRUE(run.err.starts_with("moriv-image: " + place)) << row.text << run.err;
+    EXPECT_NE(run.err.find(row.said, place.size()), std::string::npos) << row.text << run.err;
+    EXPECT_EQ(run.err.find('\n'), run.err.size() - 1) << run.err;
+    EXPECT_EQ(NamesIn("."), before) << row.text;
+  }
+}
+
+TEST_F(ImageBuilder, TakesWhatIsOnlyUnusual) {
+  PackSample();
+  const std::string longPart(120, 'd');
+  for (const std::string& text :
+       {WithDestination("\\a\\b\\"), WithDestination("D:\\Shared"), WithDestination(";a"),
+        WithDestination("%sys_dir%sub;%Remove_Dir%\\x"), WithDestination("100% pure"),
+        WithDestination("a;b;%PLUGIN_ALL_DIR%\\x"), WithDirectory(""), WithDirectory("C:\\"),
+        // 3 + 120 + 1 + 120 + 1 + 8 + 1 + 5: a path of exactly 259
+        WithDestination(longPart + "\\" + longPart + "\\12345678"), WithName("console.exe"),
+        WithName("com10"), WithName("\\u00e9t\\u00e9.txt")}) {
+    Write("setup.toml", text);
+    const ToolRun run = RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@new.exe"});
+    EXPECT_EQ(run.status, 0) << text << run.err;
+    EXPECT_EQ(RunImage({"verify", "@new.exe"}).status, 0) << text;
+  }
+  Write("setup.toml", WithDestination("%OTHER%\\x"));
+  EXPECT_EQ(RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@new.exe",
+                      "--allow-unknown-macros"})
+                .status,
+            0);
+}
+
+TEST_F(ImageBuilder, WritesNamesInTheCodePage) {
+  PackSample();
+  Write("setup.toml", WithName("\xC3\xA9t\xC3\xA9.txt"));
+  EXPECT_EQ(RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@new.exe"}).status, 0);
+  EXPECT_STREQ(RecordOf("new.exe", 0).fileName, "\xE9t\xE9.txt");
+}
+
+TEST_F(ImageBuilder, RefusesStubsAndSourcesThatWillNotDo) {
+  PackSample();
+  Write("text.exe", "no program at all");
+  Write("nameless.exe", MakeProgram("1.0", false));
+  Write("ageless.exe", MakeProgram(""));
+  Write("sourceless.toml", "[[file]]\nsource = 'missing.exe'\ndestination = 'x'\n");
+  Write("folder.toml", "[[file]]\nsource = '.'\nname = 'x'\ndestination = 'x'\n");
+  Write("fileless.toml", "[package]\n");
+  const struct {
+    std::string description, stub, output, said;
+  } rows[] = {
+      {"@setup.toml", "@image.exe", "@new.exe", "package behind it already"},
+      {"@setup.toml", "@text.exe", "@new.exe", "no version resource"},
+      {"@setup.toml", "@nameless.exe", "@new.exe", "no version resource"},
+      {"@setup.toml", "@ageless.exe", "@new.exe", "no version resource"},
+      {"@setup.toml", "@missing.exe", "@new.exe", "can't be opened"},
+      {"@setup.toml", "@stub.exe", "@stub.exe", "input itself"},
+      {"@setup.toml", "@stub.exe", "@missing/new.exe", "can't be written"},
+      {"@missing.toml", "@stub.exe", "@new.exe", "can't be opened"},
+      {"@sourceless.toml", "@stub.exe", "@new.exe", "can't be opened"},
+      {"@folder.toml", "@stub.exe", "@new.exe", "not a plain file"},
+      {"@fileless.toml", "@stub.exe", "@new.exe", "no file in it"},
+  };
+  const std::vector<std::string> before = NamesIn(".");
+  for (const auto& row : rows) {
+    const ToolRun run = RunImage({"pack", row.description, "--stub", row.stub, "-o", row.output});
+    EXPECT_EQ(run.status, 2) << row.said;
+    EXPECT_NE(run.err.find(row.said), std::string::npos) << run.err;
+    EXPECT_EQ(NamesIn("."), before) << row.said;
+  }
+}

@@ -1,0 +1,221 @@
+// Verify, list and removal: a good image is good, and each thing that is wrong is found.
+
+#include "tools/image/image_verifier.h"
+
+#include <algorithm>
+#include <cstring>
+#include <string>
+
+#include "tests/tools/tool_bench.h"
+
+namespace {
+
+class ImageVerifier : public ToolBench {
+ protected:
+  std::vector<std::string> WrongIn(const std::string& image) const {
+    std::vector<std::string> wrong;
+    for (const image::Finding& finding : image::VerifyImage(Path(image))) {
+      if (!finding.isGood) wrong.push_back(finding.text);
+    }
+    return wrong;
+  }
+
+  // image.exe as it is now has this one thing wrong.
+  void ExpectWrong(const std::string& part) const {
+    const std::vector<std::string> wrong = WrongIn("image.exe");
+    ASSERT_EQ(wrong.size(), 1u) << part << ": " << (wrong.empty() ? "" : wrong[1 % wrong.size()]);
+    EXPECT_NE(wrong[0].find(part), std::string::npos) << wrong[0];
+    const ToolRun run = RunImage({"verify", "@image.exe"});
+    EXPECT_EQ(run.status, 1);
+    EXPECT_NE(run.out.find("wrong  " + wrong[0] + "\n"), std::string::npos);
+  }
+};
+
+}  // namespace
+
+TEST_F(ImageVerifier, FindsNothingInAGoodImage) {
+  PackSample();
+  const ToolRun run = RunImage({"verify", "@image.exe"});
+  EXPECT_EQ(run.status, 0);
+  EXPECT_EQ(run.out.find("wrong"), std::string::npos) << run.out;
+  EXPECT_EQ(std::count(run.out.begin(), run.out.end(), '\n'), 6);
+}
+
+TEST_F(ImageVerifier, FindsEachChangeOfTheHeader) {
+  using Change = void (*)(PackageHeader*);
+  const struct {
+    Change change;
+    const char* part;
+  } rows[] = {
+      {[](PackageHeader* h) { h->removalImageFlag = 2; }, "removalImageFlag is 2"},
+      {[](PackageHeader* h) { h->spaceNeeded++; }, "spaceNeeded is 48057"},
+      {[](PackageHeader* h) { h->packageLength--; }, "packageLength"},
+      {[](PackageHeader* h) { std::memset(h->defaultDirectory + 200, 'x', 60); },
+       "defaultDirectory"},
+      {[](PackageHeader* h) { h->defaultDirectory[259] = 'x'; }, "defaultDirectory"},
+      {[](PackageHeader* h) { std::strcpy(h->defaultDirectory, "C:\\Program Files\\..\\x"); },
+       "\"..\""},
+      {[](PackageHeader* h) { h->defaultLanguage = 5; }, "defaultLanguage 5"},
+      {[](PackageHeader* h) { h->reserved[259] = 1; }, "reserved"},
+      {[](PackageHeader* h) { h->recordCount = 4; }, "record 4 at offset"},
+      {[](PackageHeader* h) { h->dataOffset++; }, "recordSize"},
+      {[](PackageHeader* h) { h->dataOffset = 0xFFFFFFFF; }, "dataOffset 4294967295"},
+      {[](PackageHeader* h) { h->headerSize = 567; }, "no package header"},
+      {[](PackageHeader* h) { h->magic[25] = 'x'; }, "no package header"},
+  };
+  for (const auto& row : rows) {
+    PackSample();
+    ChangeHeader(row.change);
+    ExpectWrong(row.part);
+  }
+}
+
+TEST_F(ImageVerifier, FindsEachChangeOfARecord) {
+  using Change = void (*)(FileRecord*);
+  const struct {
+    Change change;
+    const char* part;
+  } rows[] = {
+      {[](FileRecord* r) { r->recordSize = 695; }, "recordSize of 695"},
+      {[](FileRecord* r) { r->fileName[31] = 'x'; }, "fileName does not end"},
+      {[](FileRecord* r) { r->destination[259] = 'x'; }, "destination does not end"},
+      {[](FileRecord* r) { r->versionLanguage[127] = 'x'; }, "versionLanguage does not end"},
+      {[](FileRecord* r) { r->versionLanguage[0] = 'G'; }, "versionLanguage \"G4"},
+      {[](FileRecord* r) { r->reserved[0] = 1; }, "reserved"},
+      {[](FileRecord* r) { r->fileName[0] = '/'; }, "fileName \"/"},
+      {[](FileRecord* r) { r->fileName[1] = '\n'; }, "control character"},
+      {[](FileRecord* r) {
+         std::strcpy(r->destination, "a\\..\\b");
+         std::memset(r->destination + 6, 0, 254);
+       },
+       "destination"},
+      {[](FileRecord* r) { std::memset(r->destination, 0, 260); }, "nowhere"},
+      {[](FileRecord* r) { r->storedSize = 0x7FFFFFFF; }, "reaches into the header"},
+      {[](FileRecord* r) { r->storedSize = 0xFFFFFFFF; }, "reaches into the header"},
+      {[](FileRecord* r) {
+         std::strcpy(r->fileName, "a.exe");
+         std::strcpy(r->destination, "\\");
+         std::memset(r->destination + 1, 0, 259);
+       },
+       "filled already"},
+  };
+  for (const auto& row : rows) {
+    PackSample();
+    ChangeRecord(1, row.change);
+    ExpectWrong(row.part);
+  }
+}
+
+TEST_F(ImageVerifier, ComparesStreamsWithTheirSizes) {
+  for (const int change : {-1, 1}) {
+    PackSample();
+    const auto by = static_cast<uint32_t>(change);
+    ChangeRecord(1, [by](FileRecord* record) { record->fileSize += by; });
+    ChangeHeader([by](PackageHeader* header) { header->spaceNeeded += by; });
+    ExpectWrong(change < 0 ? "expands to more than" : "expands to 3000 bytes");
+  }
+  PackSample();
+  ChangeRecord(1, [](FileRecord* record) { record->fileSize = 0x80000000; });
+  ChangeHeader([](PackageHeader* header) { header->spaceNeeded += 0x80000000 - 3000; });
+  ExpectWrong("2 GiB or more");
+}
+
+TEST_F(ImageVerifier, FindsBadStreamsGapsAndMissingPrograms) {
+  PackSample();
+  std::vector<uint8_t> image = Read("image.exe");
+  image[RecordOffset("image.exe", 1) + 696] = 'p';
+  Write("image.exe", image);
+  ExpectWrong("does not begin with");
+
+  PackSample();
+  image = Read("image.exe");
+  image.insert(image.end() - 568, 0);
+  Write("image.exe", image);
+  ChangeHeader([](PackageHeader* header) { ++header->packageLength; });
+  ExpectWrong("1 bytes stand between");
+
+  PackSample();
+  image = Read("image.exe");
+  image[0] = 'X';
+  Write("image.exe", image);
+  ExpectWrong("no version resource");
+
+  PackSample();
+  image = Read("image.exe");
+  image.erase(image.begin(), image.begin() + HeaderOf("image.exe").dataOffset);
+  Write("image.exe", image);
+  ChangeHeader([](PackageHeader* header) { header->dataOffset = 0; });
+  ExpectWrong("no executable");
+}
+
+TEST_F(ImageVerifier, KnowsTheRulesOfRemovalPrograms) {
+  PackSample();
+  const ToolRun run =
+      RunImage({"removal", "@image.exe", "-o", "@removal.exe", "--language", "german"});
+  ASSERT_EQ(run.status, 0) << run.err;
+  const PackageHeader header = HeaderOf("removal.exe");
+  EXPECT_EQ(Read("removal.exe").size(), header.dataOffset + 3 * 696u + 568u);
+  EXPECT_EQ(header.removalImageFlag, 1);
+  EXPECT_EQ(header.packageLength, 3 * 696u);
+  EXPECT_EQ(header.defaultLanguage, 20000);
+  EXPECT_EQ(RecordOf("removal.exe", 1).storedSize, 0u);
+  EXPECT_STREQ(RecordOf("removal.exe", 1).destination, RecordOf("image.exe", 1).destination);
+  EXPECT_TRUE(WrongIn("removal.exe").empty());
+  EXPECT_EQ(RunImage({"removal", "@removal.exe", "-o", "@again.exe"}).status, 2);
+
+  ChangeHeader([](PackageHeader* image) {
+    image->removalImageFlag = 1;
+    image->packageLength = 3 * 696;
+  });
+  EXPECT_EQ(WrongIn("image.exe").size(), 3u);  // each record has a stream
+}
+
+TEST_F(ImageVerifier, ListsHeaderAndRecords) {
+  PackSample();
+  const ToolRun run = RunImage({"list", "@image.exe"});
+  EXPECT_EQ(run.status, 0);
+  for (const char* part :
+       {"setup image", "48056", "french (10000)", "\"C:\\Program Files\\Moriv\"", "4.1.7",
+        "\"040c04b0\"", "\"readme.txt\"", "-.-.-", "\"%SYS_DIR%\\moriv;%PLUGIN_ALL_DIR%\""}) {
+    EXPECT_NE(run.out.find(part), std::string::npos) << part;
+  }
+}
+
+TEST_F(ImageVerifier, AnswersEveryDamagedImage) {
+  PackSample();
+  const std::vector<uint8_t> good = Read("image.exe");
+  // Cuts at either end, and extreme values in every byte of the header's and a record's numbers.
+  std::vector<std::vector<uint8_t>> images = {{}, {0}};
+  for (const ptrdiff_t cut : {1, 567, 568, 569, 2000}) {
+    images.push_back({good.begin(), good.end() - cut});
+    images.push_back({good.end() - cut, good.end()});
+  }
+  for (size_t offset = good.size() - 568; offset < good.size() - 524; ++offset) {
+    for (const int value : {0x00, 0x7F, 0x80, 0xFF}) {
+      images.push_back(good);
+      images.back()[offset] = static_cast<uint8_t>(value);
+    }
+  }
+  for (size_t field = 422; field < 436; ++field) {
+    for (const int value : {0x00, 0x7F, 0x80, 0xFF}) {
+      images.push_back(good);
+      images.back()[RecordOffset("image.exe", 0) + field] = static_cast<uint8_t>(value);
+    }
+  }
+  for (const std::vector<uint8_t>& image : images) {
+    Write("hostile.exe", image);
+    const bool isGood = image == good;
+    EXPECT_LE(RunImage({"verify", "@hostile.exe"}).status, isGood ? 0 : 1);
+    for (const char* command : {"list", "extract", "removal"}) {
+      std::vector<std::string> arguments = {command, "@hostile.exe"};
+      if (arguments[0] != "list") arguments.insert(arguments.end(), {"-o", "@out"});
+      const ToolRun run = RunImage(arguments);
+      EXPECT_TRUE(run.status == 0 ? run.err.empty() : run.status == 2) << run.err;
+      if (run.status != 0) {
+        EXPECT_EQ(std::count(run.err.begin(), run.err.end(), '\n'), 1) << run.err;
+        EXPECT_FALSE(std::filesystem::exists(Path("out"))) << command;
+      }
+      std::filesystem::remove_all(Path("out"));
+    }
+  }
+}

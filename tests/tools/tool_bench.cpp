@@ -1,0 +1,168 @@
+#include "tests/tools/tool_bench.h"
+
+#include <algorithm>
+#include <cstring>
+#include <fstream>
+#include <random>
+#include <sstream>
+
+#include "tests/support/executable_builder.h"
+#include "tools/image/image_command_line.h"
+#include "tools/machine/machine_command_line.h"
+
+namespace fs = std::filesystem;
+
+namespace {
+
+using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
+
+ToolRun RunTool(Tool tool, std::vector<std::string> arguments, const fs::path& folder) {
+  for (std::string& argument : arguments) {
+    if (argument.starts_with('@')) argument = (folder / argument.substr(1)).string();
+  }
+  std::vector<const char*> argv = {"tool"};
+  for (const std::string& argument : arguments) argv.push_back(argument.c_str());
+  std::ostringstream out;
+  std::ostringstream err;
+  ToolRun run;
+  run.status = tool(static_cast<int>(argv.size()), argv.data(), out, err);
+  run.out = out.str();
+  run.err = err.str();
+  return run;
+}
+
+template <class Record>
+void Change(std::vector<uint8_t>* image, size_t offset,
+            const std::function<void(Record*)>& change) {
+  Record record;
+  std::memcpy(&record, image->data() + offset, sizeof record);
+  change(&record);
+  std::memcpy(image->data() + offset, &record, sizeof record);
+}
+
+}  // namespace
+
+void ToolBench::Write(const std::string& name, std::span<const uint8_t> bytes) const {
+  std::ofstream file(Path(name), std::ios::binary);
+  for (const uint8_t byte : bytes) file.put(static_cast<char>(byte));
+  ASSERT_TRUE(file.flush()) << name;
+}
+
+void ToolBench::Write(const std::string& name, const std::string& text) const {
+  Write(name, std::span(reinterpret_cast<const uint8_t*>(text.data()), text.size()));
+}
+
+std::vector<uint8_t> ToolBench::Read(const std::string& name) const {
+  const std::string text = ReadText(name);
+  return {text.begin(), text.end()};
+}
+
+std::string ToolBench::ReadText(const std::string& name) const {
+  std::ifstream file(Path(name), std::ios::binary);
+  EXPECT_TRUE(file) << name;
+  std::ostringstream text;
+  text << file.rdbuf();
+  return text.str();
+}
+
+std::vector<std::string> ToolBench::NamesIn(const std::string& folder) const {
+  std::vector<std::string> names;
+  for (const auto& entry : fs::directory_iterator(Path(folder))) {
+    names.push_back(entry.path().filename().string());
+  }
+  std::sort(names.begin(), names.end());
+  return names;
+}
+
+ToolRun ToolBench::RunImage(const std::vector<std::string>& arguments) const {
+  return RunTool(image::RunImageTool, arguments, folder_.Path());
+}
+
+ToolRun ToolBench::RunMachine(const std::vector<std::string>& arguments) const {
+  return RunTool(machine_tool::RunMachineTool, arguments, folder_.Path());
+}
+
+const char* ToolBench::SampleDescription() {
+  return R"([package]
+default_directory = 'C:\Program Files\Moriv'
+default_language = "french"
+
+[[file]]
+source = "a.exe"
+destination = '%INSTALL_DIR%'
+
+[[file]]
+source = "b.dll"
+destination = '%SYS_DIR%\moriv;%PLUGIN_ALL_DIR%'
+version = "1.2.3"
+language = "040904b0"
+
+[[file]]
+source = "empty.txt"
+destination = '%INSTALL_DIR%\docs'
+name = "readme.txt"
+)";
+}
+
+void ToolBench::PackSample() const {
+  Write("stub.exe", MakeProgram("1.0.0"));
+  std::string program = MakeProgram("4.1.7");
+  program.resize(45056);
+  Write("a.exe", program);
+  Write("b.dll", RandomBytes(3000, 1));
+  Write("empty.txt", std::string());
+  Write("setup.toml", SampleDescription());
+  const ToolRun run = RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@image.exe"});
+  ASSERT_EQ(run.status, 0) << run.err;
+}
+
+void ToolBench::ChangeHeader(const std::function<void(PackageHeader*)>& change) const {
+  std::vector<uint8_t> image = Read("image.exe");
+  Change(&image, image.size() - sizeof(PackageHeader), change);
+  Write("image.exe", image);
+}
+
+void ToolBench::ChangeRecord(size_t number, const std::function<void(FileRecord*)>& change) const {
+  std::vector<uint8_t> image = Read("image.exe");
+  Change(&image, RecordOffset("image.exe", number), change);
+  Write("image.exe", image);
+}
+
+PackageHeader ToolBench::HeaderOf(const std::string& image) const {
+  const std::vector<uint8_t> bytes = Read(image);
+  PackageHeader header;
+  std::memcpy(&header, bytes.data() + bytes.size() - sizeof header, sizeof header);
+  return header;
+}
+
+FileRecord ToolBench::RecordOf(const std::string& image, size_t number) const {
+  const std::vector<uint8_t> bytes = Read(image);
+  FileRecord record;
+  std::memcpy(&record, bytes.data() + RecordOffset(image, number), sizeof record);
+  return record;
+}
+
+size_t ToolBench::RecordOffset(const std::string& image, size_t number) const {
+  const std::vector<uint8_t> bytes = Read(image);
+  size_t offset = HeaderOf(image).dataOffset;
+  for (size_t i = 0; i < number; ++i) {
+    FileRecord record;
+    std::memcpy(&record, bytes.data() + offset, sizeof record);
+    offset += sizeof record + record.storedSize;
+  }
+  return offset;
+}
+
+std::string MakeProgram(const std::string& version, bool hasTranslation) {
+  std::vector<std::pair<std::string, std::string>> strings;
+  if (!version.empty()) strings.emplace_back("FileVersion", version);
+  return PortableExecutable(false, 16, 1,
+                            {{0x40C, VersionResource(strings, 0x40C, 0x4B0, hasTranslation)}});
+}
+
+std::vector<uint8_t> RandomBytes(size_t count, unsigned seed) {
+  std::mt19937 random(seed);
+  std::vector<uint8_t> bytes(count);
+  for (uint8_t& byte : bytes) byte = static_cast<uint8_t>(random());
+  return bytes;
+}

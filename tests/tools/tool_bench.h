@@ -1,0 +1,60 @@
+// A folder of its own for each test of a tool, with what a package is made of.
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <filesystem>
+#include <functional>
+#include <span>
+#include <string>
+#include <vector>
+
+#include "package/package_format.h"
+#include "tests/support/test_machine.h"
+
+// What a tool said and how it ended.
+struct ToolRun {
+  int status = -1;
+  std::string out;
+  std::string err;
+};
+
+class ToolBench : public testing::Test {
+ protected:
+  std::filesystem::path Path(const std::string& name) const { return folder_.Path() / name; }
+  void Write(const std::string& name, std::span<const uint8_t> bytes) const;
+  void Write(const std::string& name, const std::string& text) const;
+  std::vector<uint8_t> Read(const std::string& name) const;
+  std::string ReadText(const std::string& name) const;
+  // Names of all that stands in a folder, sorted.
+  std::vector<std::string> NamesIn(const std::string& folder) const;
+
+  // Runs moriv-image; an argument "@name" is a path in the test's folder.
+  ToolRun RunImage(const std::vector<std::string>& arguments) const;
+  // The same with moriv-machine.
+  ToolRun RunMachine(const std::vector<std::string>& arguments) const;
+
+  // Writes stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (random), empty.txt and setup.toml,
+  // and packs them as image.exe, which must succeed.
+  void PackSample() const;
+  static const char* SampleDescription();
+
+  // Changes the header or one record of image.exe, a good image of the sample.
+  void ChangeHeader(const std::function<void(PackageHeader*)>& change) const;
+  void ChangeRecord(size_t number, const std::function<void(FileRecord*)>& change) const;
+  PackageHeader HeaderOf(const std::string& image) const;
+  FileRecord RecordOf(const std::string& image, size_t number) const;
+
+  // Offset of a record, counted from 0, in an image.
+  size_t RecordOffset(const std::string& image, size_t number) const;
+
+ private:
+  TemporaryFolder folder_;
+};
+
+// A program with a version resource, as a setup program without a package or as a file to pack. An
+// empty version leaves FileVersion out; without a translation no table names the string block.
+std::string MakeProgram(const std::string& version, bool hasTranslation = true);
+
+std::vector<uint8_t> RandomBytes(size_t count, unsigned seed);

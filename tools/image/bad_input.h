@@ -1,0 +1,23 @@
+// What a tool says of input that it can't take: one line, "FILE[:LINE]: what is wrong; what to do".
+#pragma once
+
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+
+namespace image {
+
+class BadInput : public std::runtime_error {
+ public:
+  BadInput(const std::filesystem::path& file, const std::string& what)
+      : std::runtime_error(file.string() + ": " + what) {}
+  BadInput(const std::filesystem::path& file, int line, const std::string& what)
+      : std::runtime_error(file.string() + ":" + std::to_string(line) + ": " + what) {}
+};
+
+// The host's words for the last failed system call.
+inline std::string SystemReason(int error) {
+  return std::generic_category().message(error);
+}
+
+}  // namespace image

@@ -1,0 +1,12 @@
+// The command line of moriv-image.
+#pragma once
+
+#include <iosfwd>
+
+namespace image {
+
+// Does what the command line says and returns the exit status: 0, 1 when `verify` found something
+// wrong, 2 for input that can't be used, with one line on `err` that says what is wrong.
+int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostream& err);
+
+}  // namespace image

@@ -1,0 +1,43 @@
+// A file in the making. It is written under a temporary name in its own folder and takes its real
+// name only by Commit, so that nothing half-written is ever met under that name.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+#include <filesystem>
+#include <span>
+
+namespace image {
+
+class OutputFile {
+ public:
+  enum class Kind { kData, kProgram };  // a program may be executed
+
+  // Throws BadInput when nothing can be written there, or when something stands under that name
+  // that is no plain file.
+  OutputFile(const std::filesystem::path& target, Kind kind);
+  // Without a Commit the temporary file goes.
+  ~OutputFile();
+  OutputFile(const OutputFile&) = delete;
+  OutputFile& operator=(const OutputFile&) = delete;
+
+  const std::filesystem::path& Target() const { return target_; }
+  // Where the bytes are before Commit.
+  const std::filesystem::path& Temporary() const { return temporary_; }
+
+  void Write(std::span<const uint8_t> bytes);
+  // The last bytes reach the disk's care; nothing can be written after it.
+  void Close();
+  // Closes, and puts the file under its name in place of what stands there.
+  void Commit();
+
+ private:
+  [[noreturn]] void Fail(int error) const;
+
+  std::filesystem::path target_;
+  std::filesystem::path temporary_;
+  std::FILE* file_ = nullptr;
+  bool committed_ = false;
+};
+
+}  // namespace image
