@@ -170,9 +170,8 @@ std::vector<uint8_t> Copy(Bytes bytes) {
 }  // namespace
 
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& path) {
-  const std::optional<std::vector<uint8_t>> file = ReadHostFile(path);
-  if (!file) return std::nullopt;
-  const std::optional<Bytes> resource = FindResource(*file, kVersionType, kVersionId);
+  const MappedHostFile file(path);
+  const std::optional<Bytes> resource = FindResource(file.bytes(), kVersionType, kVersionId);
   if (!resource || !IsVersionBlock(*resource)) return std::nullopt;
   return Copy(*resource);
 }

@@ -12,8 +12,8 @@ namespace machine {
 
 inline constexpr char kNativeResourceSection[] = ".moriv_res";
 
-// Bytes of the file's version resource (RT_VERSION), whichever kind of executable it is. nullopt for
-// a file that is none, has none, or is damaged: every offset is checked before it is followed.
+// Bytes of the file's version resource (RT_VERSION), whichever kind of executable it is. nullopt
+// for a file that is none, has none, or is damaged: every offset is checked before it is followed.
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& file);
 
 // A value of a version resource, as VerQueryValueA knows it: path "\\VarFileInfo\\Translation" (raw

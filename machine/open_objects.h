@@ -1,4 +1,5 @@
-// The count of what the program holds open, so that a run that leaks is told from one that does not.
+// The count of what the program holds open, so that a run that leaks is told from one that does
+// not.
 #pragma once
 
 #include <string>

@@ -37,7 +37,7 @@ std::shared_ptr<RegistryKey> FindSubkey(const RegistryKey& key, std::string_view
 std::shared_ptr<RegistryKey> MakeSubkey(const std::shared_ptr<RegistryKey>& key,
                                         std::string_view name) {
   if (std::shared_ptr<RegistryKey> old = FindSubkey(*key, name)) return old;
-  const auto subkey = std::make_shared<RegistryKey>();
+  auto subkey = std::make_shared<RegistryKey>();
   subkey->name = name;
   subkey->parent = key.get();
   key->subkeys.push_back(subkey);

@@ -58,7 +58,7 @@ std::vector<std::string> SplitList(std::string_view text, char separator) {
 // Takes a word and the blank behind it off the front; empty when there is none.
 std::string TakeWord(std::string_view* text) {
   const size_t end = std::min(text->find(' '), text->size());
-  const std::string word(text->substr(0, end));
+  std::string word(text->substr(0, end));
   text->remove_prefix(std::min(end + 1, text->size()));
   return word;
 }

@@ -14,9 +14,9 @@ namespace machine {
 
 // One line of [faults]. `fail` makes calls fail; `stop` ends the process at the call.
 struct Fault {
-  std::string function;       // a function of the seam, by its Win32 name
-  int call = 1;               // counted from 1
-  bool fromThenOn = false;    // this call and all later ones
+  std::string function;     // a function of the seam, by its Win32 name
+  int call = 1;             // counted from 1
+  bool fromThenOn = false;  // this call and all later ones
   bool stop = false;
   DWORD error = ERROR_ACCESS_DENIED;
 };
@@ -35,7 +35,8 @@ struct Settings {
   std::string windowsDirectory = "C:\\windows";
   std::string systemDirectory = "C:\\windows\\system32";
   std::optional<SYSTEMTIME> now;  // else the real local time
-  std::map<char, DiskSettings> disks;  // by upper-case drive letter; a drive without one has the defaults
+  std::map<char, DiskSettings>
+      disks;  // by upper-case drive letter; a drive without one has the defaults
   bool hasGetDiskFreeSpaceEx = true;
   std::vector<Fault> faults;
 };

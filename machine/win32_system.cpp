@@ -1,4 +1,5 @@
 // The system's directories, version, language and clock, and memory blocks.
+#include <cstdio>
 #include <cstring>
 #include <ctime>
 #include <map>
@@ -57,7 +58,8 @@ BOOL GetVersionExA(LPOSVERSIONINFOA info) {
   info->dwMinorVersion = nt ? 1 : 10;
   info->dwBuildNumber = nt ? 2600 : 0x040A08AE;  // on the 9x family with the version on top
   info->dwPlatformId = nt ? VER_PLATFORM_WIN32_NT : VER_PLATFORM_WIN32_WINDOWS;
-  std::strcpy(info->szCSDVersion, nt ? "Service Pack 3" : " A ");
+  std::snprintf(info->szCSDVersion, sizeof(info->szCSDVersion), "%s",
+                nt ? "Service Pack 3" : " A ");
   return TRUE;
 }
 

@@ -1,7 +1,7 @@
 #include "core/driver.h"
 
 #include "core/help.h"
-#include "core/settings.h"
+#include "core/run_settings.h"
 #include "engine/install_pass.h"
 #include "engine/removal_pass.h"
 #include "log/event_log.h"

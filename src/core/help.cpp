@@ -1,6 +1,6 @@
 #include "core/help.h"
 
-#include "core/settings.h"
+#include "core/run_settings.h"
 #include "log/event_log.h"
 #include "platform/win32.h"
 #include "ui/catalog.h"

@@ -39,7 +39,7 @@ class RemovalPass {
   }
 
   SetupContext* context_;
-  FileRecord record_;
+  FileRecord record_ = {};
 };
 
 }  // namespace

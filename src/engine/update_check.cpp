@@ -39,7 +39,7 @@ class UpdateCheck {
            comparison == ComparisonThirdGreater;
   }
 
-  FileRecord packaged_;
+  FileRecord packaged_ = {};
   bool foundOlder_ = false;
 };
 

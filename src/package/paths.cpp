@@ -40,6 +40,6 @@ int GetWindowsDir(char* buffer, size_t size) {
 }
 
 HINSTANCE ModuleHandle() {
-  static const HINSTANCE module = GetModuleHandleA(nullptr);
+  static HINSTANCE module = GetModuleHandleA(nullptr);
   return module;
 }

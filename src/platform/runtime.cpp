@@ -5,6 +5,7 @@
 
 const std::nothrow_t std::nothrow{};
 
+// NOLINTBEGIN(misc-new-delete-overloads): the program has the nothrow forms of new alone.
 void* operator new(size_t size, const std::nothrow_t&) noexcept {
   return malloc(size != 0 ? size : 1);
 }
@@ -36,4 +37,6 @@ extern "C" void __cxa_pure_virtual() {
 }
 
 // Called by new[] for a count whose size no size_t holds. The counts here are below 2^31 and small.
-extern "C" void __cxa_throw_bad_array_new_length() { abort(); }
+extern "C" void __cxa_throw_bad_array_new_length() {
+  abort();
+}

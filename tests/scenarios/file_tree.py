@@ -1,7 +1,7 @@
 """The files of a machine's drives, and what a run changed among them.
 
-A machine's folder has one folder a drive, drive_c and so on. Paths are the machine's own (C:\\a\\b);
-a directory's ends with a backslash.
+A machine's folder has one folder a drive, drive_c and so on. Paths are the machine's own
+(C:\\a\\b); a directory's ends with a backslash.
 """
 
 import os
@@ -55,8 +55,8 @@ class FileTree:
                 stamps[f'{path}{entry.name}\\'] = None
                 self._walk(entry.path, f'{path}{entry.name}\\', stamps)
             else:
-                mode = stat.S_IMODE(status.st_mode)
-                stamps[path + entry.name] = (status.st_size, status.st_ino, status.st_ctime_ns, mode)
+                stamps[path + entry.name] = (status.st_size, status.st_ino, status.st_ctime_ns,
+                                             stat.S_IMODE(status.st_mode))
 
 
 def changes(before, after):

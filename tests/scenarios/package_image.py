@@ -1,7 +1,7 @@
 """Setup images as bytes: taken apart, damaged on purpose, and the removal program that one leaves.
 
-An image is the executable, then for each file a record and its stream, then one header that ends the
-file. All integers are little-endian.
+An image is the executable, then for each file a record and its stream, then one header that ends
+the file. All integers are little-endian.
 """
 
 import re

@@ -1,7 +1,7 @@
 """One large scenario of real programs: installed byte for byte, then removed to the last file.
 
-The input is what every host with Wine has: Wine's own libraries, without their debug information. The
-largest ones, one of a family (msvcp70, msvcp71 and so on are nearly the same file).
+The input is what every host with Wine has: Wine's own libraries, without their debug information.
+The largest ones, one of a family (msvcp70, msvcp71 and so on are nearly the same file).
 """
 
 import re
@@ -16,6 +16,12 @@ FILES = 48
 BYTES = 40_000_000  # at least
 
 INSTALL_DIR = r'C:\Program Files\Moriv'
+LIBRARY = INSTALL_DIR + r'\library'
+
+
+def missing():
+    """Why this host has no input; '' when it has."""
+    return '' if SOURCE.is_dir() else f'{SOURCE} is not there; libwine is not installed'
 
 
 def scenario(folder):
@@ -25,7 +31,7 @@ def scenario(folder):
         names = _strip_libraries(folder)
     total = sum((folder / name).stat().st_size for name in names)
     if len(names) != FILES or total < BYTES:
-        raise ScenarioError(f'{SOURCE} has too few libraries for a real input; is libwine installed?')
+        raise ScenarioError(f'{SOURCE} has too few libraries for a real input')
     print(f'real input: {len(names)} files, {total} bytes')
     return parse('real-input', '\n'.join(_text(names)), 'real input')
 
@@ -44,11 +50,10 @@ def _strip_libraries(folder):
 def _targets(index):
     """A destination and the directories that it stands for: most files go into the installation
     directory, some below it, some to both."""
-    library = INSTALL_DIR + r'\library'
     if index % 7 == 0:
-        return r'%INSTALL_DIR%;%INSTALL_DIR%\library', [INSTALL_DIR, library]
+        return r'%INSTALL_DIR%;%INSTALL_DIR%\library', [INSTALL_DIR, LIBRARY]
     if index % 4 == 0:
-        return r'%INSTALL_DIR%\library', [library]
+        return r'%INSTALL_DIR%\library', [LIBRARY]
     return '%INSTALL_DIR%', [INSTALL_DIR]
 
 
@@ -68,28 +73,30 @@ def _text(names):
             gone.append(f'  - {directory}\\{name}')
     installed = [*copied, 'Moriv registered in the system registry ',
                  r'Uninstall file is installed correctly :  C:\windows\MorivRmv.exe']
-    removed = ['Found a registered version of Moriv ', 'Unistalling Moriv from the system ', *deleted,
-               f'Removing Directory :  {INSTALL_DIR}', 'Moriv registration removed from the registry ']
+    removed = ['Found a registered version of Moriv ', 'Unistalling Moriv from the system ',
+               *deleted, f'Removing Directory :  {INSTALL_DIR}',
+               'Moriv registration removed from the registry ']
+    product = [r'  + [SOFTWARE\Zeb]', r'  + [SOFTWARE\Zeb\Moriv]',
+               r'  + "InstallDir"="C:\\Program Files\\Moriv"', '  + "Language"="FR"',
+               r'  + [SOFTWARE\Zeb\Moriv\Services]']
+    command = [r'    [SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce]',
+               r'  + "MorivCommand"="C:\\windows\\system32\\rundll32.exe'
+               r' setupapi.dll,InstallHinfSection Uninstall 132 C:\\windows\\Moriv.INF"']
     return [
         *image,
-        'run C:\\Setup.exe /s', 'exit 1', 'log', *_numbered(installed),
-        'files', f'  + {INSTALL_DIR}\\', f'  + {INSTALL_DIR}\\library\\', *new,
-        '  + C:\\windows\\MorivRmv.exe = removal program of C:\\Setup.exe in French',
-        'registry', '  + [SOFTWARE\\Zeb]', '  + [SOFTWARE\\Zeb\\Moriv]',
-        '  + "InstallDir"="C:\\\\Program Files\\\\Moriv"', '  + "Language"="FR"',
-        '  + [SOFTWARE\\Zeb\\Moriv\\Services]',
-        'run C:\\windows\\MorivRmv.exe /s', 'exit 1', 'log', *_numbered(removed),
-        'files', f'  - {INSTALL_DIR}\\', f'  - {INSTALL_DIR}\\library\\', *gone,
-        '  + C:\\windows\\Moriv.INF = the INF file',
-        'registry', '    [SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce]',
-        '  + "MorivCommand"="C:\\\\windows\\\\system32\\\\rundll32.exe setupapi.dll,InstallHinfSection'
-        ' Uninstall 132 C:\\\\windows\\\\Moriv.INF"',
-        '  - [SOFTWARE\\Zeb\\Moriv]', '  - [SOFTWARE\\Zeb\\Moriv\\Services]',
-        'restart', 'files', '  - C:\\windows\\MorivRmv.exe', '  - C:\\windows\\MorivLog.txt',
-        '  - C:\\windows\\Moriv.INF',
-        'registry', '    [SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce]',
-        '  - "MorivCommand"="C:\\\\windows\\\\system32\\\\rundll32.exe setupapi.dll,InstallHinfSection'
-        ' Uninstall 132 C:\\\\windows\\\\Moriv.INF"',
+        r'run C:\Setup.exe /s', 'exit 1', 'log', *_numbered(installed),
+        'files', f'  + {INSTALL_DIR}\\', f'  + {LIBRARY}\\', *new,
+        r'  + C:\windows\MorivRmv.exe = removal program of C:\Setup.exe in French',
+        'registry', *product,
+        r'run C:\windows\MorivRmv.exe /s', 'exit 1', 'log', *_numbered(removed),
+        'files', f'  - {INSTALL_DIR}\\', f'  - {LIBRARY}\\', *gone,
+        r'  + C:\windows\Moriv.INF = the INF file',
+        'registry', *command,
+        r'  - [SOFTWARE\Zeb\Moriv]', r'  - [SOFTWARE\Zeb\Moriv\Services]',
+        'restart',
+        'files', r'  - C:\windows\MorivRmv.exe', r'  - C:\windows\MorivLog.txt',
+        r'  - C:\windows\Moriv.INF',
+        'registry', command[0], command[1].replace('  + ', '  - '),
     ]
 
 

@@ -29,12 +29,20 @@ class Value:
             return self.data[:-1]
         return self.data
 
+    def exact(self):
+        """As REGEDIT4 has it, to the byte: a quoted text stands for one with its NUL."""
+        return self._line(self.data, self.data.endswith(b'\0'))
+
     def __str__(self):
+        """For a comparison: a text with and without its NUL look the same."""
+        return self._line(self._bare(), True)
+
+    def _line(self, data, terminated):
         name = '@' if not self.name else _quote(self.name)
         text = self._bare()
-        if self.type == REG_SZ and not any(byte < 0x20 for byte in text):
+        if self.type == REG_SZ and terminated and not any(byte < 0x20 for byte in text):
             return f'{name}={_quote(text.decode("cp1252", "replace"))}'
-        return f'{name}=hex({self.type:x}):' + ','.join(f'{byte:02x}' for byte in self.data)
+        return f'{name}=hex({self.type:x}):' + ','.join(f'{byte:02x}' for byte in data)
 
 
 @dataclass
@@ -87,7 +95,8 @@ class Registry:
         """REGEDIT4 sections, one a key, parents first."""
         lines = []
         for key in self.keys.values():
-            lines += [f'[{ROOT}\\{key.path}]', *map(str, key.values.values()), '']
+            values = [value.exact() for value in key.values.values()]
+            lines += [f'[{ROOT}\\{key.path}]', *values, '']
         return lines
 
     def copy(self):
@@ -97,8 +106,8 @@ class Registry:
 
 
 def changes(before, after):
-    """What differs, as lines: '+ [KEY]', '- [KEY]' and '  [KEY]' for one that stays, and below a key
-    that is new or stays its values with '+' and '-'. In the order of the keys' names."""
+    """What differs, as lines: '+ [KEY]', '- [KEY]' and '  [KEY]' for one that stays, and below a
+    key that is new or stays its values with '+' and '-'. In the order of the keys' names."""
     lines = []
     for low in sorted(before.keys | after.keys):
         old, new = before.keys.get(low), after.keys.get(low)

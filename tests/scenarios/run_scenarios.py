@@ -8,10 +8,11 @@ import sys
 from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
+sys.dont_write_bytecode = True  # before the modules of this folder
 import real_input
 from scenario_play import ScenarioFailure, play
 from scenario_text import ScenarioError, parse
-from worlds import StandIn, Wine, WorldError
+from worlds import StandIn, Wine, WorldError, require
 
 HERE = Path(__file__).resolve().parent
 ROOT = HERE.parent.parent
@@ -32,20 +33,17 @@ class Tools:
 
 def main():
     options = read_options()
-    if options.world == 'stand-in':
-        world = StandIn(options.native, options.work / 'stand-in')
-    else:
-        bits = int(options.world[len('wine'):])
-        world = Wine(bits, getattr(options, f'win{bits}'), ROOT / 'tools' / 'wine',
-                     options.wine / f'scenarios{bits}')
-        reason = world.missing()
-        if reason:
-            print(f'{world.name}: left out: {reason}')
-            # Only what the host can't do and what was asked for is left out without a failure.
-            return LEFT_OUT if bits == 32 or os.environ.get('MORIV_WINE') == 'none' else 1
+    world = make_world(options)
+    reason = world.missing() or (real_input.missing() if options.real_input else '')
+    if reason:
+        print(f'{world.name}: left out: {reason}')
+        # Only what the host can't do and what was asked for is left out without a failure.
+        asked_for = os.environ.get('MORIV_WINE') == 'none'
+        return LEFT_OUT if asked_for or options.world == 'wine32' else 1
     tools = Tools(world.stub, options.native / 'moriv-image', options.win32 / 'samples',
                   options.work / 'real-input')
     try:
+        require(tools.image_tool)
         scenarios = choose_scenarios(options, tools)
         failures = run_all(world, scenarios, tools, options.work / f'{world.name}-images')
     except (ScenarioError, WorldError) as error:
@@ -54,9 +52,17 @@ def main():
     return 1 if failures else 0
 
 
+def make_world(options):
+    if options.world == 'stand-in':
+        return StandIn(options.native, options.work / 'stand-in')
+    bits = int(options.world[len('wine'):])
+    return Wine(bits, getattr(options, f'win{bits}'), ROOT / 'tools' / 'wine',
+                options.wine / f'scenarios{bits}')
+
+
 def read_options():
     parser = argparse.ArgumentParser(description=__doc__)
-    parser.add_argument('names', nargs='*', metavar='NAME', help='scenarios to play; all of them without')
+    parser.add_argument('names', nargs='*', metavar='NAME', help='scenarios to play; without, all')
     parser.add_argument('--world', choices=['stand-in', 'wine64', 'wine32'], default='stand-in')
     parser.add_argument('--real-input', action='store_true',
                         help='play one large scenario of real programs instead of the files')
@@ -114,7 +120,7 @@ def run_one(world, scenario, tools, images):
         kept = f'\nthe machine is kept in {where}' if where else ''
         if not where:
             machine.discard()
-        return f'FAILED {scenario.name}\n{failure}{kept}'
+        return f'FAILED {scenario.name}: {scenario.title}\n{failure}{kept}'
     machine.discard()
     shutil.rmtree(images / scenario.name, ignore_errors=True)
     return f'ok {scenario.name}'

@@ -1,14 +1,13 @@
 """Plays one scenario on one machine: prepares it, starts what the scenario starts, and compares."""
 
 import difflib
-import random
 import re
-import subprocess
 from datetime import datetime, timedelta
 
 import file_tree
 import registry_text
 from package_image import Image, ImageError, damage
+from packed_image import PackedImage, file_content, quoted_bytes
 from registry_text import RegistryError
 from scenario_text import ACTIONS, CHECKS, ScenarioError
 
@@ -17,9 +16,10 @@ LANGUAGES = {'English': 0, 'French': 10000, 'German': 20000, 'Italian': 30000, '
 
 # What a removal leaves for the system's INF installer; one scenario has it line by line.
 INF_FILE = '\r\n'.join([
-    '[Version]', 'Signature=$Chicago$', 'AdvancedINF=2.0', '', '[Uninstall]', 'DelFiles=RemoveFiles',
-    '', '[RemoveFiles]', 'MorivRmv.exe', 'MorivLog.txt', 'Moriv.INF', '', '[DestinationDirs]',
-    'RemoveFiles = 10', '']).encode('ascii')
+    '[Version]', 'Signature=$Chicago$', 'AdvancedINF=2.0', '',
+    '[Uninstall]', 'DelFiles=RemoveFiles', '',
+    '[RemoveFiles]', 'MorivRmv.exe', 'MorivLog.txt', 'Moriv.INF', '',
+    '[DestinationDirs]', 'RemoveFiles = 10', '']).encode('ascii')
 
 
 class ScenarioFailure(Exception):
@@ -29,7 +29,7 @@ class ScenarioFailure(Exception):
 def play(scenario, machine, tools, folder):
     """Raises ScenarioFailure, or ScenarioError for a scenario that can't be carried out.
 
-    tools: has `stub`, `image_tool` and `content`, see PackedImages; folder: for the images' sources.
+    tools: what images are made with (packed_image.py); folder: for the sources of the images.
     """
     player = _Player(machine, tools, folder)
     sections = list(scenario.sections)
@@ -42,18 +42,6 @@ def play(scenario, machine, tools, folder):
             player.act(section, checks)
         else:
             player.prepare(section)
-
-
-def sample_bytes(seed, size):
-    """Bytes that a packer finds partly easy and partly hard; always the same for the same seed."""
-    source = random.Random(seed)
-    phrase = source.randbytes(23)
-    blocks, length = [], 0
-    while length < size:
-        block = source.choice([phrase * 9, source.randbytes(97), bytes(200), phrase[:7] * 20])
-        blocks.append(block)
-        length += len(block)
-    return b''.join(blocks)[:size]
 
 
 class _Player:
@@ -90,15 +78,16 @@ class _Player:
                 self.machine.files.host(path).mkdir(parents=True, exist_ok=True)
             else:
                 words, read_only, _ = content.partition(' read-only')
-                self.machine.files.write(path, self.given_content(words, path), bool(read_only))
+                data = file_content(words, path, self.tools)
+                self.machine.files.write(path, data, bool(read_only))
 
     def _given_registry(self, section):
         self.machine.set_registry(self.machine.registry().apply(section.body))
 
     def _given_image(self, section):
         path = section.argument
-        packed = PackedImage(section.body, self.given_content)
-        data = packed.make(self.tools, self.folder / path.rpartition('\\')[2])
+        packed = PackedImage(section.body, self.tools)
+        data = packed.make(self.folder / path.rpartition('\\')[2])
         self.originals[path] = packed.contents
         self._place(path, data)
 
@@ -120,18 +109,6 @@ class _Player:
         self.machine.add_drive(path[0].lower())
         self.machine.files.write(path, data)
 
-    def given_content(self, text, seed):
-        """The bytes that the words behind a file's '=' stand for."""
-        if re.fullmatch(r'\d+ bytes', text):
-            return sample_bytes(seed, int(text.split()[0]))
-        if re.fullmatch('".*"', text):
-            return _unescape(text[1:-1])
-        kind, _, name = text.partition(' ')
-        content = self.tools.content(kind, name)
-        if content is None:
-            raise ValueError(f'no such content: {text}')
-        return content
-
     # Actions
 
     def act(self, section, checks):
@@ -150,8 +127,8 @@ class _Player:
                        registry_text.changes(registry, self.machine.registry()))
         report += self._compare(found, checks, section)
         if report:
-            raise ScenarioFailure('\n'.join([f'{section.place}: {section.keyword} {section.argument}',
-                                             *report]))
+            what = f'{section.place}: {section.keyword} {section.argument}'
+            raise ScenarioFailure('\n'.join([what, *report]))
 
     def _compare(self, found, checks, action):
         said = {check.keyword: check for check in checks}
@@ -170,12 +147,11 @@ class _Player:
             report += _difference(path, expected, lines)
         files = {path: sign for path, sign in found.files.items() if path not in texts}
         report += self._compare_files(body('files'), files, action.place)
-        report += _difference('registry', [line.rstrip() for line in body('registry')], found.registry)
-        return report
+        return report + _difference('registry', body('registry'), found.registry)
 
     def _text_lines(self, path, changed, headings):
-        """The lines of a text file that the run wrote, as a text section has them; headings: with one
-        word for the four lines of a log's heading."""
+        """The lines of a text file that the run wrote, as a text section has them; headings: with
+        one word for the four lines of a log's heading."""
         if changed.get(path) not in ('+', '~'):
             return [f'(the run did not write {path})']
         text = self.machine.files.read(path).decode('cp1252', 'replace')
@@ -204,19 +180,17 @@ class _Player:
         return 'heading' if exact and near else f'heading with the time "{stamp}"'
 
     def _compare_files(self, lines, found, place):
-        expected, actual = [], []
+        actual = []
         for line in lines:
             sign, path, words = _split_file_line(line, place)
-            expected.append(line)
-            if found.get(path) != sign:
-                continue
-            del found[path]
-            trouble = '' if sign == '-' or path.endswith('\\') else self._content_trouble(path, words, place)
-            actual.append(line + trouble)
+            if found.get(path) == sign:
+                del found[path]
+                actual.append(line + (self._content_trouble(path, words, place) if words else ''))
         for path, sign in found.items():
-            size = '' if sign == '-' or path.endswith('\\') else f' = {len(self.machine.files.read(path))} bytes'
+            is_file = sign != '-' and not path.endswith('\\')
+            size = f' = {len(self.machine.files.read(path))} bytes' if is_file else ''
             actual.append(f'{sign} {path}{size}')
-        return _difference('files', sorted(expected), sorted(actual))
+        return _difference('files', sorted(lines), sorted(actual))
 
     def _content_trouble(self, path, words, place):
         expected = self._expected_content(words, place)
@@ -235,12 +209,15 @@ class _Player:
             contents = self.originals[original[2]] if original[2] else self._only_originals(place)
             if original[1] in contents:
                 return contents[original[1]]
+        first = re.fullmatch(r'first (\d+) bytes of (\S+)', words)
+        if first and first[2] in self._only_originals(place):
+            return self._only_originals(place)[first[2]][:int(first[1])]
         removal = re.fullmatch(r'removal program of (.+) in (\w+)', words)
         if removal and removal[1] in self.images:
             number = LANGUAGES.get(removal[2], removal[2])
             return Image(self.images[removal[1]]).removal_program(int(number))
         if re.fullmatch('".*"', words):
-            return _unescape(words[1:-1])
+            return quoted_bytes(words)
         raise ScenarioError(f'{place}: no such content: {words}')
 
     def _only_originals(self, place):
@@ -254,58 +231,6 @@ class _Found:
         self.exit_code, self.shown, self.files, self.registry = exit_code, shown, files, registry
 
 
-class PackedImage:
-    """A setup image as a 'given image' section describes it, made with the image tool."""
-
-    def __init__(self, body, given_content):
-        self.options = {'default_directory': "'C:\\Program Files\\Moriv'",
-                        'default_language': '"french"'}
-        self.flags = []       # of the image tool
-        self.files = []       # (name, destination)
-        self.contents = {}    # name -> bytes
-        for line in body:
-            if ' -> ' in line:
-                self._add_file(line, given_content)
-            else:
-                self._set_option(line)
-
-    def _add_file(self, line, given_content):
-        words, _, destination = line.partition(' -> ')
-        name, _, content = words.partition(' = ')
-        self.files.append((name, destination))
-        self.contents[name] = given_content(content, 'packed ' + name)
-
-    def _set_option(self, line):
-        name, _, value = line.partition(' = ')
-        if name == 'default directory':
-            self.options['default_directory'] = f"'{value}'"
-        elif name == 'default language':
-            self.options['default_language'] = f'"{value}"'
-        elif name == 'space needed':
-            self.options['space_needed'] = value
-        elif name == 'removal':
-            self.options['removal'] = 'true'
-        elif name == 'allow unknown macros':
-            self.flags.append('--allow-unknown-macros')
-        else:
-            raise ValueError(f'no such line of an image: {line}')
-
-    def make(self, tools, folder):
-        """The image's bytes; folder takes the sources and is made here."""
-        folder.mkdir(parents=True)
-        lines = ['[package]', *(f'{name} = {value}' for name, value in self.options.items())]
-        for name, destination in self.files:
-            (folder / name).write_bytes(self.contents[name])
-            lines += ['[[file]]', f"source = '{name}'", f"destination = '{destination}'"]
-        description, image = folder / 'package.toml', folder / 'image.packed'
-        description.write_text('\n'.join(lines) + '\n', encoding='utf-8')
-        done = subprocess.run([tools.image_tool, 'pack', description, '--stub', tools.stub,
-                               '-o', image, *self.flags], capture_output=True, text=True)
-        if done.returncode != 0:
-            raise ValueError(done.stderr.strip())
-        return image.read_bytes()
-
-
 def _program_and_arguments(section):
     program, _, arguments = section.argument.partition(' ')
     return program, arguments
@@ -316,11 +241,6 @@ def _split_file_line(line, place):
     if not match or (match[3] is None) != (match[1] == '-' or match[2].endswith('\\')):
         raise ScenarioError(f'{place}: not a line of files: {line}')
     return match[1], match[2], match[3]
-
-
-def _unescape(text):
-    escapes = {'r': '\r', 'n': '\n', 't': '\t'}
-    return re.sub(r'\\(.)', lambda m: escapes.get(m[1], m[1]), text).encode('cp1252')
 
 
 def _difference(what, expected, actual):

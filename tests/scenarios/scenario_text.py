@@ -3,8 +3,8 @@
 import re
 from dataclasses import dataclass, field
 
-# What a section may be. A world's line comes first; "given" sections and "damage" prepare the machine;
-# actions start something; checks say what the action before them has to have done.
+# What a section may be. A world's line comes first; "given" sections and "damage" prepare the
+# machine; actions start something; checks say what the action before them has to have done.
 WORLDS = ('only stand-in', 'only Wine')
 PREPARATIONS = ('given machine', 'given files', 'given registry', 'given image', 'given run',
                 'damage')
@@ -12,7 +12,7 @@ ACTIONS = ('run', 'restart')
 CHECKS = ('exit', 'shown', 'log', 'text', 'files', 'registry')
 VERBATIM = ('shown', 'log', 'text')
 
-_KEYWORD = re.compile('(' + '|'.join(WORLDS + PREPARATIONS + ACTIONS + CHECKS) + r')(?:: |:?$| )(.*)')
+_KEYWORD = re.compile(f'({"|".join(WORLDS + PREPARATIONS + ACTIONS + CHECKS)})(?:: |:?$| )(.*)')
 
 
 class ScenarioError(Exception):

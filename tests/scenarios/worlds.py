@@ -4,11 +4,11 @@ A world gives machines, one after the other or (the stand-in) several at once. A
 tree and a registry, starts programs and can be restarted.
 """
 
+import fcntl
 import os
 import shutil
 import subprocess
 from collections import namedtuple
-from pathlib import Path
 
 from file_tree import FileTree
 from registry_text import Registry, Value
@@ -34,7 +34,11 @@ class StandIn:
         self.machine_tool = native / 'moriv-machine'
         self.work = work
 
+    def missing(self):
+        return ''
+
     def open(self):
+        require(self.stub, self.machine_tool)
         self.fresh = self.work / 'fresh'
         shutil.rmtree(self.work, ignore_errors=True)
         self.work.mkdir(parents=True)
@@ -127,13 +131,20 @@ class Wine:
 
     def missing(self):
         """Why this host can't have the world; '' when it can."""
-        answer = subprocess.run([self.tool, 'can-run', str(self.bits)], capture_output=True, text=True)
+        answer = subprocess.run([self.tool, 'can-run', str(self.bits)],
+                                capture_output=True, text=True)
         return '' if answer.returncode == 0 else answer.stdout.strip() or answer.stderr.strip()
 
     def open(self):
+        require(self.stub, self.agent_program)
+        self.prefix.parent.mkdir(parents=True, exist_ok=True)
+        # Two runs in one prefix would see each other's files; the second one waits.
+        self.lock = open(f'{self.prefix}.in-use', 'w')
+        fcntl.flock(self.lock, fcntl.LOCK_EX)
         _call([self.tool, 'prefix', self.prefix, str(self.bits)])
         self.files = FileTree(self.prefix)
-        self.agent = Agent([self.tool, 'run', self.prefix, self.agent_program])
+        self.agent = Agent([self.tool, 'run', self.prefix, self.agent_program],
+                           f'{self.prefix}.agent-log')
         self.clean_files()
         for key in self.WATCHED:
             self.agent.ask(f'delete {key}')
@@ -142,7 +153,7 @@ class Wine:
             self.agent.ask(f'key {key}')
 
     def clean_files(self):
-        """Takes away what an earlier scenario left. The first one finds the prefix as it was made."""
+        """Takes away what an earlier scenario left; the first one finds the prefix as made."""
         listing = self.prefix / 'fresh-files'
         if not listing.exists():
             listing.write_text('\n'.join(self.files.snapshot()), encoding='utf-8')
@@ -156,7 +167,7 @@ class Wine:
     def close(self):
         if self.agent:
             self.agent.close()
-        _call([self.tool, 'stop', self.prefix])
+            _call([self.tool, 'stop', self.prefix])
 
     def machine(self, name):
         return WineMachine(self)
@@ -226,9 +237,11 @@ def _add_dumped_value(key, text):
 class Agent:
     """The helper program in a Wine session (tests/windows/scenario_agent.cpp)."""
 
-    def __init__(self, command):
-        self.process = subprocess.Popen(command, stdin=subprocess.PIPE, stdout=subprocess.PIPE,
-                                        stderr=subprocess.PIPE)
+    def __init__(self, command, error_log):
+        self.error_log = error_log
+        with open(error_log, 'wb') as errors:
+            self.process = subprocess.Popen(command, stdin=subprocess.PIPE, stdout=subprocess.PIPE,
+                                            stderr=errors)
 
     def ask(self, command):
         """Sends one command; gives the lines of its answer."""
@@ -245,12 +258,17 @@ class Agent:
             if line.startswith('failed: '):
                 raise WorldError(f'{command}: {line}')
             lines.append(line)
-        errors = self.process.stderr.read().decode('utf-8', 'replace').strip()
-        raise WorldError(f'the agent under Wine ended at "{command}": {errors}')
+        raise WorldError(f'the agent under Wine ended at "{command}"; see {self.error_log}')
 
     def close(self):
         self.process.stdin.close()
         self.process.wait(timeout=TIME_LIMIT)
+
+
+def require(*products):
+    for product in products:
+        if not product.exists():
+            raise WorldError(f'{product} is missing; run "make" first')
 
 
 def _call(command):

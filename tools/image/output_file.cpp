@@ -48,6 +48,7 @@ OutputFile::~OutputFile() {
 }
 
 void OutputFile::Write(std::span<const uint8_t> bytes) {
+  if (bytes.empty()) return;  // fwrite takes no null pointer, not even for nothing
   if (std::fwrite(bytes.data(), 1, bytes.size(), file_) != bytes.size()) Fail(errno);
 }
 

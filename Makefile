@@ -1,0 +1,29 @@
+# The front doors. Everything behind them is CMake (CMakePresets.json), CTest and the scripts in
+# tools/. On a bare Debian the first of them to run installs what is missing.
+PRESETS := native win32 win64
+CMAKE_QUIET := --log-level=WARNING
+
+.PHONY: all demo test check clean bootstrap $(PRESETS)
+
+all: $(PRESETS)
+
+bootstrap:
+	@tools/bootstrap
+
+$(PRESETS): bootstrap
+	@cmake --preset $@ $(CMAKE_QUIET) >/dev/null
+	@cmake --build --preset $@
+
+demo: native win32
+	@tools/demo
+
+# Unit tests and scenarios, natively and under Wine; ends with CTest's own closing line.
+test: all
+	@ctest --preset native
+
+# What keeps the house in order: tools/check says what it checks.
+check: all
+	@tools/check
+
+clean:
+	rm -rf build

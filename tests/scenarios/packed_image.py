@@ -1,0 +1,92 @@
+"""Contents of files as scenarios write them, and setup images made of such files.
+
+`tools` is what images are made with: `stub` and `image_tool` are host paths of a program without a
+package and of the tool that packs one; `content(kind, name)` gives the bytes of a real file.
+"""
+
+import random
+import re
+import subprocess
+
+
+class PackedImage:
+    """A setup image as a 'given image' section describes it, made with the image tool."""
+
+    def __init__(self, body, tools):
+        self.tools = tools
+        self.options = {'default_directory': "'C:\\Program Files\\Moriv'",
+                        'default_language': '"french"'}
+        self.flags = []       # of the image tool
+        self.files = []       # (name, destination)
+        self.contents = {}    # name -> bytes
+        for line in body:
+            if ' -> ' in line:
+                self._add_file(line)
+            else:
+                self._set_option(line)
+
+    def _add_file(self, line):
+        words, _, destination = line.partition(' -> ')
+        name, _, content = words.partition(' = ')
+        self.files.append((name, destination))
+        self.contents[name] = file_content(content, 'packed ' + name, self.tools)
+
+    def _set_option(self, line):
+        name, _, value = line.partition(' = ')
+        if name == 'default directory':
+            self.options['default_directory'] = f"'{value}'"
+        elif name == 'default language':
+            self.options['default_language'] = f'"{value}"'
+        elif name == 'space needed':
+            self.options['space_needed'] = value
+        elif name == 'allow unknown macros':
+            self.flags.append('--allow-unknown-macros')
+        else:
+            raise ValueError(f'no such line of an image: {line}')
+
+    def make(self, folder):
+        """The image's bytes; folder takes the sources and is made here."""
+        folder.mkdir(parents=True)
+        lines = ['[package]', *(f'{name} = {value}' for name, value in self.options.items())]
+        for name, destination in self.files:
+            (folder / name).write_bytes(self.contents[name])
+            lines += ['[[file]]', f"source = '{name}'", f"destination = '{destination}'"]
+        description, image = folder / 'package.toml', folder / 'image.packed'
+        description.write_text('\n'.join(lines) + '\n', encoding='utf-8')
+        done = subprocess.run([self.tools.image_tool, 'pack', description,
+                               '--stub', self.tools.stub, '-o', image, *self.flags],
+                              capture_output=True, text=True)
+        if done.returncode != 0:
+            raise ValueError(done.stderr.strip())
+        return image.read_bytes()
+
+
+def file_content(words, seed, tools):
+    """The bytes that the words behind a file's '=' stand for: "TEXT", N bytes, or a real file."""
+    if re.fullmatch(r'\d+ bytes', words):
+        return _sample_bytes(seed, int(words.split()[0]))
+    if re.fullmatch('".*"', words):
+        return quoted_bytes(words)
+    kind, _, name = words.partition(' ')
+    content = tools.content(kind, name)
+    if content is None:
+        raise ValueError(f'no such content: {words}')
+    return content
+
+
+def quoted_bytes(words):
+    """The bytes of a "TEXT" in code page 1252, with \\r, \\n, \\t, \\" and \\\\."""
+    escapes = {'r': '\r', 'n': '\n', 't': '\t'}
+    return re.sub(r'\\(.)', lambda m: escapes.get(m[1], m[1]), words[1:-1]).encode('cp1252')
+
+
+def _sample_bytes(seed, size):
+    """Bytes that a packer finds partly easy and partly hard; always the same for the same seed."""
+    source = random.Random(seed)
+    phrase = source.randbytes(23)
+    blocks, length = [], 0
+    while length < size:
+        block = source.choice([phrase * 9, source.randbytes(97), bytes(200), phrase[:7] * 20])
+        blocks.append(block)
+        length += len(block)
+    return b''.join(blocks)[:size]
