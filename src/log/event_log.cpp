@@ -100,14 +100,6 @@ void WriteEvent(DataFile* file, int number, const EventEntry& entry) {
   WriteText(file, line);
 }
 
-bool StandardLogPath(char* path, size_t size) {
-  char directory[kPathSize] = {};
-  char name[kPathSize] = {};
-  LoadCatalogText(nullptr, CatalogLogName, name);
-  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
-         FormatText(path, size, "%s\\%s", directory, name);
-}
-
 // The file, open at the place where the block goes.
 bool OpenLog(DataFile* file, LogMode mode) {
   if (mode == LogMode::kNew) return file->Create() == 1;
@@ -117,11 +109,19 @@ bool OpenLog(DataFile* file, LogMode mode) {
 
 }  // namespace
 
+bool FindLogPath(char (&path)[kLogPathSize]) {
+  char directory[kPathSize] = {};
+  char name[kPathSize] = {};
+  LoadCatalogText(nullptr, CatalogLogName, name);
+  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
+         FormatText(path, sizeof(path), "%s\\%s", directory, name);
+}
+
 void WriteEventLog(const EventList* list, const char* path, LogMode mode) {
   if (list == nullptr || list->count < 1 || list->entries == nullptr) return;
-  char standardPath[2 * kPathSize] = {};
+  char standardPath[kLogPathSize] = {};
   if (IsMissingOrEmpty(path)) {
-    if (!StandardLogPath(standardPath, sizeof(standardPath))) return;
+    if (!FindLogPath(standardPath)) return;
     path = standardPath;
   }
   const std::unique_ptr<DataFile> file(new (std::nothrow) DataFile(path));

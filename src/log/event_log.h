@@ -2,11 +2,18 @@
 #pragma once
 
 #include "core/event_list.h"
+#include "platform/text.h"
 
 enum class LogMode { kAppend = 0, kNew = 1 };
 
+// Room for the standard log's full path: a directory and a name.
+inline constexpr size_t kLogPathSize = 2 * kPathSize;
+
+// Full path of the standard log, MorivLog.txt in the Windows directory. False when there is none.
+bool FindLogPath(char (&path)[kLogPathSize]);
+
 // Writes one block, a heading with the local time and a line for each event, to the file at `path`,
-// or to the standard log, MorivLog.txt in the Windows directory, for a null or empty path. A list
+// or to the standard log for a null or empty path. A list
 // without events leaves the file as it was. A log that can't be written is left out without a word:
 // the work of the run is done by then.
 void WriteEventLog(const EventList* list, const char* path, LogMode mode);

@@ -127,8 +127,8 @@ void PkzExpander::ResetCodes() {
 // A prefix is always older than the entry that names it, so a chain shrinks and ends at a literal.
 // The longest string: 34764 entries (259 to 35022), 1 literal and 1 byte for a code equal to
 // nextCode make 34766, below the 35023 bytes of the stack.
-void PkzExpander::PushByte(uint8_t byte) {
-  stringStack_[kTableSize - ++stringLength_] = byte;
+void PkzExpander::PushByte(uint8_t value) {
+  stringStack_[kTableSize - ++stringLength_] = value;
 }
 
 void PkzExpander::BuildString(uint32_t code) {

@@ -67,7 +67,7 @@ class PkzExpander {
   // the width that it began with.
   bool ReadCode(uint32_t* code);
   void ResetCodes();
-  void PushByte(uint8_t byte);
+  void PushByte(uint8_t value);
   void BuildString(uint32_t code);
 
   int32_t failed_ = 0;

@@ -12,16 +12,6 @@
 namespace {
 
 constexpr uint32_t kBlockSize = 1024;
-constexpr size_t kPathRoom = 2 * kPathSize;  // a directory and a name
-
-bool FormatRemovalProgramPath(char* path, size_t size) {
-  char name[sizeof(FileRecord::fileName)] = {};
-  char directory[kPathSize] = {};
-  LoadCatalogText(nullptr, CatalogRemovalProgram, name);
-  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
-         FormatText(path, size, "%s\\%s", directory, name);
-}
-
 bool CopyExecutable(DataFile* image, uint32_t length, DataFile* copy) {
   uint8_t block[kBlockSize];
   while (length > 0) {
@@ -48,6 +38,14 @@ bool WriteHeader(PackageHeader* header, DataFile* copy) {
 
 }  // namespace
 
+bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]) {
+  char name[sizeof(FileRecord::fileName)] = {};
+  char directory[kPathSize] = {};
+  LoadCatalogText(nullptr, CatalogRemovalProgram, name);
+  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
+         FormatText(path, sizeof(path), "%s\\%s", directory, name);
+}
+
 StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) {
   if (context == nullptr || context->packageFile == nullptr) return StatusBadArgument;
   DataFile* const image = context->packageFile;
@@ -56,8 +54,8 @@ StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) 
 
   FileRecord own = {};
   if (ReadOwnFileRecord(&own) != 1) return StatusBadRecord;
-  char target[kPathRoom] = {};
-  if (!FormatRemovalProgramPath(target, sizeof(target))) return StatusWriteRemovalFailed;
+  char target[kRemovalProgramPathSize] = {};
+  if (!FindRemovalProgramPath(target)) return StatusWriteRemovalFailed;
   if (path != nullptr && size > 0) (void)CopyText(path, static_cast<size_t>(size), target);
 
   const bool replaces = FileExists(target) == 1;

@@ -7,6 +7,12 @@
 
 #include "core/context.h"
 
+// Room for its full path: a directory and a name.
+inline constexpr size_t kRemovalProgramPathSize = 2 * kPathSize;
+
+// Its full path. False when there is no Windows directory.
+bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]);
+
 // Writes it, in place of an earlier one. Needs packageFile, and records as an install pass leaves
 // them; changes records and header in memory into those of the removal program.
 //   path  receives the full path once that is known; may be null. One that doesn't fit in `size`

@@ -3,6 +3,7 @@
 #include "package/paths.h"
 #include "platform/registry_key.h"
 #include "registration/cleanup_script.h"
+#include "registration/removal_program.h"
 #include "ui/catalog.h"
 
 namespace {
@@ -54,13 +55,8 @@ int WriteUninstallEntry(const SetupContext* context) {
 
   // The path alone, without quotes or switches: the removal program's own header tells it what to
   // do.
-  char program[kCatalogTextSize] = {};
-  char directory[kPathSize] = {};
-  char path[kPathSize + kCatalogTextSize] = {};
-  LoadCatalogText(nullptr, CatalogRemovalProgram, program);
-  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
-         FormatText(path, sizeof(path), "%s\\%s", directory, program) &&
-         SetTerminatedText(key, "UninstallString", path);
+  char path[kRemovalProgramPathSize] = {};
+  return FindRemovalProgramPath(path) && SetTerminatedText(key, "UninstallString", path);
 }
 
 int DeleteUninstallEntry() {
