@@ -40,12 +40,11 @@ def main():
         # Only what the host can't do and what was asked for is left out without a failure.
         asked_for = os.environ.get('MORIV_WINE') == 'none'
         return LEFT_OUT if asked_for or options.world == 'wine32' else 1
-    tools = Tools(world.stub, options.native / 'moriv-image', options.win32 / 'samples',
-                  options.work / 'real-input')
+    tools, images = make_tools(options, world)
     try:
         require(tools.image_tool)
         scenarios = choose_scenarios(options, tools)
-        failures = run_all(world, scenarios, tools, options.work / f'{world.name}-images')
+        failures = run_all(world, scenarios, tools, images)
     except (ScenarioError, WorldError) as error:
         print(error, file=sys.stderr)
         return 2
@@ -58,6 +57,13 @@ def make_world(options):
     bits = int(options.world[len('wine'):])
     return Wine(bits, getattr(options, f'win{bits}'), ROOT / 'tools' / 'wine',
                 options.wine / f'scenarios{bits}')
+
+
+def make_tools(options, world):
+    """What images are made with, and the folder for their sources."""
+    tools = Tools(world.stub, options.native / 'moriv-image', options.win32 / 'samples',
+                  options.work / 'real-input')
+    return tools, options.work / f'{world.name}-images'
 
 
 def read_options():

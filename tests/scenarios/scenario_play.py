@@ -2,6 +2,7 @@
 
 import difflib
 import re
+from collections import namedtuple
 from datetime import datetime, timedelta
 
 import file_tree
@@ -20,6 +21,10 @@ INF_FILE = '\r\n'.join([
     '[Uninstall]', 'DelFiles=RemoveFiles', '',
     '[RemoveFiles]', 'MorivRmv.exe', 'MorivLog.txt', 'Moriv.INF', '',
     '[DestinationDirs]', 'RemoveFiles = 10', '']).encode('ascii')
+
+
+# What an action did: exit code or None, shown lines, changed files by sign, changed registry lines.
+Found = namedtuple('Found', 'exit_code shown files registry')
 
 
 class ScenarioFailure(Exception):
@@ -77,9 +82,9 @@ class _Player:
             if path.endswith('\\'):
                 self.machine.files.host(path).mkdir(parents=True, exist_ok=True)
             else:
-                words, read_only, _ = content.partition(' read-only')
+                words = content.removesuffix(' read-only')
                 data = file_content(words, path, self.tools)
-                self.machine.files.write(path, data, bool(read_only))
+                self.machine.files.write(path, data, read_only=words != content)
 
     def _given_registry(self, section):
         self.machine.set_registry(self.machine.registry().apply(section.body))
@@ -117,37 +122,39 @@ class _Player:
         report = []
         if section.keyword == 'restart':
             self.machine.restart()
-            shown = exit_code = None
+            exit_code, shown = None, []
         else:
             outcome = self.machine.run(*_program_and_arguments(section))
-            shown, exit_code = outcome.shown, outcome.exit_code
+            exit_code, shown = outcome.exit_code, outcome.shown
             if outcome.trouble:
                 report.append(outcome.trouble)
-        found = _Found(exit_code, shown, file_tree.changes(files, self.machine.files.snapshot()),
-                       registry_text.changes(registry, self.machine.registry()))
+        found = Found(exit_code, shown, file_tree.changes(files, self.machine.files.snapshot()),
+                      registry_text.changes(registry, self.machine.registry()))
         report += self._compare(found, checks, section)
         if report:
             what = f'{section.place}: {section.keyword} {section.argument}'
             raise ScenarioFailure('\n'.join([what, *report]))
 
     def _compare(self, found, checks, action):
-        said = {check.keyword: check for check in checks}
-        body = lambda keyword: said[keyword].body if keyword in said else []
-        if action.keyword == 'run' and 'exit' not in said:
-            raise ScenarioError(f'{action.place}: a run without an exit code')
-        report = []
-        if action.keyword == 'run':
-            actual = 'none' if found.exit_code is None else str(found.exit_code)
-            report += _difference('exit code', [said['exit'].argument], [actual])
-            report += _difference('shown', body('shown'), [f'|{line}|' for line in found.shown])
         texts = {(c.argument or LOG): c for c in checks if c.keyword in ('log', 'text')}
+        others = {c.keyword: c for c in checks if c.keyword not in ('log', 'text')}
+        if len(texts) + len(others) != len(checks):
+            raise ScenarioError(f'{action.place}: two checks of the same thing')
+        if (action.keyword == 'run') != ('exit' in others):
+            raise ScenarioError(f'{action.place}: a run has an exit code, a restart has none')
+        body = {keyword: check.body for keyword, check in others.items()}
+        report = []
+        if 'exit' in others:
+            actual = 'none' if found.exit_code is None else str(found.exit_code)
+            report += _difference('exit code', [others['exit'].argument], [actual])
+        report += _difference('shown', body.get('shown', []), [f'|{line}|' for line in found.shown])
         for path, check in texts.items():
             expected = (['heading'] if check.keyword == 'log' else []) + check.body
             lines = self._text_lines(path, found.files, 'heading' in expected)
             report += _difference(path, expected, lines)
         files = {path: sign for path, sign in found.files.items() if path not in texts}
-        report += self._compare_files(body('files'), files, action.place)
-        return report + _difference('registry', body('registry'), found.registry)
+        report += self._compare_files(body.get('files', []), files, action.place)
+        return report + _difference('registry', body.get('registry', []), found.registry)
 
     def _text_lines(self, path, changed, headings):
         """The lines of a text file that the run wrote, as a text section has them; headings: with
@@ -202,36 +209,37 @@ class _Player:
         return f' BUT {len(actual)} bytes for {len(expected)}, other from byte {at} on'
 
     def _expected_content(self, words, place):
-        if words == 'the INF file':
-            return INF_FILE
-        original = re.fullmatch(r'original (\S+)(?: of (.+))?', words)
-        if original:
-            contents = self.originals[original[2]] if original[2] else self._only_originals(place)
-            if original[1] in contents:
-                return contents[original[1]]
-        first = re.fullmatch(r'first (\d+) bytes of (\S+)', words)
-        if first and first[2] in self._only_originals(place):
-            return self._only_originals(place)[first[2]][:int(first[1])]
-        removal = re.fullmatch(r'removal program of (.+) in (\w+)', words)
-        if removal and removal[1] in self.images:
-            number = LANGUAGES.get(removal[2], removal[2])
-            return Image(self.images[removal[1]]).removal_program(int(number))
-        if re.fullmatch('".*"', words):
-            return quoted_bytes(words)
+        try:
+            for pattern, content in self._contents():
+                match = re.fullmatch(pattern, words)
+                if match:
+                    return content(*match.groups())
+        except (KeyError, ValueError) as error:
+            raise ScenarioError(f'{place}: {words}: {error}') from error
         raise ScenarioError(f'{place}: no such content: {words}')
 
-    def _only_originals(self, place):
-        if len(self.originals) != 1:
-            raise ScenarioError(f'{place}: original NAME of which image?')
-        return next(iter(self.originals.values()))
+    def _contents(self):
+        """What may stand behind a file's '=' in a check."""
+        return [
+            (r'the INF file', lambda: INF_FILE),
+            (r'original (\S+)(?: of (.+))?', self._original),
+            (r'first (\d+) bytes of (\S+)', lambda n, name: self._original(name, None)[:int(n)]),
+            (r'removal program of (.+) in (\w+)', lambda image, language:
+                Image(self.images[image]).removal_program(int(LANGUAGES.get(language, language)))),
+            (r'(".*")', quoted_bytes),
+        ]
 
-
-class _Found:
-    def __init__(self, exit_code, shown, files, registry):
-        self.exit_code, self.shown, self.files, self.registry = exit_code, shown, files, registry
+    def _original(self, name, image):
+        if image is None and len(self.originals) != 1:
+            raise ValueError('of which image?')
+        return self.originals[image or next(iter(self.originals))][name]
 
 
 def _program_and_arguments(section):
+    """The path, in quotes when it has blanks, and all that stands behind it and one blank."""
+    quoted = re.match('"([^"]*)"(?: |$)(.*)', section.argument)
+    if quoted:
+        return quoted.groups()
     program, _, arguments = section.argument.partition(' ')
     return program, arguments
 

@@ -83,7 +83,7 @@ TEST_F(ImageBuilder, DependsOnNothingButItsInputs) {
 TEST_F(ImageBuilder, MakesARemovalProgramOfADescriptionThatSaysSo) {
   PackSample();
   std::string text = SampleDescription();
-  Write("removal.toml", text.insert(text.find("\n") + 1, "removal = true\n"));
+  Write("removal.toml", text.insert(text.find('\n') + 1, "removal = true\n"));
   const ToolRun packed =
       RunImage({"pack", "@removal.toml", "--stub", "@stub.exe", "-o", "@packed.exe"});
   ASSERT_EQ(packed.status, 0) << packed.err;
@@ -169,14 +169,15 @@ TEST_F(ImageBuilder, RefusesBadDescriptionsWithTheirLine) {
 
 TEST_F(ImageBuilder, TakesWhatIsOnlyUnusual) {
   PackSample();
-  const std::string longPart(120, 'd');
+  // C:\ and 119 + 1 + 120 + 1 + 9 and \a.exe: a path of exactly 259.
+  std::string longPath(250, 'd');
+  longPath[119] = longPath[240] = '\\';
   for (const std::string& text :
        {WithDestination("\\a\\b\\"), WithDestination("D:\\Shared"), WithDestination(";a"),
         WithDestination("%sys_dir%sub;%Remove_Dir%\\x"), WithDestination("100% pure"),
         WithDestination("a;b;%PLUGIN_ALL_DIR%\\x"), WithDirectory(""), WithDirectory("C:\\"),
-        // 3 + 120 + 1 + 120 + 1 + 8 + 1 + 5: a path of exactly 259
-        WithDestination(longPart + "\\" + longPart + "\\12345678"), WithName("console.exe"),
-        WithName("com10"), WithName("\\u00e9t\\u00e9.txt")}) {
+        WithDestination(longPath), WithName("console.exe"), WithName("com10"),
+        WithName("\\u00e9t\\u00e9.txt")}) {
     Write("setup.toml", text);
     const ToolRun run = RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@new.exe"});
     EXPECT_EQ(run.status, 0) << text << run.err;

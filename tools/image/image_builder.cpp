@@ -57,7 +57,8 @@ class ImageBuilder {
       throw BadInput(order_.stub,
                      "has a package behind it already; use the setup program as it was built");
     }
-    if (stub.Size() > kLargestSize) throw BadInput(order_.stub, "has 2 GiB or more; use a smaller file");
+    if (stub.Size() > kLargestSize)
+      throw BadInput(order_.stub, "has 2 GiB or more; use a smaller file");
     RequireVersion(order_.stub);
   }
 
@@ -112,7 +113,8 @@ class ImageBuilder {
 
   uint64_t SizeOfSource(const FileDescription& file) const {
     const InputFile source(SourceOf(file));
-    if (source.Size() > kLargestSize) throw BadInput(source.Path(), "has 2 GiB or more; use a smaller file");
+    if (source.Size() > kLargestSize)
+      throw BadInput(source.Path(), "has 2 GiB or more; use a smaller file");
     return source.Size();
   }
 

@@ -1,0 +1,23 @@
+// Three commands beside the dialog's chain of steps. None changes the state of a run, but for the
+// directory that the picker puts into the edit field, and nothing that fails in them is told.
+#pragma once
+
+#include "core/context.h"
+#include "platform/win32.h"
+
+// Lets the user pick the installation directory with the system's folder picker.
+void BrowseForDirectory(HWND dialog, SetupContext* context);
+
+// Starts the default browser with the maker's web address.
+void OpenWebAddress(HWND dialog, const SetupContext* context);
+
+// Opens the log with the program that the system has for it.
+void OpenLogFile(HWND dialog);
+
+// The command line that the system registers for web addresses. Returns 1, or 0 when there is none
+// or it doesn't fit.
+int ReadBrowserCommand(char* buffer, size_t size);
+
+// Replaces each occurrence of a character, or drops it when the replacement is 0. Returns 1, or -1
+// for a null text.
+int RemoveCharacter(char* text, char character, char replacement);
