@@ -3,7 +3,7 @@
 #include "core/run_settings.h"
 #include "package/paths.h"
 #include "ui/catalog.h"
-#include "ui/controls.h"
+#include "ui/control_ids.h"
 
 namespace {
 

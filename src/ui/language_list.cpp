@@ -6,7 +6,7 @@
 
 #include "package/paths.h"
 #include "ui/catalog.h"
-#include "ui/controls.h"
+#include "ui/control_ids.h"
 
 namespace {
 

@@ -3,7 +3,7 @@
 #include "log/event_log.h"
 #include "platform/registry_key.h"
 #include "ui/catalog.h"
-#include "ui/controls.h"
+#include "ui/control_ids.h"
 
 namespace {
 

@@ -20,8 +20,10 @@
 #include "registration/removal_program.h"
 #include "registration/uninstall_entries.h"
 #include "ui/catalog.h"
-#include "ui/controls.h"
+#include "ui/control_ids.h"
+#include "ui/dialog_controls.h"
 #include "ui/dialog_look.h"
+#include "ui/held_command.h"
 #include "ui/language_list.h"
 #include "ui/side_commands.h"
 
@@ -49,84 +51,7 @@ constexpr uint32_t BusyFailed = 3;   // failure page: Cancel closes
 
 LanguageListArt languageArt;
 
-// A command that arrived while SetUpPage stood on the stack, where it could release the context
-// under the running check for older files, or start a second handler.
-struct HeldCommand {
-  bool isHolding;  // SetUpPage runs
-  bool isHeld;
-  WPARAM command;  // as it came
-  HWND control;
-};
-HeldCommand heldCommand;
-
-// ---- Controls
-
-HWND Control(int id) {
-  return GetDlgItem(wizardState.window, id);
-}
-
-bool Exists(int id) {
-  return IsWindow(Control(id)) != FALSE;
-}
-
-void Post(UINT message, WPARAM wParam = 0) {
-  PostMessageA(wizardState.window, message, wParam, 0);
-}
-
-void Show(int id) {
-  ShowWindow(Control(id), SW_SHOW);
-}
-
-void SetText(int id, uint32_t catalogId, const SetupContext& context) {
-  SetControlText(Control(id), catalogId, context.currentLanguage);
-}
-
-void SetTextIfExists(int id, uint32_t catalogId, const SetupContext& context) {
-  if (Exists(id)) SetText(id, catalogId, context);
-}
-
-void SetTitle(uint32_t catalogId, const SetupContext& context) {
-  SetControlText(wizardState.window, catalogId, context.currentLanguage);
-}
-
-void Renumber(int id, int newId) {
-  const HWND control = Control(id);
-  if (control != nullptr) SetWindowLongA(control, GWL_ID, newId);
-}
-
-void MakeDefault(int id) {
-  SendMessageA(Control(id), BM_SETSTYLE, BS_DEFPUSHBUTTON, TRUE);
-}
-
-void PutDirectory(const SetupContext& context) {
-  SendMessageA(Control(IDC_DIRECTORY), WM_SETTEXT, 0, reinterpret_cast<LPARAM>(context.installDir));
-}
-
-void SelectDirectoryText() {
-  SendMessageA(Control(IDC_DIRECTORY), EM_SETSEL, 0, -1);
-}
-
-void HideWorkControls() {
-  for (const int id : {IDC_DIRECTORY, IDC_BROWSE, IDC_REMOVE, IDC_UPDATE, IDC_NEXT,
-                       IDC_LANGUAGE_LABEL, IDC_LANGUAGE, IDC_SPACE}) {
-    if (Exists(id)) ShowWindow(Control(id), SW_HIDE);
-  }
-}
-
-void RenewTexts(SetupContext* context) {
-  (void)ValidateLanguage(&context->currentLanguage);
-  if (context->currentLanguage == kLanguageNone) context->currentLanguage = kLanguageFrench;
-  SetTitle(CatalogInstallTitle, *context);
-  SetText(IDC_BANNER, CatalogBanner, *context);
-  SetText(IDC_MESSAGE, context->messageId, *context);
-  SetText(IDC_LANGUAGE_LABEL, CatalogLanguageLabel, *context);
-  SetTextIfExists(IDC_NEXT, CatalogInstall, *context);
-  SetTextIfExists(IDC_REMOVE, CatalogRemove, *context);
-  SetTextIfExists(IDC_UPDATE, CatalogUpdate, *context);
-  SetTextIfExists(IDCANCEL, CatalogCancel, *context);
-  SetTextIfExists(IDOK, CatalogEnd, *context);
-  if (Exists(IDC_SPACE)) (void)ShowSpaceLine(wizardState.window, context);
-}
+// ---- Language
 
 // Shows the language in the list and makes it the one in force, by way of a message.
 void SelectLanguage(int32_t language) {
@@ -212,7 +137,6 @@ void InitDialog(HWND dialog, SetupContext* context) {
   wizardState.context = context;
   wizardState.cancelRequested = 0;
   wizardState.busy = BusyIdle;
-  heldCommand = {};
   BuildLanguageList(dialog, &languageArt);
   CreateFonts();
   AssignFonts(dialog);
@@ -342,24 +266,11 @@ void ShowPage(SetupContext* context) {
   SetFocus(Control(defaultControl));
 }
 
-// The control of a held command still offers what the user clicked on.
-bool IsStillOffered(const HeldCommand& held) {
-  if (held.control == nullptr) return true;  // Escape, the close box
-  if (IsWindow(held.control) == FALSE) return false;
-  const LONG style = GetWindowLongA(held.control, GWL_STYLE);
-  return GetWindowLongA(held.control, GWL_ID) == LOWORD(held.command) &&
-         (style & WS_VISIBLE) != 0 && (style & WS_DISABLED) == 0;
-}
-
+// Its check for older files dispatches messages; what the user clicks meanwhile waits for its end.
 void SetUpPage(SetupContext* context) {
-  heldCommand = {};
-  heldCommand.isHolding = true;
+  HoldCommands();
   ShowPage(context);
-  heldCommand.isHolding = false;
-  if (heldCommand.isHeld && IsStillOffered(heldCommand)) {
-    PostMessageA(wizardState.window, WM_COMMAND, heldCommand.command,
-                 reinterpret_cast<LPARAM>(heldCommand.control));
-  }
+  ReleaseCommands();
 }
 
 // ---- Install and update: COPY, REGISTER, REMOVAL_PROGRAM, INSTALL_DONE
@@ -556,13 +467,7 @@ void CarryOut(int id, SetupContext* context) {
 void OnCommand(WPARAM command, HWND control) {
   const int id = LOWORD(command);
   if (wizardState.window == nullptr || !IsCommand(id, HIWORD(command))) return;
-  if (!heldCommand.isHolding) {
-    CarryOut(id, wizardState.context);
-  } else if (!heldCommand.isHeld) {
-    heldCommand.isHeld = true;
-    heldCommand.command = command;
-    heldCommand.control = control;
-  }
+  if (!HoldCommand(command, control)) CarryOut(id, wizardState.context);
 }
 
 // ---- Messages
