@@ -4,7 +4,7 @@
 #include <cstring>
 #include <string>
 
-#include "tests/support/image_builder.h"
+#include "tests/support/test_image.h"
 #include "tests/support/product_test.h"
 
 namespace {

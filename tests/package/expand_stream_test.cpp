@@ -5,7 +5,7 @@
 
 #include "tests/support/allocation_faults.h"
 #include "tests/support/code_stream.h"
-#include "tests/support/image_builder.h"
+#include "tests/support/test_image.h"
 #include "tests/support/product_test.h"
 
 namespace {
