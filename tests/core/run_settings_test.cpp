@@ -4,8 +4,8 @@
 #include <cstring>
 #include <string>
 
-#include "tests/support/test_image.h"
 #include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
 
 namespace {
 

@@ -5,8 +5,8 @@
 
 #include "tests/support/allocation_faults.h"
 #include "tests/support/code_stream.h"
-#include "tests/support/test_image.h"
 #include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
 
 namespace {
 

@@ -13,9 +13,9 @@
 #include "package/data_file.h"
 #include "tests/support/allocation_faults.h"
 #include "tests/support/code_stream.h"
-#include "tests/support/test_image.h"
 #include "tests/support/plain_expander.h"
 #include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
 
 namespace {
 
