@@ -1,11 +1,13 @@
 // The native program's entry: starts the machine that MORIV_MACHINE names, runs the program on it,
-// and tells the exit code that a Linux exit status has no room for.
+// with the user whose script MORIV_USER names, and tells the exit code that a Linux exit status has
+// no room for.
 #include <cstdio>
 #include <cstdlib>
 #include <string>
 
 #include "machine/code_page.h"
 #include "machine/machine.h"
+#include "machine/scripted_user.h"
 #include "platform/win32.h"
 
 namespace {
@@ -41,8 +43,14 @@ int main(int argc, char** argv) {
     return kUnusableMachineStatus;
   }
 
+  const char* const script = std::getenv("MORIV_USER");
+  if (script != nullptr && *script != '\0' && !machine::LoadUser(script, &error)) {
+    std::fprintf(stderr, "%s\n", error.c_str());
+    return kUnusableMachineStatus;
+  }
   std::string commandLine = machine::FromUtf8(JoinArguments(argc, argv));
   const int code = WinMain(nullptr, nullptr, commandLine.data(), kShowNormally);
+  machine::EndUser();
   const std::string open = machine::Stop();
 
   std::printf("exit code: %d\n", code);

@@ -6,7 +6,18 @@
 
 namespace machine {
 
-enum class ObjectKind { kFile, kDescriptor, kKey, kModule, kMemoryBlock };
+enum class ObjectKind {
+  kFile,
+  kDescriptor,
+  kKey,
+  kModule,
+  kMemoryBlock,
+  kBrush,
+  kFont,
+  kBitmap,
+  kDeviceContext,
+  kItemList,
+};
 
 void ObjectOpened(ObjectKind kind);
 void ObjectClosed(ObjectKind kind);

@@ -143,6 +143,31 @@ LSTATUS RegQueryValueExA(HKEY key, LPCSTR name, LPDWORD reserved, LPDWORD type, 
   return ERROR_SUCCESS;
 }
 
+// The default value of a key or of one below it, a REG_SZ, which gets a NUL if it has none. A key
+// without that value answers an empty text.
+LSTATUS RegQueryValueA(HKEY key, LPCSTR subkey, LPSTR data, LONG* size) {
+  constexpr LSTATUS kInvalidData = 13;
+  DWORD fault = 0;
+  if (machine::CallFails("RegQueryValueA", &fault)) return static_cast<LSTATUS>(fault);
+  if (size == nullptr || *size < 0) return ERROR_INVALID_PARAMETER;
+  std::shared_ptr<RegistryKey> found;
+  if (const LSTATUS status = Resolve(key, kQueryValue, &found)) return status;
+  const std::string path = TextOrEmpty(subkey);
+  if (!path.empty()) found = machine::FindKey(found, path);
+  if (found == nullptr) return ERROR_FILE_NOT_FOUND;
+
+  const RegistryValue* const value = machine::FindValue(*found, "");
+  if (value != nullptr && value->type != REG_SZ) return kInvalidData;
+  std::string text = value != nullptr ? std::string(value->data.begin(), value->data.end()) : "";
+  if (text.empty() || text.back() != '\0') text += '\0';
+  const size_t room = static_cast<size_t>(*size);
+  *size = static_cast<LONG>(text.size());
+  if (data == nullptr) return ERROR_SUCCESS;
+  if (room < text.size()) return ERROR_MORE_DATA;
+  std::memcpy(data, text.data(), text.size());
+  return ERROR_SUCCESS;
+}
+
 LSTATUS RegSetValueExA(HKEY key, LPCSTR name, DWORD reserved, DWORD type, const BYTE* data,
                        DWORD size) {
   DWORD fault = 0;

@@ -9,6 +9,7 @@
 #include "registration/registered_product.h"
 #include "registration/removal_program.h"
 #include "registration/uninstall_entries.h"
+#include "ui/wizard.h"
 
 namespace {
 
@@ -105,7 +106,7 @@ StatusCode RunSetup(SetupRequest request) {
     ShowHelp(&context);
     return 0;
   }
-  // This version has no dialog: a run that needs one ends as a dialog without a context does.
-  if ((context.options & OptionSilent) == 0) return StatusDialogAborted;
+  // The dialog opens, closes and logs in steps of its own.
+  if ((context.options & OptionSilent) == 0) return RunWizard(&context);
   return FinishSilentRun(&context, RunSilently(&context));
 }

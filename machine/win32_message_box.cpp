@@ -1,11 +1,11 @@
-// Message boxes, and windows. No dialog exists on this machine: nobody could use one, so that there
-// is no window to find or to send to, and never a message waiting.
+// Message boxes: answered by the scripted user, or printed when there is none.
 #include <cstdio>
 #include <string>
 #include <string_view>
 
 #include "machine/code_page.h"
 #include "machine/faults.h"
+#include "machine/scripted_user.h"
 #include "platform/win32.h"
 
 namespace {
@@ -49,38 +49,22 @@ std::string TerminalText(std::string_view text) {
 
 extern "C" {
 
-// Nobody is there to press a button: the box is printed and its default button taken.
+// Without a user nobody is there to press a button: the box is printed and its default button
+// taken.
 int MessageBoxA(HWND, LPCSTR text, LPCSTR caption, UINT type) {
   if (machine::CallFails("MessageBoxA")) return 0;
-  std::printf("[%s]\n%s\n", TerminalText(caption != nullptr ? caption : "Error").c_str(),
-              TerminalText(text != nullptr ? text : "").c_str());
+  const std::string shownCaption = caption != nullptr ? caption : "Error";
+  const std::string shownText = text != nullptr ? text : "";
+  if (machine::HasUser()) return machine::AnswerBox(shownCaption, shownText, type);
+  std::printf("[%s]\n%s\n", TerminalText(shownCaption).c_str(), TerminalText(shownText).c_str());
   std::fflush(stdout);
   return DefaultButton(type);
 }
 
-HWND GetDlgItem(HWND, int) {
-  machine::CallFails("GetDlgItem");
-  return nullptr;
-}
-
-LRESULT SendMessageA(HWND, UINT, WPARAM, LPARAM) {
-  machine::CallFails("SendMessageA");
-  return 0;
-}
-
-BOOL PeekMessageA(LPMSG, HWND, UINT, UINT, UINT) {
-  machine::CallFails("PeekMessageA");
-  return FALSE;
-}
-
-BOOL TranslateMessage(const MSG*) {
-  machine::CallFails("TranslateMessage");
-  return FALSE;
-}
-
-LRESULT DispatchMessageA(const MSG*) {
-  machine::CallFails("DispatchMessageA");
-  return 0;
+BOOL MessageBeep(UINT type) {
+  if (machine::CallFails("MessageBeep")) return FALSE;
+  if (machine::HasUser()) machine::TellUser("beep " + std::to_string(type));
+  return TRUE;
 }
 
 }  // extern "C"

@@ -1,0 +1,284 @@
+#include "machine/drawing.h"
+
+#include <cstdio>
+#include <cstring>
+#include <map>
+#include <optional>
+#include <utility>
+
+#include "machine/code_page.h"
+#include "machine/executable_resources.h"
+#include "machine/faults.h"
+#include "machine/open_objects.h"
+
+using machine::CallFails;
+using machine::ObjectKind;
+
+namespace {
+
+struct GraphicsObject {
+  ObjectKind kind = ObjectKind::kBrush;
+  std::string description;  // for the record of what was drawn with it
+  LONG width = 0;           // of a bitmap, in pixels
+  LONG height = 0;
+  int timesSelected = 0;
+};
+
+struct DeviceContext {
+  std::vector<std::string>* record = nullptr;  // null: nobody looks at what is drawn
+  std::map<ObjectKind, HGDIOBJ> selected;
+  COLORREF textColor = 0;
+  COLORREF backgroundColor = 0xFFFFFF;
+};
+
+std::map<HGDIOBJ, GraphicsObject> objects;
+std::map<HDC, DeviceContext> contexts;
+uintptr_t lastObject = 0x20000;
+
+HGDIOBJ NewObject(GraphicsObject object) {
+  const HGDIOBJ handle = reinterpret_cast<HGDIOBJ>(lastObject += 4);
+  machine::ObjectOpened(object.kind);
+  objects[handle] = std::move(object);
+  return handle;
+}
+
+// What a device context has selected from the start. Nobody owns or deletes these.
+HGDIOBJ StockObject(ObjectKind kind) {
+  return reinterpret_cast<HGDIOBJ>(static_cast<uintptr_t>(kind) + 1);
+}
+
+std::optional<ObjectKind> KindOfStock(HGDIOBJ handle) {
+  for (const ObjectKind kind : {ObjectKind::kBrush, ObjectKind::kFont, ObjectKind::kBitmap}) {
+    if (handle == StockObject(kind)) return kind;
+  }
+  return std::nullopt;
+}
+
+HDC NewContext() {
+  const HDC dc = reinterpret_cast<HDC>(lastObject += 4);
+  contexts[dc] = {};
+  return dc;
+}
+
+DeviceContext* FindContext(HDC dc) {
+  const auto found = contexts.find(dc);
+  return found != contexts.end() ? &found->second : nullptr;
+}
+
+GraphicsObject* FindObject(HGDIOBJ handle) {
+  const auto found = objects.find(handle);
+  return found != objects.end() ? &found->second : nullptr;
+}
+
+void Unselect(DeviceContext* context) {
+  for (const auto& [kind, handle] : context->selected) {
+    if (GraphicsObject* const object = FindObject(handle)) --object->timesSelected;
+  }
+}
+
+bool CloseContext(HDC dc) {
+  DeviceContext* const context = FindContext(dc);
+  if (context == nullptr) return false;
+  Unselect(context);
+  contexts.erase(dc);
+  return true;
+}
+
+std::string Hexadecimal(uint32_t number) {
+  char text[16];
+  std::snprintf(text, sizeof(text), "%06X", number);
+  return text;
+}
+
+// What is selected for a kind, in words.
+std::string Selected(const DeviceContext& context, ObjectKind kind) {
+  const auto found = context.selected.find(kind);
+  const GraphicsObject* const object =
+      found != context.selected.end() ? FindObject(found->second) : nullptr;
+  return object != nullptr ? object->description : "none";
+}
+
+std::string Place(LONG x, LONG y, LONG width, LONG height) {
+  return std::to_string(x) + "," + std::to_string(y) + " " + std::to_string(width) + "x" +
+         std::to_string(height);
+}
+
+void Record(DeviceContext* context, const std::string& line) {
+  if (context->record != nullptr) context->record->push_back(line);
+}
+
+}  // namespace
+
+namespace machine {
+
+HDC BeginDrawing(Window* control) {
+  control->drawing.clear();
+  const HDC dc = NewContext();
+  contexts[dc].record = &control->drawing;
+  return dc;
+}
+
+void EndDrawing(HDC dc) {
+  CloseContext(dc);
+}
+
+}  // namespace machine
+
+extern "C" {
+
+// The bytes are a BITMAPINFOHEADER: its size, then width and height.
+HBITMAP LoadBitmapA(HINSTANCE, LPCSTR id) {
+  if (CallFails("LoadBitmapA")) return nullptr;
+  constexpr int kBitmapType = 2;
+  const int number = static_cast<int>(reinterpret_cast<uintptr_t>(id));
+  const auto bytes = machine::OwnResource(kBitmapType, number);
+  if (!bytes || bytes->size() < 40) return nullptr;
+  GraphicsObject bitmap = {.kind = ObjectKind::kBitmap,
+                           .description = "bitmap " + std::to_string(number)};
+  std::memcpy(&bitmap.width, bytes->data() + 4, sizeof(bitmap.width));
+  std::memcpy(&bitmap.height, bytes->data() + 8, sizeof(bitmap.height));
+  return NewObject(bitmap);
+}
+
+int GetObjectA(HGDIOBJ handle, int size, LPVOID record) {
+  if (CallFails("GetObjectA")) return 0;
+  const GraphicsObject* const object = FindObject(handle);
+  if (object == nullptr || object->kind != ObjectKind::kBitmap || record == nullptr) return 0;
+  if (size < static_cast<int>(sizeof(BITMAP))) return 0;
+  BITMAP bitmap = {};
+  bitmap.bmWidth = object->width;
+  bitmap.bmHeight = object->height;
+  bitmap.bmPlanes = 1;
+  bitmap.bmBitsPixel = 32;  // of the screen
+  bitmap.bmWidthBytes = object->width * 4;
+  std::memcpy(record, &bitmap, sizeof(bitmap));
+  return sizeof(bitmap);
+}
+
+HFONT CreateFontA(int height, int, int, int, int weight, DWORD italic, DWORD underline, DWORD,
+                  DWORD, DWORD, DWORD, DWORD, DWORD, LPCSTR face) {
+  if (CallFails("CreateFontA")) return nullptr;
+  return NewObject({.kind = ObjectKind::kFont,
+                    .description = std::string("font \"") + face + "\" " + std::to_string(height) +
+                                   " " + std::to_string(weight) + (italic != 0 ? " italic" : "") +
+                                   (underline != 0 ? " underline" : "")});
+}
+
+HBRUSH CreateSolidBrush(COLORREF color) {
+  if (CallFails("CreateSolidBrush")) return nullptr;
+  return NewObject({.kind = ObjectKind::kBrush, .description = "brush " + Hexadecimal(color)});
+}
+
+// An object that is selected somewhere can't be deleted.
+BOOL DeleteObject(HGDIOBJ handle) {
+  if (CallFails("DeleteObject")) return FALSE;
+  const GraphicsObject* const object = FindObject(handle);
+  if (object == nullptr || object->timesSelected > 0) return FALSE;
+  machine::ObjectClosed(object->kind);
+  objects.erase(handle);
+  return TRUE;
+}
+
+HDC GetDC(HWND) {
+  if (CallFails("GetDC")) return nullptr;
+  machine::ObjectOpened(ObjectKind::kDeviceContext);
+  return NewContext();
+}
+
+int ReleaseDC(HWND, HDC dc) {
+  if (CallFails("ReleaseDC") || !CloseContext(dc)) return 0;
+  machine::ObjectClosed(ObjectKind::kDeviceContext);
+  return 1;
+}
+
+HDC CreateCompatibleDC(HDC) {
+  if (CallFails("CreateCompatibleDC")) return nullptr;
+  machine::ObjectOpened(ObjectKind::kDeviceContext);
+  return NewContext();
+}
+
+BOOL DeleteDC(HDC dc) {
+  if (CallFails("DeleteDC") || !CloseContext(dc)) return FALSE;
+  machine::ObjectClosed(ObjectKind::kDeviceContext);
+  return TRUE;
+}
+
+HGDIOBJ SelectObject(HDC dc, HGDIOBJ handle) {
+  if (CallFails("SelectObject")) return nullptr;
+  DeviceContext* const context = FindContext(dc);
+  if (context == nullptr) return nullptr;
+  GraphicsObject* const object = FindObject(handle);
+  const std::optional<ObjectKind> kind = object != nullptr ? object->kind : KindOfStock(handle);
+  if (!kind) return nullptr;
+  const auto found = context->selected.find(*kind);
+  const HGDIOBJ previous = found != context->selected.end() ? found->second : StockObject(*kind);
+  if (GraphicsObject* const old = FindObject(previous)) --old->timesSelected;
+  if (object != nullptr) ++object->timesSelected;
+  context->selected[*kind] = handle;
+  return previous;
+}
+
+DWORD GetSysColor(int index) {
+  if (CallFails("GetSysColor")) return 0;
+  switch (index) {
+    case COLOR_WINDOW:
+    case COLOR_HIGHLIGHTTEXT:
+      return 0xFFFFFF;
+    case COLOR_HIGHLIGHT:
+      return 0x6A240A;
+    default:
+      return 0;
+  }
+}
+
+COLORREF SetTextColor(HDC dc, COLORREF color) {
+  DeviceContext* const context = FindContext(dc);
+  if (CallFails("SetTextColor") || context == nullptr) return 0xFFFFFFFF;
+  return std::exchange(context->textColor, color);
+}
+
+COLORREF SetBkColor(HDC dc, COLORREF color) {
+  DeviceContext* const context = FindContext(dc);
+  if (CallFails("SetBkColor") || context == nullptr) return 0xFFFFFFFF;
+  return std::exchange(context->backgroundColor, color);
+}
+
+BOOL PatBlt(HDC dc, int x, int y, int width, int height, DWORD) {
+  DeviceContext* const context = FindContext(dc);
+  if (CallFails("PatBlt") || context == nullptr) return FALSE;
+  Record(context,
+         "fill " + Place(x, y, width, height) + " " + Selected(*context, ObjectKind::kBrush));
+  return TRUE;
+}
+
+BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, int, int, DWORD) {
+  DeviceContext* const context = FindContext(dc);
+  const DeviceContext* const from = FindContext(source);
+  if (CallFails("BitBlt") || context == nullptr || from == nullptr) return FALSE;
+  Record(context,
+         "copy " + Place(x, y, width, height) + " " + Selected(*from, ObjectKind::kBitmap));
+  return TRUE;
+}
+
+int DrawTextA(HDC dc, LPCSTR text, int length, LPRECT rectangle, UINT format) {
+  DeviceContext* const context = FindContext(dc);
+  if (CallFails("DrawTextA") || context == nullptr || text == nullptr) return 0;
+  const std::string bytes =
+      length < 0 ? std::string(text) : std::string(text, static_cast<size_t>(length));
+  Record(context, "text \"" + machine::ToUtf8(bytes) + "\" " +
+                      Place(rectangle->left, rectangle->top, rectangle->right - rectangle->left,
+                            rectangle->bottom - rectangle->top) +
+                      " format " + std::to_string(format) + " color " +
+                      Hexadecimal(context->textColor) + " on " +
+                      Hexadecimal(context->backgroundColor));
+  return rectangle->bottom - rectangle->top;
+}
+
+BOOL DrawFocusRect(HDC dc, const RECT*) {
+  DeviceContext* const context = FindContext(dc);
+  if (CallFails("DrawFocusRect") || context == nullptr) return FALSE;
+  Record(context, "focus");
+  return TRUE;
+}
+
+}  // extern "C"

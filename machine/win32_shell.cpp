@@ -1,0 +1,87 @@
+// The shell and other programs: what the program asks for is told to the user, and nothing starts.
+#include <cstring>
+#include <set>
+#include <string>
+
+#include "machine/drives.h"
+#include "machine/faults.h"
+#include "machine/open_objects.h"
+#include "machine/scripted_user.h"
+#include "platform/win32.h"
+
+using machine::CallFails;
+using machine::ObjectKind;
+
+// What the folder picker answers with: opaque to the program, which gives it back to the allocator.
+struct ITEMIDLIST {
+  std::string path;
+};
+
+namespace {
+
+std::set<ITEMIDLIST*> itemLists;
+
+class Allocator : public IMalloc {
+ public:
+  ULONG Release() override { return 1; }  // the shell's own lives on
+
+  void Free(void* block) override {
+    auto* const list = static_cast<ITEMIDLIST*>(block);
+    if (itemLists.erase(list) == 0) return;
+    machine::ObjectClosed(ObjectKind::kItemList);
+    delete list;
+  }
+
+  virtual ~Allocator() = default;
+};
+
+}  // namespace
+
+extern "C" {
+
+// The answer is a number above 32 for success.
+HINSTANCE ShellExecuteA(HWND, LPCSTR, LPCSTR file, LPCSTR, LPCSTR, int) {
+  constexpr uintptr_t kFileNotFound = 2;
+  constexpr uintptr_t kStarted = 33;
+  if (CallFails("ShellExecuteA") || file == nullptr) {
+    return reinterpret_cast<HINSTANCE>(kFileNotFound);
+  }
+  machine::TellUser("open " + machine::Quoted(file));
+  return reinterpret_cast<HINSTANCE>(machine::LocateFile(file) ? kStarted : kFileNotFound);
+}
+
+BOOL CreateProcessA(LPCSTR, LPSTR commandLine, LPSECURITY_ATTRIBUTES, LPSECURITY_ATTRIBUTES, BOOL,
+                    DWORD, LPVOID, LPCSTR, STARTUPINFOA*, PROCESS_INFORMATION* information) {
+  if (CallFails("CreateProcessA") || commandLine == nullptr || information == nullptr) return FALSE;
+  machine::TellUser("start " + machine::Quoted(commandLine));
+  return FALSE;  // no other program exists on this machine, so that there is no handle to close
+}
+
+LPITEMIDLIST SHBrowseForFolderA(BROWSEINFOA* info) {
+  if (CallFails("SHBrowseForFolderA") || info == nullptr) return nullptr;
+  std::string path;
+  if (!machine::PickFolder(info->lpszTitle != nullptr ? info->lpszTitle : "", &path)) {
+    return nullptr;
+  }
+  auto* const list = new ITEMIDLIST{path};
+  itemLists.insert(list);
+  machine::ObjectOpened(ObjectKind::kItemList);
+  return list;
+}
+
+BOOL SHGetPathFromIDListA(LPCITEMIDLIST list, LPSTR path) {
+  if (CallFails("SHGetPathFromIDListA") || list == nullptr || path == nullptr) return FALSE;
+  if (list->path.size() >= MAX_PATH) return FALSE;
+  std::memcpy(path, list->path.c_str(), list->path.size() + 1);
+  return TRUE;
+}
+
+HRESULT SHGetMalloc(IMalloc** allocator) {
+  constexpr HRESULT kFailed = static_cast<HRESULT>(0x80004005);
+  if (CallFails("SHGetMalloc") || allocator == nullptr) return kFailed;
+  static Allocator shell;
+  *allocator = &shell;
+  return S_OK;
+}
+
+}  // extern "C"
