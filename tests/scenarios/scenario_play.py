@@ -72,6 +72,9 @@ class _Player:
             if line.startswith('now = '):
                 self.now = datetime.fromisoformat(line[len('now = '):])
 
+    def _given_user(self, section):
+        self.machine.user(section.body)
+
     def _given_files(self, section):
         for line in section.body:
             if line.startswith('- '):

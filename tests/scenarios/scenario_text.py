@@ -7,7 +7,7 @@ from dataclasses import dataclass, field
 # machine; actions start something; checks say what the action before them has to have done.
 WORLDS = ('only stand-in', 'only Wine')
 PREPARATIONS = ('given machine', 'given files', 'given registry', 'given image', 'given run',
-                'damage')
+                'given user', 'damage')
 ACTIONS = ('run', 'restart')
 CHECKS = ('exit', 'shown', 'log', 'text', 'files', 'registry')
 VERBATIM = ('shown', 'log', 'text')
@@ -75,8 +75,8 @@ def _scenario(name, title, sections, file_name):
     for section in sections:
         if section.keyword in WORLDS:
             raise ScenarioError(f'{section.place}: the world stands in the first section')
-        if section.keyword == 'given machine' and only != 'stand-in':
-            raise ScenarioError(f'{section.place}: only the stand-in has settings')
+        if section.keyword in ('given machine', 'given user') and only != 'stand-in':
+            raise ScenarioError(f'{section.place}: only the stand-in has settings and a user')
     if not any(section.keyword in ACTIONS for section in sections):
         raise ScenarioError(f'{file_name}: nothing is run')
     for before, section in zip([None, *sections], sections):

@@ -4,10 +4,12 @@ A world gives machines, one after the other or (the stand-in) several at once. A
 tree and a registry, starts programs and can be restarted.
 """
 
+import errno
 import fcntl
 import os
 import shutil
 import subprocess
+import time
 from collections import namedtuple
 
 from file_tree import FileTree
@@ -58,6 +60,12 @@ class StandInMachine:
         self.folder = folder
         self.machine_tool = machine_tool
         self.files = FileTree(folder)
+        self.script = None  # of the next run's user
+
+    def user(self, lines):
+        """The script of the user of the next run."""
+        self.script = self.folder.with_suffix('.user')
+        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
 
     def settings(self, lines):
         (self.folder / 'machine.ini').write_text('\n'.join(lines) + '\n', encoding='utf-8')
@@ -73,8 +81,7 @@ class StandInMachine:
     def run(self, program, arguments):
         host = self.files.host(program)
         try:
-            done = subprocess.run([host, arguments] if arguments else [host], cwd=self.folder,
-                                  env=self._environment(), capture_output=True, timeout=TIME_LIMIT)
+            done = self._start([host, arguments] if arguments else [host])
         except subprocess.TimeoutExpired:
             return Outcome(None, [], f'ended after {TIME_LIMIT} seconds')
         except OSError as error:
@@ -89,14 +96,30 @@ class StandInMachine:
         """A drive exists when its folder does."""
         (self.folder / f'drive_{letter}').mkdir(exist_ok=True)
 
+    def _start(self, command):
+        """Another thread's child, before it has become a program of its own, can still hold the new
+        file open for writing; then the system refuses to start it, and soon no more."""
+        environment = self._environment()
+        for attempt in range(100):
+            try:
+                return subprocess.run(command, cwd=self.folder, env=environment,
+                                      capture_output=True, timeout=TIME_LIMIT)
+            except OSError as error:
+                if error.errno != errno.ETXTBSY or attempt == 99:
+                    raise
+                time.sleep(0.02)
+
     def _environment(self):
-        return os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'}
+        user = {'MORIV_USER': str(self.script)} if self.script else {}
+        self.script = None
+        return os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'} | user
 
     def restart(self):
         _call([self.machine_tool, 'restart', self.folder])
 
     def discard(self):
         shutil.rmtree(self.folder)
+        self.folder.with_suffix('.user').unlink(missing_ok=True)
 
 
 def _trouble(done, code):
