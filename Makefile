@@ -3,7 +3,7 @@
 PRESETS := native win32 win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo test check clean bootstrap $(PRESETS)
+.PHONY: all demo demo-dialog test check clean bootstrap $(PRESETS)
 
 all: $(PRESETS)
 
@@ -16,6 +16,9 @@ $(PRESETS): bootstrap
 
 demo: native win32
 	@tools/demo
+
+demo-dialog: native win32
+	@tools/demo-dialog
 
 # Unit tests and scenarios, natively and under Wine; ends with CTest's own closing line.
 test: all
