@@ -267,8 +267,8 @@ void TakeUserTurn() {
   if (user->lines.empty()) Fail("the script ends while the dialog is open");
   const Line line = user->lines.front();
   user->lines.pop_front();
-  // A click that follows is met by the first poll of what the action starts: inside its very handler,
-  // or in the step that the handler has posted, behind which the click then waits.
+  // A click that follows is met by the first poll of what the action starts: inside its very
+  // handler, or in the step that the handler has posted, behind which the click then waits.
   TakeDuringClicks();
   Act(line);
   while (OpenDialog() != nullptr && !user->duringClicks.empty()) {

@@ -75,8 +75,8 @@ def _scenario(name, title, sections, file_name):
     for section in sections:
         if section.keyword in WORLDS:
             raise ScenarioError(f'{section.place}: the world stands in the first section')
-        if section.keyword in ('given machine', 'given user') and only != 'stand-in':
-            raise ScenarioError(f'{section.place}: only the stand-in has settings and a user')
+        if section.keyword == 'given machine' and only != 'stand-in':
+            raise ScenarioError(f'{section.place}: only the stand-in has settings')
     if not any(section.keyword in ACTIONS for section in sections):
         raise ScenarioError(f'{file_name}: nothing is run')
     for before, section in zip([None, *sections], sections):

@@ -11,6 +11,7 @@ import shutil
 import subprocess
 import time
 from collections import namedtuple
+from pathlib import Path
 
 from file_tree import FileTree
 from registry_text import Registry, Value
@@ -56,6 +57,8 @@ class StandIn:
 
 
 class StandInMachine:
+    tells_requests = True  # what the program asks of the system is shown
+
     def __init__(self, folder, machine_tool):
         self.folder = folder
         self.machine_tool = machine_tool
@@ -148,6 +151,7 @@ class Wine:
         self.bits = bits
         self.stub = build / 'MorivSetup.exe'
         self.agent_program = build / 'tests' / 'scenario_agent.exe'
+        self.driver = build / 'tests' / 'dialog_driver.exe'
         self.tool = tool
         self.prefix = prefix
         self.agent = None
@@ -159,14 +163,16 @@ class Wine:
         return '' if answer.returncode == 0 else answer.stdout.strip() or answer.stderr.strip()
 
     def open(self):
-        require(self.stub, self.agent_program)
+        require(self.stub, self.agent_program, self.driver)
         self.prefix.parent.mkdir(parents=True, exist_ok=True)
         # Two runs in one prefix would see each other's files; the second one waits.
         self.lock = open(f'{self.prefix}.in-use', 'w')
         fcntl.flock(self.lock, fcntl.LOCK_EX)
         _call([self.tool, 'prefix', self.prefix, str(self.bits)])
         self.files = FileTree(self.prefix)
-        self.agent = Agent([self.tool, 'run', self.prefix, self.agent_program],
+        # A display of their own for all windows of the session.
+        display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
+        self.agent = Agent([*display, self.tool, 'run', self.prefix, self.agent_program],
                            f'{self.prefix}.agent-log')
         self.clean_files()
         for key in self.WATCHED:
@@ -197,8 +203,11 @@ class Wine:
 
 
 class WineMachine:
+    tells_requests = False
+
     def __init__(self, world):
         self.world = world
+        self.script = None  # of the next run's user
         self.files = world.files
         self.agent = world.agent
         self.fresh_registry = self.registry()
@@ -235,7 +244,26 @@ class WineMachine:
         if not link.is_symlink():
             link.symlink_to(f'../drive_{letter}')
 
+    def user(self, lines):
+        """The script of the user of the next run, played by tests/windows/dialog_driver.cpp."""
+        self.script = Path(f'{self.world.prefix}.user')
+        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
+
+    def _run_with_user(self, program, arguments):
+        shown = Path(f'{self.world.prefix}.shown')
+        shown.write_bytes(b'')
+        words = [_windows_path(self.script), _windows_path(shown), f'"{program}"', arguments]
+        self.script = None
+        answer = self.agent.ask(f'run {TIME_LIMIT} {_windows_path(self.world.driver)}\t'
+                                + ' '.join(words))
+        lines = shown.read_bytes().decode('utf-8', 'replace').splitlines()
+        if lines and lines[-1].startswith('exit code: '):
+            return Outcome(int(lines.pop()[len('exit code: '):]), lines, '')
+        return Outcome(None, lines, f'the driver gave no exit code: {" ".join(answer)}')
+
     def run(self, program, arguments):
+        if self.script:
+            return self._run_with_user(program, arguments)
         answer = self.agent.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
         if len(answer) == 1 and answer[0].startswith('exit code: '):
             return Outcome(int(answer[0][len('exit code: '):]), [], '')
@@ -248,6 +276,11 @@ class WineMachine:
     def discard(self):
         self.world.clean_files()
         self.set_registry(self.fresh_registry)
+
+
+def _windows_path(path):
+    """Drive Z: of a prefix is the whole host."""
+    return 'Z:' + str(Path(path).resolve()).replace('/', '\\')
 
 
 def _add_dumped_value(key, text):

@@ -56,8 +56,9 @@ class ProductTest : public testing::Test {
     (void)CopyText(context.installDir, "C:\\Moriv");
   }
 
-  // Whatever a test did, the program has left nothing open.
-  void TearDown() override {
+  // Whatever a test did, the program has left nothing open. Here and not in TearDown: the members
+  // of the tests are closed by now.
+  ~ProductTest() override {
     wizardState = {};
     FailNothing();
     EXPECT_EQ(CloseSetup(&context), 1);
