@@ -3,7 +3,7 @@
 PRESETS := native win32 win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check clean bootstrap $(PRESETS)
+.PHONY: all demo demo-dialog test check screenshots clean bootstrap $(PRESETS)
 
 all: $(PRESETS)
 
@@ -27,6 +27,10 @@ test: all
 # What keeps the house in order: tools/check says what it checks.
 check: all
 	@tools/check
+
+# Every page in five languages, from the real program under Wine, into docs/screenshots/.
+screenshots: all
+	@tools/screenshots
 
 clean:
 	rm -rf build

@@ -4,7 +4,10 @@
 //   dialog_driver SCRIPT OUTPUT PROGRAM ARGUMENTS...
 //
 // OUTPUT is a file, made anew, in UTF-8; its last line is "exit code: N", or one that begins with
-// "failed: " when the script doesn't fit the run. "at-poll" is the stand-in's alone.
+// "failed: " when the script doesn't fit the run. "at-poll" is the stand-in's alone. Three lines
+// more are for tools/screenshots: "picture NAME" prints itself and waits until the file OUTPUT.NAME
+// is there; "picture-during NAME" does so at once behind the line before it, "picture-box NAME"
+// when the next box stands.
 #include <windows.h>
 // After windows.h.
 #include <shlobj.h>
@@ -32,6 +35,8 @@ struct Line {
 std::deque<Line> script;
 std::deque<Line> answers;
 std::deque<Line> picks;
+std::deque<Line> boxPictures;
+std::string outputPath;
 std::FILE* output = nullptr;
 PROCESS_INFORMATION process;
 
@@ -44,6 +49,16 @@ void Print(const std::string& line) {
   Print("failed: " + what);
   TerminateProcess(process.hProcess, 1);
   std::exit(1);
+}
+
+// Lets somebody outside take a picture of the display.
+void WaitForPicture(const std::string& name) {
+  Print("picture " + name);
+  for (int look = 0; look < kMostLooks; ++look) {
+    if (GetFileAttributesA((outputPath + "." + name).c_str()) != INVALID_FILE_ATTRIBUTES) return;
+    Sleep(kStepTime);
+  }
+  Fail("nobody took the picture " + name);
 }
 
 // ---- Texts
@@ -237,6 +252,12 @@ void AnswerPicker(HWND picker) {
 
 void AnswerBox(const Windows& windows) {
   const HWND box = windows.modal;
+  if (!boxPictures.empty()) {
+    const std::string name = boxPictures.front().rest;
+    boxPictures.pop_front();
+    Sleep(10 * kStepTime);  // until it is drawn
+    WaitForPicture(name);
+  }
   std::wstring text;
   for (HWND child = GetWindow(box, GW_CHILD); child != nullptr;
        child = GetWindow(child, GW_HWNDNEXT)) {
@@ -323,6 +344,9 @@ void Act(HWND dialog, const Line& line) {
     PostMessageA(dialog, WM_SYSCOMMAND, SC_CLOSE, 0);
   } else if (line.verb == "show") {
     Show(dialog);
+  } else if (line.verb == "picture" || line.verb == "picture-during") {
+    Sleep(10 * kStepTime);  // until it is drawn
+    WaitForPicture(line.rest);
   } else if (line.verb == "key") {
     HKEY key = nullptr;
     RegCreateKeyW(HKEY_LOCAL_MACHINE, Wide(line.rest).c_str(), &key);
@@ -340,7 +364,11 @@ void ReadScript(const char* path) {
     const size_t blank = std::min(text.find(' '), text.size());
     const Line line = {text.substr(0, blank), text.substr(std::min(blank + 1, text.size()))};
     const bool isAnswer = line.verb == "answer" || line.verb == "answer-late";
-    (isAnswer ? answers : line.verb == "pick" ? picks : script).push_back(line);
+    if (line.verb == "picture-box") {
+      boxPictures.push_back(line);
+    } else {
+      (isAnswer ? answers : line.verb == "pick" ? picks : script).push_back(line);
+    }
   }
 }
 
@@ -350,7 +378,7 @@ void Play() {
     const Line line = script.front();
     script.pop_front();
     Act(dialog, line);
-    while (!script.empty() && script.front().verb == "click-during") {
+    while (!script.empty() && script.front().verb.ends_with("-during")) {
       Act(dialog, script.front());
       script.pop_front();
     }
@@ -367,6 +395,7 @@ void Play() {
 
 int main(int argc, char** argv) {
   if (argc < 4) return 2;
+  outputPath = argv[2];
   output = std::fopen(argv[2], "wb");
   if (output == nullptr) return 2;
   ReadScript(argv[1]);
