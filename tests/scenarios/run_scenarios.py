@@ -36,7 +36,7 @@ def main():
     world = make_world(options)
     reason = world.missing() or (real_input.missing() if options.real_input else '')
     if reason:
-        print(f'{world.name}: left out: {reason}')
+        tell(options, world, f'{world.name}: left out: {reason}')
         # Only what the host can't do and what was asked for is left out without a failure.
         asked_for = os.environ.get('MORIV_WINE') == 'none'
         return LEFT_OUT if asked_for or options.world == 'wine32' else 1
@@ -44,11 +44,21 @@ def main():
     try:
         require(tools.image_tool)
         scenarios = choose_scenarios(options, tools)
-        failures = run_all(world, scenarios, tools, images)
+        failures, counts = run_all(world, scenarios, tools, images)
+        tell(options, world, counts)
     except (ScenarioError, WorldError) as error:
         print(error, file=sys.stderr)
         return 2
     return 1 if failures else 0
+
+
+def tell(options, world, line):
+    """Prints the closing line, and keeps it in a file for tools/test, which tells all worlds' at its
+    end."""
+    print(line, flush=True)
+    kind = 'real-input' if options.real_input else 'scenarios'
+    options.work.mkdir(parents=True, exist_ok=True)
+    (options.work / f'{kind}.{world.name}.count').write_text(f'{kind}: {line}\n')
 
 
 def make_world(options):
@@ -96,7 +106,7 @@ def choose_scenarios(options, tools):
 
 
 def run_all(world, scenarios, tools, images):
-    """Prints one line a scenario and a closing one; gives the number of failures."""
+    """Prints one line a scenario; gives the number of failures and the closing line."""
     mine = [s for s in scenarios if not s.only or world.name.lower().startswith(s.only.lower())]
     shutil.rmtree(images, ignore_errors=True)
     failures = 0
@@ -112,8 +122,8 @@ def run_all(world, scenarios, tools, images):
         if scenario not in mine:
             print(f'skipped {scenario.name}: only {scenario.only}: {scenario.reason}')
     skipped = len(scenarios) - len(mine)
-    print(f'{world.name}: {len(mine) - failures} passed, {failures} failed, {skipped} skipped')
-    return failures
+    counts = f'{len(mine) - failures} passed, {failures} failed, {skipped} skipped'
+    return failures, f'{world.name}: {counts}'
 
 
 def run_one(world, scenario, tools, images):

@@ -115,7 +115,9 @@ TEST_F(Wizard, AHundredRunsLeaveNothing) {
     // The first rounds fill what the process keeps for its life.
     if (run == 3) used = mallinfo2().uordblks;
   }
-  EXPECT_EQ(mallinfo2().uordblks, used);
+  // The machine's own records may grow by a little. The smallest block has 32 bytes: one that each
+  // of the 30 rounds left would make 960.
+  EXPECT_LT(mallinfo2().uordblks, used + 30 * 32);
 }
 
 TEST_F(Wizard, MissingPicturesAndFontsStopNothing) {
