@@ -1,9 +1,11 @@
 #!/usr/bin/env python3
 """Checks that every transition of the dialog names a scenario that goes through it."""
 
+import re
 import sys
 from pathlib import Path
 
+TRANSITION = re.compile('[^;]+; [^;]+(; [^;]+)? -> [^;]+')
 HERE = Path(__file__).resolve().parent
 
 
@@ -13,12 +15,13 @@ def main():
     troubles = []
     for row in rows:
         transition, _, names = row.partition(': ')
+        if rows.count(row) > 1 or not TRANSITION.fullmatch(transition):
+            troubles.append(f'{transition}: stands twice, or not as FROM; EVENT; CONDITION -> TO')
         if not names.split():
             troubles.append(f'{transition}: no scenario')
         troubles += [f'{transition}: there is no scenario {name}' for name in names.split()
                      if not (HERE / f'{name}.scenario').exists()]
-    dialogs = {file.stem for file in HERE.glob('dialog_*.scenario')}
-    if not rows or not dialogs:
+    if not rows:
         troubles.append('nothing to check')
     print('\n'.join(troubles) or f'{len(rows)} transitions, each with its scenario')
     return 1 if troubles else 0

@@ -1,17 +1,22 @@
 // Plays a user's script on the real window of the setup program, and prints what that user sees:
 // the same lines that the stand-in machine prints for the same script (docs/stand-in-machine.md).
 //
-//   dialog_driver SCRIPT OUTPUT PROGRAM ARGUMENTS...
+//   dialog_driver SCRIPT OUTPUT PROGRAM ARGUMENTS
 //
-// OUTPUT is a file, made anew, in UTF-8; its last line is "exit code: N", or one that begins with
-// "failed: " when the script doesn't fit the run. "at-poll" is the stand-in's alone. Three lines
-// more are for tools/screenshots: "picture NAME" prints itself and waits until the file OUTPUT.NAME
-// is there; "picture-during NAME" does so at once behind the line before it, "picture-box NAME"
-// when the next box stands.
+// SCRIPT and OUTPUT have no blanks; all that stands behind them is the program's command line, as
+// it is. OUTPUT is a file, made anew, in UTF-8; its last line is "exit code: N", or one that begins
+// with "failed: " when the script doesn't fit the run.
+//
+// "at-poll" is the stand-in's alone. "until-during TEXT", behind a line that starts a step, waits
+// until the message area has this text: the pass has come so far, and a "click-during" then meets
+// its next poll. Three lines more are for tools/screenshots: "picture NAME" prints itself and waits
+// until the file OUTPUT.NAME is there; "picture-during NAME" does so at once behind the line before
+// it, "picture-box NAME" when the next box stands.
 #include <windows.h>
 // After windows.h.
 #include <shlobj.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <deque>
@@ -19,13 +24,13 @@
 #include <string>
 #include <vector>
 
+#include "tests/windows/dialog_view.h"
+
 namespace {
 
 constexpr DWORD kStepTime = 20;   // milliseconds between two looks
 constexpr int kStableLooks = 4;   // a page that has not changed for so many looks stands
 constexpr int kMostLooks = 1500;  // half a minute, for one line
-constexpr int kMessageArea = 901;
-constexpr int kSpaceLine = 921;
 
 struct Line {
   std::string verb;
@@ -47,7 +52,9 @@ void Print(const std::string& line) {
 
 [[noreturn]] void Fail(const std::string& what) {
   Print("failed: " + what);
+  // Its own file is free again only when it is gone.
   TerminateProcess(process.hProcess, 1);
+  WaitForSingleObject(process.hProcess, 10000);
   std::exit(1);
 }
 
@@ -61,142 +68,12 @@ void WaitForPicture(const std::string& name) {
   Fail("nobody took the picture " + name);
 }
 
-// ---- Texts
-
-std::string Utf8(const std::wstring& text) {
-  const int wide = static_cast<int>(text.size());
-  const int size = WideCharToMultiByte(CP_UTF8, 0, text.data(), wide, nullptr, 0, nullptr, nullptr);
-  std::string bytes(static_cast<size_t>(size), '\0');
-  WideCharToMultiByte(CP_UTF8, 0, text.data(), wide, bytes.data(), size, nullptr, nullptr);
-  return bytes;
-}
-
-std::wstring Wide(const std::string& text) {
-  const int bytes = static_cast<int>(text.size());
-  const int size = MultiByteToWideChar(CP_UTF8, 0, text.data(), bytes, nullptr, 0);
-  std::wstring wide(static_cast<size_t>(size), L'\0');
-  MultiByteToWideChar(CP_UTF8, 0, text.data(), bytes, wide.data(), size);
-  return wide;
-}
-
-std::string Quoted(const std::wstring& text) {
-  std::string quoted = "\"";
-  for (const char byte : Utf8(text)) {
-    if (byte == '\r') {
-      quoted += "\\r";
-    } else if (byte == '\n') {
-      quoted += "\\n";
-    } else {
-      if (byte == '"' || byte == '\\') quoted += '\\';
-      quoted += byte;
-    }
-  }
-  return quoted + '"';
-}
-
-// A busy window answers late; one that never does gives an empty text.
-LRESULT Ask(HWND window, UINT message, WPARAM wParam = 0, LPARAM lParam = 0) {
-  DWORD_PTR answer = 0;
-  SendMessageTimeoutW(window, message, wParam, lParam, SMTO_NORMAL, 5000, &answer);
-  return static_cast<LRESULT>(answer);
-}
-
-std::wstring TextOf(HWND window) {
-  wchar_t text[2048] = {};
-  Ask(window, WM_GETTEXT, std::size(text), reinterpret_cast<LPARAM>(text));
-  return text;
-}
-
-std::string ClassOf(HWND window) {
-  char name[64] = {};
-  GetClassNameA(window, name, sizeof name);
-  return name;
-}
-
-// ---- Windows
-
-struct Windows {
-  HWND dialog = nullptr;  // the program's own
-  HWND modal = nullptr;   // a message box or folder picker above it
-};
-
-BOOL CALLBACK NoteWindow(HWND window, LPARAM data) {
-  auto* const found = reinterpret_cast<Windows*>(data);
-  DWORD owner = 0;
-  GetWindowThreadProcessId(window, &owner);
-  if (owner != process.dwProcessId || ClassOf(window) != "#32770") return TRUE;
-  if (GetDlgItem(window, kMessageArea) != nullptr) {
-    found->dialog = window;
-  } else if (IsWindowVisible(window)) {
-    found->modal = window;
-  }
-  return TRUE;
-}
-
-Windows FindWindows() {
-  Windows found;
-  EnumWindows(NoteWindow, reinterpret_cast<LPARAM>(&found));
-  return found;
+void Show(HWND dialog) {
+  for (const std::string& line : DescribeDialog(dialog)) Print(line);
 }
 
 bool HasEnded() {
   return WaitForSingleObject(process.hProcess, 0) == WAIT_OBJECT_0;
-}
-
-int IdOf(HWND control) {
-  return GetDlgCtrlID(control) & 0xFFFF;
-}
-
-bool IsShown(HWND control) {
-  return (GetWindowLongA(control, GWL_STYLE) & WS_VISIBLE) != 0;
-}
-
-std::string Shown(HWND control) {
-  const LONG style = GetWindowLongA(control, GWL_STYLE);
-  const std::string className = ClassOf(control);
-  const std::string line = std::to_string(IdOf(control)) + " " + className +
-                           (IsShown(control) ? " shown" : " hidden") +
-                           ((style & WS_DISABLED) == 0 ? " enabled " : " disabled ");
-  if (className != "ComboBox") {
-    const bool isPicture = className == "Static" && (style & SS_TYPEMASK) == SS_BITMAP;
-    return line + Quoted(isPicture ? L"" : TextOf(control));
-  }
-  const LRESULT selected = Ask(control, CB_GETCURSEL);
-  if (static_cast<int>(selected) < 0) return line + "none";
-  return line + "selected " + std::to_string(static_cast<int>(selected)) + " of " +
-         std::to_string(static_cast<int>(Ask(control, CB_GETCOUNT)));
-}
-
-// The dialog as `show` prints it.
-std::vector<std::string> Snapshot(HWND dialog) {
-  std::vector<std::string> lines(1);
-  std::string defaultId = "none";
-  for (HWND control = GetWindow(dialog, GW_CHILD); control != nullptr;
-       control = GetWindow(control, GW_HWNDNEXT)) {
-    lines.push_back(Shown(control));
-    const bool isDefault = (GetWindowLongA(control, GWL_STYLE) & 0xF) == BS_DEFPUSHBUTTON;
-    if (defaultId == "none" && isDefault && ClassOf(control) == "Button" && IsShown(control)) {
-      defaultId = std::to_string(IdOf(control));
-    }
-  }
-  GUITHREADINFO thread = {};
-  thread.cbSize = sizeof thread;
-  GetGUIThreadInfo(process.dwThreadId, &thread);
-  const bool hasFocus = thread.hwndFocus != nullptr && GetParent(thread.hwndFocus) == dialog;
-  lines[0] = "dialog " + Quoted(TextOf(dialog)) + " focus " +
-             (hasFocus ? std::to_string(IdOf(thread.hwndFocus)) : "none") + " default " + defaultId;
-  return lines;
-}
-
-void Show(HWND dialog) {
-  for (const std::string& line : Snapshot(dialog)) Print(line);
-}
-
-// A page that waits for its user: an end page, or one whose last control is shown. Between them
-// only the rightmost button is there.
-bool IsPage(HWND dialog) {
-  return GetDlgItem(dialog, IDOK) != nullptr || GetDlgItem(dialog, 906) != nullptr ||
-         IsShown(GetDlgItem(dialog, kSpaceLine));
 }
 
 // ---- Boxes and pickers
@@ -212,7 +89,7 @@ void PressButton(HWND window, int id) {
 void WaitForQuiet(HWND dialog) {
   std::vector<std::string> before;
   for (int same = 0; same < 4 * kStableLooks; ++same) {
-    const std::vector<std::string> now = Snapshot(dialog);
+    const std::vector<std::string> now = DescribeDialog(dialog);
     if (now != before) same = 0;
     before = now;
     Sleep(kStepTime);
@@ -250,7 +127,7 @@ void AnswerPicker(HWND picker) {
   PressButton(picker, pick == "none" ? IDCANCEL : IDOK);
 }
 
-void AnswerBox(const Windows& windows) {
+void AnswerBox(const ProgramWindows& windows) {
   const HWND box = windows.modal;
   if (!boxPictures.empty()) {
     const std::string name = boxPictures.front().rest;
@@ -277,7 +154,7 @@ void AnswerBox(const Windows& windows) {
   PressButton(box, answer.rest == "yes" ? IDYES : IDNO);
 }
 
-void AnswerModal(const Windows& windows) {
+void AnswerModal(const ProgramWindows& windows) {
   bool isPicker = false;
   EnumChildWindows(windows.modal, FindTree, reinterpret_cast<LPARAM>(&isPicker));
   if (isPicker) {
@@ -296,12 +173,12 @@ HWND WaitForPage() {
   int same = 0;
   for (int look = 0; look < kMostLooks; ++look) {
     if (HasEnded()) return nullptr;
-    const Windows windows = FindWindows();
+    const ProgramWindows windows = FindWindows(process.dwProcessId);
     if (windows.modal != nullptr) {
       AnswerModal(windows);
       same = 0;
     } else if (windows.dialog != nullptr && IsPage(windows.dialog)) {
-      const std::vector<std::string> now = Snapshot(windows.dialog);
+      const std::vector<std::string> now = DescribeDialog(windows.dialog);
       same = now == before ? same + 1 : 0;
       before = now;
       if (same >= kStableLooks) return windows.dialog;
@@ -309,6 +186,14 @@ HWND WaitForPage() {
     Sleep(kStepTime);
   }
   Fail("the dialog never waits for its user");
+}
+
+void WaitForMessage(HWND dialog, const std::wstring& text) {
+  for (int look = 0; look < kMostLooks && !HasEnded(); ++look) {
+    if (ReadMessageArea(dialog).find(text) != std::wstring::npos) return;
+    Sleep(1);
+  }
+  Fail("the message area never had the text");
 }
 
 HWND Clickable(HWND dialog, const std::string& id) {
@@ -347,6 +232,8 @@ void Act(HWND dialog, const Line& line) {
   } else if (line.verb == "picture" || line.verb == "picture-during") {
     Sleep(10 * kStepTime);  // until it is drawn
     WaitForPicture(line.rest);
+  } else if (line.verb == "until-during") {
+    WaitForMessage(dialog, Wide(line.rest));
   } else if (line.verb == "key") {
     HKEY key = nullptr;
     RegCreateKeyW(HKEY_LOCAL_MACHINE, Wide(line.rest).c_str(), &key);
@@ -391,6 +278,18 @@ void Play() {
   if (!script.empty() || !answers.empty() || !picks.empty()) Fail("lines or answers are left over");
 }
 
+// The rest of a command line behind its first `count` words; a word is in quotes or has no blanks.
+std::string SkipWords(const char* text, int count) {
+  for (; count > 0; --count) {
+    const char end = *text == '"' ? '"' : ' ';
+    if (end == '"') ++text;
+    while (*text != '\0' && *text != end) ++text;
+    if (*text == '"') ++text;
+    while (*text == ' ') ++text;
+  }
+  return text;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -399,14 +298,12 @@ int main(int argc, char** argv) {
   output = std::fopen(argv[2], "wb");
   if (output == nullptr) return 2;
   ReadScript(argv[1]);
-  std::string commandLine = std::string("\"") + argv[3] + "\"";
-  for (int i = 4; i < argc; ++i) commandLine += std::string(" ") + argv[i];
+  std::string commandLine = SkipWords(GetCommandLineA(), 3);
   STARTUPINFOA startup = {};
   startup.cb = sizeof startup;
   if (!CreateProcessA(argv[3], commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr, "C:\\",
                       &startup, &process)) {
-    Print("failed: can't start the program");
-    return 1;
+    Fail("can't start the program");
   }
   Play();
   DWORD code = 0;
