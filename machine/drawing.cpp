@@ -137,6 +137,7 @@ HBITMAP LoadBitmapA(HINSTANCE, LPCSTR id) {
                            .description = "bitmap " + std::to_string(number)};
   std::memcpy(&bitmap.width, bytes->data() + 4, sizeof(bitmap.width));
   std::memcpy(&bitmap.height, bytes->data() + 8, sizeof(bitmap.height));
+  if (bitmap.width <= 0 || bitmap.height <= 0) return nullptr;
   return NewObject(bitmap);
 }
 
@@ -159,8 +160,9 @@ HFONT CreateFontA(int height, int, int, int, int weight, DWORD italic, DWORD und
                   DWORD, DWORD, DWORD, DWORD, DWORD, LPCSTR face) {
   if (CallFails("CreateFontA")) return nullptr;
   return NewObject({.kind = ObjectKind::kFont,
-                    .description = std::string("font \"") + face + "\" " + std::to_string(height) +
-                                   " " + std::to_string(weight) + (italic != 0 ? " italic" : "") +
+                    .description = std::string("font \"") + (face != nullptr ? face : "") + "\" " +
+                                   std::to_string(height) + " " + std::to_string(weight) +
+                                   (italic != 0 ? " italic" : "") +
                                    (underline != 0 ? " underline" : "")});
 }
 
@@ -262,7 +264,8 @@ BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, int, int, D
 
 int DrawTextA(HDC dc, LPCSTR text, int length, LPRECT rectangle, UINT format) {
   DeviceContext* const context = FindContext(dc);
-  if (CallFails("DrawTextA") || context == nullptr || text == nullptr) return 0;
+  if (CallFails("DrawTextA") || context == nullptr || text == nullptr || rectangle == nullptr)
+    return 0;
   const std::string bytes =
       length < 0 ? std::string(text) : std::string(text, static_cast<size_t>(length));
   Record(context, "text \"" + machine::ToUtf8(bytes) + "\" " +

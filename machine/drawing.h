@@ -6,7 +6,11 @@
 namespace machine {
 
 // A device context on an owner-drawn control, whose recorded drawing begins anew. It is the
-// system's own and counts for nobody.
+// system's own and counts for nobody. The record tells one call a line:
+//   fill X,Y WxH BRUSH            "brush BBGGRR", or "none" for none of the program's
+//   copy X,Y WxH BITMAP           "bitmap ID"
+//   text "TEXT" X,Y WxH format N color BBGGRR on BBGGRR
+//   focus
 HDC BeginDrawing(Window* control);
 void EndDrawing(HDC dc);
 

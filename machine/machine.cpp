@@ -6,6 +6,7 @@
 #include "machine/open_files.h"
 #include "machine/open_objects.h"
 #include "machine/registry_store.h"
+#include "machine/scripted_user.h"
 
 namespace fs = std::filesystem;
 
@@ -20,6 +21,7 @@ Settings settings;
 fs::path machineFolder;  // absolute; empty when no machine runs
 
 void Close() {
+  ForgetUser();
   ResetFiles();
   CloseRegistry();
   CloseDrives();

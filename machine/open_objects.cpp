@@ -7,11 +7,11 @@ namespace machine {
 namespace {
 
 // In the order of ObjectKind.
-constexpr const char* kObjectNames[] = {"file",           "descriptor", "key",  "module",
-                                        "memory block",   "brush",      "font", "bitmap",
-                                        "device context", "item list"};
+constexpr const char* kObjectNames[] = {"file",           "descriptor", "key",           "module",
+                                        "memory block",   "brush",      "font",          "bitmap",
+                                        "device context", "item list",  "process handle"};
 constexpr size_t kObjectKinds = sizeof kObjectNames / sizeof kObjectNames[0];
-static_assert(static_cast<size_t>(ObjectKind::kItemList) + 1 == kObjectKinds);
+static_assert(static_cast<size_t>(ObjectKind::kProcess) + 1 == kObjectKinds);
 
 int openCounts[kObjectKinds];
 

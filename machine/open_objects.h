@@ -17,6 +17,7 @@ enum class ObjectKind {
   kBitmap,
   kDeviceContext,
   kItemList,
+  kProcess,
 };
 
 void ObjectOpened(ObjectKind kind);

@@ -5,6 +5,7 @@
 
 #include "machine/executable_resources.h"
 #include "machine/faults.h"
+#include "machine/owner_drawing.h"
 #include "machine/scripted_user.h"
 #include "machine/windows.h"
 
@@ -15,8 +16,6 @@ using machine::Window;
 using machine::WindowKind;
 
 namespace {
-
-constexpr uint32_t kButtonTypeMask = 0xF;
 
 std::string TextOf(LPCSTR text) {
   return text != nullptr ? text : "";
@@ -68,6 +67,13 @@ LRESULT SendToList(Window* list, UINT message, WPARAM wParam, LPARAM lParam) {
   }
 }
 
+// Only the type changes, not the style's other bits.
+void SetButtonType(Window* button, WPARAM type) {
+  using machine::kButtonTypeMask;
+  button->style =
+      (button->style & ~kButtonTypeMask) | (static_cast<uint32_t>(type) & kButtonTypeMask);
+}
+
 LRESULT SendToControl(Window* control, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
     case WM_SETTEXT:
@@ -78,12 +84,10 @@ LRESULT SendToControl(Window* control, UINT message, WPARAM wParam, LPARAM lPara
     case WM_SETFONT:
       control->needsDrawing = true;
       return 0;
-    case EM_SETSEL:
-      return 0;
     case BM_SETSTYLE:
-      control->style = (control->style & ~kButtonTypeMask) | (wParam & kButtonTypeMask);
+      if (control->kind == WindowKind::kButton) SetButtonType(control, wParam);
       return 0;
-    default:
+    default:  // EM_SETSEL changes nothing that can be seen here
       return control->kind == WindowKind::kComboBox ? SendToList(control, message, wParam, lParam)
                                                     : 0;
   }
@@ -135,14 +139,13 @@ LONG SetWindowLongA(HWND handle, int index, LONG value) {
   return static_cast<LONG>(std::exchange(window->style, static_cast<uint32_t>(value)));
 }
 
-// A window that is hidden with the focus on it keeps it here; Windows moves it to no other control
-// either, so that the keyboard is dead until the program sets the focus.
 BOOL ShowWindow(HWND handle, int show) {
   Window* const window = FindWindowByHandle(handle);
   if (CallFails("ShowWindow") || window == nullptr) return FALSE;
   const bool wasShown = window->IsShown();
   if (show == SW_HIDE) {
     window->style &= ~static_cast<uint32_t>(WS_VISIBLE);
+    OpenDialog()->TakeFocusFrom(handle);
   } else {
     window->style |= static_cast<uint32_t>(WS_VISIBLE);
     window->needsDrawing = true;
@@ -150,6 +153,7 @@ BOOL ShowWindow(HWND handle, int show) {
   return wasShown;
 }
 
+// A control that is disabled with the focus on it leaves the focus nowhere.
 BOOL EnableWindow(HWND handle, BOOL enable) {
   Window* const window = FindWindowByHandle(handle);
   if (CallFails("EnableWindow") || window == nullptr) return FALSE;
@@ -158,6 +162,7 @@ BOOL EnableWindow(HWND handle, BOOL enable) {
     window->style &= ~static_cast<uint32_t>(WS_DISABLED);
   } else {
     window->style |= static_cast<uint32_t>(WS_DISABLED);
+    if (OpenDialog()->focus == handle) OpenDialog()->focus = nullptr;
   }
   return wasDisabled;
 }
@@ -167,18 +172,27 @@ BOOL IsWindow(HWND handle) {
 }
 
 BOOL DestroyWindow(HWND handle) {
-  machine::Dialog* const dialog = OpenDialog();
-  if (CallFails("DestroyWindow") || dialog == nullptr) return FALSE;
-  if (dialog->focus == handle) dialog->focus = nullptr;
-  return std::erase_if(dialog->controls,
-                       [handle](const auto& control) { return control->handle == handle; }) > 0;
+  const Window* const window = FindWindowByHandle(handle);
+  if (CallFails("DestroyWindow") || window == nullptr || window->kind == WindowKind::kDialog) {
+    return FALSE;
+  }
+  machine::DeleteItems(*window);
+  std::erase_if(OpenDialog()->controls,
+                [handle](const auto& control) { return control->handle == handle; });
+  OpenDialog()->TakeFocusFrom(handle);
+  return TRUE;
 }
 
+// No control, for null, leaves the focus nowhere. The dialog passes it on. Windows also tells the
+// dialog, with notices of the controls, that it has moved.
 HWND SetFocus(HWND handle) {
   machine::Dialog* const dialog = OpenDialog();
+  if (CallFails("SetFocus") || dialog == nullptr) return nullptr;
+  if (handle == nullptr) return std::exchange(dialog->focus, nullptr);
   const Window* const window = FindWindowByHandle(handle);
-  if (CallFails("SetFocus") || window == nullptr || !window->IsEnabled()) return nullptr;
-  return std::exchange(dialog->focus, handle);
+  if (window == nullptr || !window->IsEnabled()) return nullptr;
+  const bool isDialog = window->kind == WindowKind::kDialog;
+  return std::exchange(dialog->focus, isDialog ? dialog->FirstTabStop() : handle);
 }
 
 BOOL SetWindowTextA(HWND handle, LPCSTR text) {
@@ -192,7 +206,10 @@ LRESULT SendMessageA(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
   if (CallFails("SendMessageA")) return 0;
   Window* const window = FindWindowByHandle(handle);
   if (window == nullptr) return 0;
-  if (window->kind == WindowKind::kDialog) return machine::SendToDialog(message, wParam, lParam);
+  if (window->kind == WindowKind::kDialog) {
+    const LRESULT result = machine::SendToDialog(message, wParam, lParam);
+    if (result != FALSE) return result;  // else the system does what it does for every window
+  }
   return SendToControl(window, message, wParam, lParam);
 }
 
@@ -207,10 +224,13 @@ BOOL PostMessageA(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
   return TRUE;
 }
 
-// Only the program's own loop comes here: the dialog's and the message box's take from the queue
-// themselves. It is the moment at which a scripted user acts inside a running step.
-BOOL PeekMessageA(LPMSG message, HWND, UINT, UINT, UINT) {
+// Any message of any window, and taken out of the queue: the only form that is understood. Only the
+// program's own loop comes here: the dialog's and the message box's take from the queue themselves.
+// It is the moment at which a scripted user acts inside a running step.
+BOOL PeekMessageA(LPMSG message, HWND window, UINT first, UINT last, UINT remove) {
   if (CallFails("PeekMessageA")) return FALSE;
+  const bool wantsAny = window == nullptr && first == 0 && last == 0;
+  if (message == nullptr || !wantsAny || remove != PM_REMOVE) return FALSE;
   machine::UserAtPoll();
   return machine::TakeMessage(message);
 }

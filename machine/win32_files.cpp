@@ -10,6 +10,7 @@
 #include "machine/faults.h"
 #include "machine/file_attributes.h"
 #include "machine/open_files.h"
+#include "machine/process_handles.h"
 #include "platform/win32.h"
 
 namespace fs = std::filesystem;
@@ -158,7 +159,8 @@ DWORD SetFilePointer(HANDLE handle, LONG distance, LONG* high, DWORD method) {
 // write.
 BOOL CloseHandle(HANDLE handle) {
   const bool fails = CallFails("CloseHandle");
-  const bool closed = machine::CloseOpenFile(NumberOf(handle), ObjectKind::kFile);
+  const bool closed = machine::CloseOpenFile(NumberOf(handle), ObjectKind::kFile) ||
+                      machine::CloseProcessHandle(handle);
   return closed && !fails;
 }
 

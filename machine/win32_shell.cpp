@@ -6,6 +6,7 @@
 #include "machine/drives.h"
 #include "machine/faults.h"
 #include "machine/open_objects.h"
+#include "machine/process_handles.h"
 #include "machine/scripted_user.h"
 #include "platform/win32.h"
 
@@ -50,11 +51,18 @@ HINSTANCE ShellExecuteA(HWND, LPCSTR, LPCSTR file, LPCSTR, LPCSTR, int) {
   return reinterpret_cast<HINSTANCE>(machine::LocateFile(file) ? kStarted : kFileNotFound);
 }
 
+// Every command starts, as far as the program can see: it gets the two handles, which it has to
+// close. No other program exists on this machine.
 BOOL CreateProcessA(LPCSTR, LPSTR commandLine, LPSECURITY_ATTRIBUTES, LPSECURITY_ATTRIBUTES, BOOL,
-                    DWORD, LPVOID, LPCSTR, STARTUPINFOA*, PROCESS_INFORMATION* information) {
+                    DWORD, LPVOID, LPCSTR, STARTUPINFOA* startup,
+                    PROCESS_INFORMATION* information) {
   if (CallFails("CreateProcessA") || commandLine == nullptr || information == nullptr) return FALSE;
+  if (startup == nullptr || startup->cb != sizeof(STARTUPINFOA)) return FALSE;
   machine::TellUser("start " + machine::Quoted(commandLine));
-  return FALSE;  // no other program exists on this machine, so that there is no handle to close
+  *information = {};
+  information->hProcess = machine::OpenProcessHandle();
+  information->hThread = machine::OpenProcessHandle();
+  return TRUE;
 }
 
 LPITEMIDLIST SHBrowseForFolderA(BROWSEINFOA* info) {

@@ -2,19 +2,20 @@
 
 #include <algorithm>
 #include <deque>
-#include <map>
+#include <optional>
+#include <utility>
 
-#include "machine/drawing.h"
+#include "machine/code_page.h"
+#include "machine/owner_drawing.h"
 #include "machine/scripted_user.h"
 
 namespace machine {
 namespace {
 
-constexpr uint32_t kTypeMask = 0xF;  // of a button's style
-constexpr uint32_t kStaticTypeMask = 0x1F;
 constexpr uint32_t kStaticBitmap = 0xE;     // SS_BITMAP
 constexpr uint32_t kStaticNotify = 0x100;   // SS_NOTIFY
 constexpr uint32_t kListOwnerDrawn = 0x10;  // CBS_OWNERDRAWFIXED
+constexpr uint32_t kTabStop = 0x10000;      // WS_TABSTOP
 constexpr int kEditUpdate = 0x400;
 constexpr int kEditChange = 0x300;
 
@@ -29,67 +30,41 @@ HWND NewHandle() {
   return reinterpret_cast<HWND>(lastHandle += 2);
 }
 
-WindowKind KindOf(const std::string& className) {
-  static const std::map<std::string, WindowKind> kinds = {{"Static", WindowKind::kStatic},
-                                                          {"Edit", WindowKind::kEdit},
-                                                          {"Button", WindowKind::kButton},
-                                                          {"ComboBox", WindowKind::kComboBox}};
-  const auto kind = kinds.find(className);
-  return kind != kinds.end() ? kind->second : WindowKind::kStatic;
+std::optional<WindowKind> KindOfClass(const std::string& className) {
+  constexpr std::pair<const char*, WindowKind> kKinds[] = {{"Static", WindowKind::kStatic},
+                                                           {"Edit", WindowKind::kEdit},
+                                                           {"Button", WindowKind::kButton},
+                                                           {"ComboBox", WindowKind::kComboBox}};
+  for (const auto& [name, kind] : kKinds) {
+    if (EqualNoCase(className, name)) return kind;
+  }
+  return std::nullopt;
 }
 
-std::unique_ptr<Window> MakeControl(const TemplateItem& item) {
+// Dialog units are fractions of a character of the dialog's font: a quarter of its width, an eighth
+// of its height. "MS Sans Serif" of 8 points has 6 by 13 pixels; here every font has.
+constexpr LONG PixelsAcross(int units) {
+  return units * 6 / 4;
+}
+
+constexpr LONG PixelsDown(int units) {
+  return units * 13 / 8;
+}
+
+std::unique_ptr<Window> MakeControl(const TemplateItem& item, WindowKind kind) {
   auto control = std::make_unique<Window>();
   control->handle = NewHandle();
   control->className = item.className;
-  control->kind = KindOf(item.className);
+  control->kind = kind;
   control->id = item.id;
   control->style = item.style;
   control->text = item.text;
+  control->width = PixelsAcross(item.width);
+  control->height = PixelsDown(item.height);
   control->hasPicture = control->kind == WindowKind::kStatic &&
                         (item.style & kStaticTypeMask) == kStaticBitmap && item.pictureId != 0;
   control->needsDrawing = true;
   return control;
-}
-
-// Comes while the controls are created, before the dialog is initialised.
-void MeasureItems(const Window& control) {
-  if (control.kind != WindowKind::kComboBox || !control.IsOwnerDrawn()) return;
-  MEASUREITEMSTRUCT measure = {};
-  measure.CtlType = ODT_COMBOBOX;
-  measure.CtlID = static_cast<UINT>(control.id);
-  SendToDialog(WM_MEASUREITEM, static_cast<WPARAM>(control.id), reinterpret_cast<LPARAM>(&measure));
-}
-
-// Comes for each entry when the list goes.
-void DeleteItems(const Window& control) {
-  for (size_t index = 0; index < control.items.size(); ++index) {
-    DELETEITEMSTRUCT deleted = {};
-    deleted.CtlType = ODT_COMBOBOX;
-    deleted.CtlID = static_cast<UINT>(control.id);
-    deleted.itemID = static_cast<UINT>(index);
-    deleted.hwndItem = control.handle;
-    deleted.itemData = control.items[index];
-    SendToDialog(WM_DELETEITEM, static_cast<WPARAM>(control.id),
-                 reinterpret_cast<LPARAM>(&deleted));
-  }
-}
-
-void DrawControl(Window* control) {
-  control->needsDrawing = false;
-  DRAWITEMSTRUCT item = {};
-  item.CtlID = static_cast<UINT>(control->id);
-  item.hwndItem = control->handle;
-  item.rcItem = {0, 0, 100, 17};
-  if (control->kind == WindowKind::kComboBox) {
-    item.CtlType = ODT_COMBOBOX;
-    item.itemID = static_cast<UINT>(control->selection);
-    const bool isEntry = control->selection >= 0;
-    item.itemData = isEntry ? control->items[static_cast<size_t>(control->selection)] : 0;
-  }
-  item.hDC = BeginDrawing(control);
-  SendToDialog(WM_DRAWITEM, static_cast<WPARAM>(control->id), reinterpret_cast<LPARAM>(&item));
-  EndDrawing(item.hDC);
 }
 
 void Command(int id, int notification, HWND control) {
@@ -102,11 +77,38 @@ HWND CancelControl() {
   return control != nullptr ? control->handle : nullptr;
 }
 
+// A control of that id that is disabled makes Windows ignore the key and the box.
+bool CanCancel() {
+  const Window* const control = openDialog->Find(IDCANCEL);
+  return control == nullptr || control->IsEnabled();
+}
+
 void DestroyDialog() {
   // The lists tell of their entries while the dialog still stands.
   for (const auto& control : openDialog->controls) DeleteItems(*control);
   openDialog.reset();
   queue.clear();
+}
+
+bool MakeControls(const std::vector<TemplateItem>& items) {
+  for (const TemplateItem& item : items) {
+    const std::optional<WindowKind> kind = KindOfClass(item.className);
+    if (!kind) return false;
+    openDialog->controls.push_back(MakeControl(item, *kind));
+    MeasureItems(openDialog->controls.back().get());
+  }
+  return true;
+}
+
+// The dialog's answer tells whether the system is to set the focus. It also does when the program
+// did not: the dialog gets it when it is shown.
+void InitDialog(LPARAM data) {
+  const HWND first = openDialog->FirstTabStop();
+  if (SendToDialog(WM_INITDIALOG, reinterpret_cast<WPARAM>(first), data) != FALSE) {
+    openDialog->focus = first;
+  } else if (openDialog->focus == nullptr) {
+    openDialog->focus = openDialog->FirstTabStop();
+  }
 }
 
 }  // namespace
@@ -120,6 +122,17 @@ Window* Dialog::Find(int id) const {
   const auto found = std::ranges::find_if(
       controls, [id](const std::unique_ptr<Window>& control) { return control->id == id; });
   return found != controls.end() ? found->get() : nullptr;
+}
+
+HWND Dialog::FirstTabStop() const {
+  const auto found = std::ranges::find_if(controls, [](const std::unique_ptr<Window>& control) {
+    return (control->style & kTabStop) != 0 && control->IsShown() && control->IsEnabled();
+  });
+  return found != controls.end() ? (*found)->handle : nullptr;
+}
+
+void Dialog::TakeFocusFrom(HWND control) {
+  if (focus == control) focus = FirstTabStop();
 }
 
 Dialog* OpenDialog() {
@@ -188,13 +201,12 @@ void PostClick(HWND control) {
   PostToQueue(message);
 }
 
-// A control of that id that is disabled makes Windows ignore the key and the box.
 void SendCancel() {
-  const Window* const control = openDialog->Find(IDCANCEL);
-  if (control == nullptr || control->IsEnabled()) Command(IDCANCEL, 0, CancelControl());
+  if (CanCancel()) Command(IDCANCEL, 0, CancelControl());
 }
 
 void PostCancel() {
+  if (!CanCancel()) return;
   MSG message = {};
   message.hwnd = openDialog->frame.handle;
   message.message = WM_COMMAND;
@@ -205,16 +217,11 @@ void PostCancel() {
 
 void TypeText(Window* edit, const std::string& text) {
   edit->text = text;
-  Command(edit->id, kEditUpdate, edit->handle);
-  Command(edit->id, kEditChange, edit->handle);
-}
-
-void DrawControls() {
-  for (size_t index = 0; openDialog != nullptr && index < openDialog->controls.size(); ++index) {
-    Window* const control = openDialog->controls[index].get();
-    if (control->needsDrawing && control->IsShown() && control->IsOwnerDrawn()) {
-      DrawControl(control);
-    }
+  const HWND handle = edit->handle;
+  // The first notice can renumber or destroy the field.
+  for (const int notice : {kEditUpdate, kEditChange}) {
+    const Window* const told = FindWindowByHandle(handle);
+    if (told != nullptr) Command(told->id, notice, handle);
   }
 }
 
@@ -226,15 +233,14 @@ INT_PTR RunDialog(const DialogTemplate& dialogTemplate, DLGPROC procedure, LPARA
   openDialog->frame.kind = WindowKind::kDialog;
   openDialog->frame.style = dialogTemplate.frame.style;
   openDialog->frame.text = dialogTemplate.frame.text;
-  for (const TemplateItem& item : dialogTemplate.controls) {
-    openDialog->controls.push_back(MakeControl(item));
-    MeasureItems(*openDialog->controls.back());
+  INT_PTR result = -1;
+  if (MakeControls(dialogTemplate.controls)) {
+    InitDialog(data);
+    while (!openDialog->hasEnded) {
+      if (!DispatchNext()) TakeUserTurn();
+    }
+    result = openDialog->result;
   }
-  SendToDialog(WM_INITDIALOG, 0, data);
-  while (!openDialog->hasEnded) {
-    if (!DispatchNext()) TakeUserTurn();
-  }
-  const INT_PTR result = openDialog->result;
   DestroyDialog();
   return result;
 }

@@ -12,6 +12,9 @@
 
 namespace machine {
 
+inline constexpr uint32_t kButtonTypeMask = 0xF;  // of a button's style
+inline constexpr uint32_t kStaticTypeMask = 0x1F;
+
 enum class WindowKind { kDialog, kStatic, kEdit, kButton, kComboBox };
 
 struct Window {
@@ -22,8 +25,11 @@ struct Window {
   uint32_t style = 0;  // WS_VISIBLE and WS_DISABLED tell its state
   std::string text;
   bool hasPicture = false;
+  LONG width = 0;  // in pixels, as the height
+  LONG height = 0;
   std::vector<ULONG_PTR> items;  // of an owner-drawn list: what the program gave for each
   int selection = -1;
+  UINT itemHeight = 0;               // of an owner-drawn list: as the program has measured it
   bool needsDrawing = false;         // of an owner-drawn control
   std::vector<std::string> drawing;  // the calls of its last drawing
 
@@ -41,6 +47,11 @@ struct Dialog {
   INT_PTR result = 0;
 
   Window* Find(int id) const;  // the first control that bears the id now
+  // The first control that the Tab key reaches; null for none.
+  HWND FirstTabStop() const;
+  // The control has been hidden or destroyed: Windows gives its focus to the dialog, which gives it
+  // to the first control that the Tab key reaches.
+  void TakeFocusFrom(HWND control);
 };
 
 // The dialog that is open; null when none is.
@@ -63,7 +74,9 @@ bool DispatchNext();
 // ---- What a user does
 
 // A click on a control. On one that is hidden or disabled it has no effect, as on Windows, where it
-// reaches the dialog under the control. A button takes the focus.
+// reaches the dialog under the control. A button or an edit field takes the focus. Windows' dialog
+// manager then also makes the button that has it the default one for as long; not every system
+// does, and here the style stays as the program set it.
 void Click(HWND control);
 // A click that waits in the queue.
 void PostClick(HWND control);
@@ -73,10 +86,8 @@ void PostCancel();
 // Puts a text in an edit field, with its notices to the dialog.
 void TypeText(Window* edit, const std::string& text);
 
-// Lets every owner-drawn control that needs it draw itself.
-void DrawControls();
-
-// Runs a dialog to its end, and gives the result. -1 for a template that can't be read.
+// Runs a dialog to its end, and gives the result. -1 when one is open already, or for a control of
+// a class that is none of the four.
 INT_PTR RunDialog(const DialogTemplate& dialogTemplate, DLGPROC procedure, LPARAM data);
 
 }  // namespace machine

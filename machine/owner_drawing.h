@@ -1,0 +1,18 @@
+// What the system tells a dialog of the controls that the program draws itself.
+#pragma once
+
+#include "machine/windows.h"
+
+namespace machine {
+
+// A list is measured once, while the controls are created and before the dialog is initialised.
+// Does nothing for other controls.
+void MeasureItems(Window* control);
+
+// Lets every owner-drawn control that is shown and has changed draw itself.
+void DrawControls();
+
+// Tells of each entry of a list that goes.
+void DeleteItems(const Window& control);
+
+}  // namespace machine

@@ -1,0 +1,138 @@
+// The graphics objects of the stand-in machine, and the controls that a program draws itself.
+#include "machine/drawing.h"
+
+#include "machine/open_objects.h"
+#include "tests/support/test_dialog.h"
+
+namespace {
+
+constexpr WORD kFlag = 120;
+
+class Drawing : public DialogTest {
+ protected:
+  void TearDown() override { EXPECT_EQ(machine::Stop(), ""); }
+};
+
+TEST_F(Drawing, SelectedObjectCannotBeDeleted) {
+  const HDC dc = CreateCompatibleDC(nullptr);
+  const HBRUSH first = CreateSolidBrush(0x112233);
+  const HBRUSH second = CreateSolidBrush(0x445566);
+  const HGDIOBJ stock = SelectObject(dc, first);
+  EXPECT_NE(stock, nullptr);
+  EXPECT_EQ(DeleteObject(first), FALSE);
+  EXPECT_EQ(SelectObject(dc, second), first);
+  EXPECT_EQ(DeleteObject(first), TRUE);
+  EXPECT_EQ(DeleteObject(first), FALSE);
+  EXPECT_EQ(SelectObject(dc, first), nullptr);
+  EXPECT_EQ(SelectObject(dc, stock), second);
+  EXPECT_EQ(DeleteObject(second), TRUE);
+  EXPECT_EQ(DeleteDC(dc), TRUE);
+  EXPECT_EQ(DeleteDC(dc), FALSE);
+}
+
+TEST_F(Drawing, ContextThatGoesLetsItsObjectsGo) {
+  const HDC dc = GetDC(nullptr);
+  const HFONT font = CreateFontA(14, 0, 0, 0, 400, 0, 0, 0, 0, 0, 0, 0, 0, nullptr);
+  SelectObject(dc, font);
+  EXPECT_EQ(ReleaseDC(nullptr, dc), 1);
+  EXPECT_EQ(DeleteObject(font), TRUE);
+}
+
+TEST_F(Drawing, EveryKindIsCounted) {
+  const HDC dc = CreateCompatibleDC(nullptr);
+  const HBRUSH brush = CreateSolidBrush(0);
+  const HFONT font = CreateFontA(14, 0, 0, 0, 400, 0, 0, 0, 0, 0, 0, 0, 0, "Arial");
+  const HBITMAP bitmap = LoadBitmapA(nullptr, MAKEINTRESOURCEA(kFlag));
+  EXPECT_EQ(machine::OpenObjects(), "1 brush, 1 font, 1 bitmap, 1 device context");
+  for (const HGDIOBJ object : {brush, font, bitmap}) EXPECT_EQ(DeleteObject(object), TRUE);
+  DeleteDC(dc);
+}
+
+TEST_F(Drawing, BitmapTellsItsSize) {
+  const HBITMAP flag = LoadBitmapA(nullptr, MAKEINTRESOURCEA(kFlag));
+  BITMAP size = {};
+  EXPECT_EQ(GetObjectA(flag, sizeof(size) - 1, &size), 0);
+  EXPECT_EQ(GetObjectA(flag, sizeof(size), &size), static_cast<int>(sizeof(size)));
+  EXPECT_EQ(size.bmWidth, 26);
+  EXPECT_EQ(size.bmHeight, 15);
+  EXPECT_EQ(LoadBitmapA(nullptr, MAKEINTRESOURCEA(999)), nullptr);
+  DeleteObject(flag);
+}
+
+TEST_F(Drawing, ControlDrawsItselfWhenItIsShownAndHasChanged) {
+  constexpr UINT kOwnerDrawnText = kShownControl | SS_OWNERDRAW;
+  int drawings = 0;
+  const auto draw = [&drawings](const DRAWITEMSTRUCT& item) {
+    ++drawings;
+    SetTextColor(item.hDC, 0xFF0000);
+    const HBRUSH brush = CreateSolidBrush(0x6400);
+    const HGDIOBJ old = SelectObject(item.hDC, brush);
+    PatBlt(item.hDC, 1, 2, 30, 40, PATCOPY);
+    SelectObject(item.hDC, old);
+    DeleteObject(brush);
+    RECT area = item.rcItem;
+    DrawTextA(item.hDC, "caf\xE9 or more", 4, &area, DT_VCENTER);
+    DrawFocusRect(item.hDC, &item.rcItem);
+  };
+  Run({Control("Static", 10, kOwnerDrawnText), Control("Button", 11)},
+      "wait\nwait\npress 11\nwait\nescape\n",
+      [&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+        const HWND control = GetDlgItem(dialog, 10);
+        if (message == WM_DRAWITEM) {
+          EXPECT_EQ(wParam, 10u);
+          const auto& item = *reinterpret_cast<const DRAWITEMSTRUCT*>(lParam);
+          EXPECT_EQ(item.hwndItem, control);
+          draw(item);
+        }
+        if (message == WM_COMMAND && LOWORD(wParam) == 11) {
+          EXPECT_EQ(drawings, 1);  // idle twice, but nothing changed
+          EXPECT_EQ(
+              machine::FindWindowByHandle(control)->drawing,
+              (std::vector<std::string>{
+                  "fill 1,2 30x40 brush 006400",
+                  "text \"caf\xC3\xA9\" 0,0 60x26 format 4 color FF0000 on FFFFFF", "focus"}));
+          SetWindowTextA(control, "changed");
+          PostMessageA(dialog, 1100, 0, 0);
+        }
+        if (message == 1100) {
+          EXPECT_EQ(drawings, 1);  // not before the dialog is idle
+        }
+        if (message == WM_COMMAND && LOWORD(wParam) == IDCANCEL) {
+          EXPECT_EQ(drawings, 2);
+          ShowWindow(control, SW_HIDE);
+          SetWindowTextA(control, "hidden");
+          EndDialog(dialog, 1);
+        }
+        return FALSE;
+      });
+  EXPECT_EQ(drawings, 2);
+}
+
+TEST_F(Drawing, ListDrawsItsFieldWithAndWithoutSelection) {
+  std::vector<DRAWITEMSTRUCT> fields;
+  Run({Control("ComboBox", 11, kShownControl | kOwnerDrawnList | WS_DISABLED),
+       Control("Button", 12)},
+      "press 12\nescape\n",
+      [&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+        const HWND list = GetDlgItem(dialog, 11);
+        if (message == WM_MEASUREITEM)
+          reinterpret_cast<MEASUREITEMSTRUCT*>(lParam)->itemHeight = 19;
+        if (message == WM_INITDIALOG) SendMessageA(list, CB_ADDSTRING, 0, 900);
+        if (message == WM_DRAWITEM) fields.push_back(*reinterpret_cast<DRAWITEMSTRUCT*>(lParam));
+        if (message == WM_COMMAND && LOWORD(wParam) == 12) SendMessageA(list, CB_SETCURSEL, 0, 0);
+        if (message == WM_COMMAND && LOWORD(wParam) == IDCANCEL) EndDialog(dialog, 1);
+        return FALSE;
+      });
+  ASSERT_EQ(fields.size(), 2u);
+  EXPECT_EQ(fields[0].itemID, UINT32_MAX);
+  EXPECT_EQ(fields[0].itemData, 0u);
+  EXPECT_EQ(fields[1].itemID, 0u);
+  EXPECT_EQ(fields[1].itemData, 900u);
+  for (const DRAWITEMSTRUCT& field : fields) {
+    EXPECT_EQ(field.CtlType, static_cast<UINT>(ODT_COMBOBOX));
+    EXPECT_EQ(field.itemState & (ODS_SELECTED | ODS_FOCUS), 0u);
+    EXPECT_EQ(field.rcItem.bottom, 19);
+  }
+}
+
+}  // namespace
