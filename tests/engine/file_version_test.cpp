@@ -1,3 +1,4 @@
+// Versions of files, and their comparison.
 #include "engine/file_version.h"
 
 #include <array>
@@ -100,9 +101,27 @@ TEST_F(FileVersion, OfOtherFilesIsNotSet) {
   }
   EXPECT_EQ(ReadFileRecordFromDisk("", &record), StatusBadArgument);
   EXPECT_EQ(ReadFileRecordFromDisk("C:\\a.txt", nullptr), StatusBadArgument);
-  FailAllCalls("GlobalAlloc");
   pc.Write("drive_c/a.exe", VersionedProgram("4.1.7"));
-  EXPECT_EQ(ReadFileRecordFromDisk("C:\\a.exe", &record), 0) << "no memory for the data";
+  for (const char* function : {"GlobalAlloc", "GlobalLock", "GetFileVersionInfoA", "VerQueryValueA",
+                               "LoadLibraryA", "GetSystemDirectoryA"}) {
+    FailAllCalls(function);
+    EXPECT_EQ(ReadFileRecordFromDisk("C:\\a.exe", &record), 0) << function;
+    EXPECT_EQ(record.versionFirst, kVersionNotSet) << function;
+  }
+}
+
+TEST_F(FileVersion, TheFirstTranslationNamesTheBlock) {
+  const std::string version = VersionResource({{"FileVersion", "1.2.3"}}, 0x0407, 0x04E4);
+  pc.Write("drive_c/a.exe", PortableExecutable(true, 16, 1, {{0x407, version}}));
+  FileRecord record = {};
+  EXPECT_EQ(ReadFileRecordFromDisk("C:\\a.exe", &record), 1);
+  EXPECT_STREQ(record.versionLanguage, "040704e4");
+  EXPECT_EQ(record.versionSecond, 2);
+  // A text above what any path has is read as far as it goes.
+  const std::string longText = VersionResource({{"FileVersion", "7.8." + std::string(400, '9')}});
+  pc.Write("drive_c/a.exe", PortableExecutable(false, 16, 1, {{0x40C, longText}}));
+  EXPECT_EQ(ReadFileRecordFromDisk("C:\\a.exe", &record), 1);
+  EXPECT_EQ(record.versionFirst, 7);
 }
 
 }  // namespace

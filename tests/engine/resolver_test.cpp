@@ -1,7 +1,6 @@
+// From a destination to full paths.
 #include "engine/resolver.h"
 
-#include "engine/browsers.h"
-#include "engine/install_pass.h"
 #include "tests/support/product_test.h"
 
 namespace {
@@ -60,7 +59,8 @@ TEST_F(Resolver, ElementsAreMacrosAndSubpathsOrAbsoluteDirectories) {
 
 TEST_F(Resolver, PathsEndAt259Characters) {
   // "C:\Moriv\" and "\a.dll" have 9 and 6.
-  EXPECT_EQ(Resolve(std::string(244, 'd')).front().substr(0, 259).size(), 259u);
+  const std::string longest = "C:\\Moriv\\" + std::string(244, 'd');
+  EXPECT_EQ(Resolve(std::string(244, 'd')), Strings{longest + "\\a.dll [" + longest + "]"});
   EXPECT_EQ(Resolve(std::string(245, 'd')), Strings{std::to_string(StatusBufferTooSmall)});
   EXPECT_EQ(Resolve("ok;" + std::string(245, 'd')).size(), 2u) << "what was found so far stands";
   EXPECT_EQ(Resolve(std::string(260, 'd')), Strings{std::to_string(StatusBufferTooSmall)});
@@ -115,66 +115,6 @@ TEST_F(Resolver, NoSystemDirectoryEndsTheWalk) {
   FailAllCalls("GetSystemDirectoryA");
   EXPECT_EQ(Resolve("a;%SYS_DIR%;b"),
             (Strings{"C:\\Moriv\\a\\a.dll [C:\\Moriv\\a]", std::to_string(StatusNoSystemDir)}));
-}
-
-using Browsers = ProductTest;
-
-TEST_F(Browsers, ResultsThatDoNotFitLeaveTheBufferAlone) {
-  InstallBrowser("Opera.exe", "Opera");
-  char buffer[260] = "old";
-  EXPECT_EQ(FindOperaPluginDir(buffer, 16), 0);
-  EXPECT_STREQ(buffer, "old");
-  EXPECT_EQ(FindOperaPluginDir(buffer, 17), 1);
-  EXPECT_STREQ(buffer, "C:\\Opera\\Plugins");
-  EXPECT_EQ(FindOperaPluginDir(nullptr, 260), 0);
-  EXPECT_EQ(FindExplorerPluginDir(buffer, 260), 0);
-}
-
-TEST_F(Browsers, ANavigatorDirectoryIsTakenAsItStands) {
-  InstallBrowser("Netscape.exe", "Netscape");
-  const std::string navigator = "SOFTWARE\\Netscape\\Netscape Navigator";
-  SetRegistryText(navigator, "CurrentVersion", "4.7");
-  char buffer[260] = "old";
-  EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1);
-  EXPECT_STREQ(buffer, "C:\\Netscape\\Plugins") << "no Plugins Directory: by App Paths";
-  for (const std::string& directory : {std::string("D:\\gone;E:\\x"), std::string()}) {
-    SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", directory);
-    EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1);
-    EXPECT_EQ(buffer, directory);
-  }
-  SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", "D:\\Plug");
-  EXPECT_EQ(FindNetscapePluginDir(buffer, 7), 0) << "it doesn't fit, and App Paths isn't tried";
-  EXPECT_STREQ(buffer, "");
-  SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", std::string(260, 'p'));
-  EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1) << "no NUL in 260 bytes: absent";
-  EXPECT_STREQ(buffer, "C:\\Netscape\\Plugins");
-}
-
-TEST_F(Browsers, OnlyTheFirstDirectoryOfAPathCounts) {
-  pc.Write("drive_c/B/x", "");
-  char path[] = "C:\\B;C:\\A";
-  EXPECT_EQ(CleanAppPath(path), 1);
-  EXPECT_STREQ(path, "C:\\B");
-  char gone[] = "C:\\A;C:\\B";
-  EXPECT_EQ(CleanAppPath(gone), 0);
-  EXPECT_STREQ(gone, "C:\\A;C:\\B");
-  char file[] = "C:\\B\\x";
-  EXPECT_EQ(CleanAppPath(file), 0);
-}
-
-using Directories = ProductTest;
-
-TEST_F(Directories, AreMadeFromTheTopDown) {
-  EXPECT_EQ(MakeDirectories("C:\\a\\b\\c\\file.txt"), 1);
-  EXPECT_TRUE(pc.Has("drive_c/a/b/c"));
-  EXPECT_FALSE(pc.Has("drive_c/a/b/c/file.txt"));
-  EXPECT_EQ(MakeDirectories("C:\\"), StatusInternal);
-  EXPECT_EQ(MakeDirectories(nullptr), StatusInternal);
-  EXPECT_EQ(MakeDirectories("\\a\\b"), StatusCreateDirFailed);
-  EXPECT_EQ(MakeDirectories("Q:\\a\\b"), StatusCreateDirFailed);
-  EXPECT_EQ(MakeDirectories((std::string(300, 'd') + "\\f").c_str()), StatusCreateDirFailed);
-  EXPECT_EQ(CopyTarget("", "C:\\x"), StatusInternal);
-  EXPECT_EQ(CopyTarget("C:\\absent", "C:\\x"), StatusCopyFailed);
 }
 
 }  // namespace

@@ -1,3 +1,4 @@
+// Whether a package would change anything.
 #include "engine/update_check.h"
 
 #include "tests/support/product_test.h"

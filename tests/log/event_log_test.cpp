@@ -1,3 +1,4 @@
+// The events of a run as lines of a text file.
 #include "log/event_log.h"
 
 #include "tests/support/product_test.h"

@@ -1,3 +1,4 @@
+// The library of the product's registry tree.
 #include "registration/product_registry.h"
 
 #include <string>
@@ -198,7 +199,9 @@ TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {
   EXPECT_EQ(ProductListServices(), nullptr);
   EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 0);
   EXPECT_STREQ(names, "");
+  machine::CurrentSettings().ntFamily = false;  // there a key goes with all below it
   EXPECT_EQ(ProductDeleteTree(nullptr), -1);
+  EXPECT_TRUE(HasRegistryKey(kServices));
 }
 
 TEST_F(ProductRegistry, JoinedNamesEndWithTheLastThatFitsWhole) {

@@ -1,8 +1,7 @@
+// The trimmed copy of the image that removes the product.
 #include "registration/removal_program.h"
 
 #include "engine/install_pass.h"
-#include "registration/cleanup_script.h"
-#include "registration/uninstall_entries.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
 
@@ -79,27 +78,16 @@ TEST_F(RemovalProgram, FailuresLeaveNoPartOfIt) {
     EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), status) << function;
     EXPECT_FALSE(pc.Has(kProgram)) << function;
   }
+  // Both ways of opening are refused: for the image, then for the copy.
+  machine::SetFaults({{.function = "CreateFileA"}, {.function = "_sopen"}});
+  EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), StatusOpenFailed);
+  machine::SetFaults({{.function = "CreateFileA", .call = 2}, {.function = "_creat"}});
+  EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), StatusCreateFileFailed);
+  EXPECT_FALSE(pc.Has(kProgram));
   // The last write, that of the header.
   FailCall("WriteFile", 5 + 3 + 1);
   EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), StatusWriteRemovalFailed);
   EXPECT_FALSE(pc.Has(kProgram));
-}
-
-using CleanupScript = ProductTest;
-
-TEST_F(CleanupScript, IsCutWhereAWriteFailsAndThenNothingIsScheduled) {
-  FailCall("WriteFile", 3);
-  EXPECT_EQ(ScheduleFinalCleanup(), 0);
-  EXPECT_EQ(pc.Read("drive_c/windows/Moriv.INF"),
-            "[Version]\r\nSignature=$Chicago$\r\nAdvancedINF=2.0\r\n");
-  EXPECT_EQ(CancelRunOnceCommand(), 0) << "no command";
-  FailNothing();
-  EXPECT_EQ(ScheduleFinalCleanup(), 1);
-  EXPECT_EQ(pc.Read("drive_c/windows/Moriv.INF").size(), 181u);
-  EXPECT_EQ(CancelRunOnceCommand(), 1);
-  EXPECT_EQ(WriteRunOnceCommand(""), 0);
-  EXPECT_EQ(WriteRunOnceCommand(std::string(500, 'p').c_str()), 0) << "the command doesn't fit";
-  EXPECT_EQ(CancelRunOnceCommand(), 0);
 }
 
 }  // namespace

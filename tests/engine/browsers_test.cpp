@@ -1,0 +1,93 @@
+// Where the browsers keep their plug-ins.
+#include "engine/browsers.h"
+
+#include "tests/support/product_test.h"
+
+namespace {
+
+using Browsers = ProductTest;
+
+TEST_F(Browsers, ResultsThatDoNotFitLeaveTheBufferAlone) {
+  InstallBrowser("Opera.exe", "Opera");
+  char buffer[260] = "old";
+  EXPECT_EQ(FindOperaPluginDir(buffer, 16), 0);
+  EXPECT_STREQ(buffer, "old");
+  EXPECT_EQ(FindOperaPluginDir(buffer, 17), 1);
+  EXPECT_STREQ(buffer, "C:\\Opera\\Plugins");
+  EXPECT_EQ(FindOperaPluginDir(nullptr, 260), 0);
+  EXPECT_EQ(FindExplorerPluginDir(buffer, 260), 0);
+}
+
+TEST_F(Browsers, ANavigatorDirectoryIsTakenAsItStands) {
+  InstallBrowser("Netscape.exe", "Netscape");
+  const std::string navigator = "SOFTWARE\\Netscape\\Netscape Navigator";
+  SetRegistryText(navigator, "CurrentVersion", "4.7");
+  char buffer[260] = "old";
+  EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1);
+  EXPECT_STREQ(buffer, "C:\\Netscape\\Plugins") << "no Plugins Directory: by App Paths";
+  for (const std::string& directory : {std::string("D:\\gone;E:\\x"), std::string()}) {
+    SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", directory);
+    EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1);
+    EXPECT_EQ(buffer, directory);
+  }
+  SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", "D:\\Plug");
+  EXPECT_EQ(FindNetscapePluginDir(buffer, 7), 0) << "it doesn't fit, and App Paths isn't tried";
+  EXPECT_STREQ(buffer, "");
+  SetRegistryText(navigator + "\\4.7\\Main", "Plugins Directory", std::string(260, 'p'));
+  EXPECT_EQ(FindNetscapePluginDir(buffer, 260), 1) << "no NUL in 260 bytes: absent";
+  EXPECT_STREQ(buffer, "C:\\Netscape\\Plugins");
+}
+
+TEST_F(Browsers, OnlyTheFirstDirectoryOfAPathCounts) {
+  pc.Write("drive_c/B/x", "");
+  char path[] = "C:\\B;C:\\A";
+  EXPECT_EQ(CleanAppPath(path), 1);
+  EXPECT_STREQ(path, "C:\\B");
+  char gone[] = "C:\\A;C:\\B";
+  EXPECT_EQ(CleanAppPath(gone), 0);
+  EXPECT_STREQ(gone, "C:\\A;C:\\B");
+  char file[] = "C:\\B\\x";
+  EXPECT_EQ(CleanAppPath(file), 0);
+}
+
+TEST_F(Browsers, AValueIsReadUpTo260BytesWhateverItsType) {
+  const std::string key = AppPathsKey("Opera.exe");
+  struct Row {
+    std::string bytes;
+    int result;
+  };
+  const Row rows[] = {{std::string(259, 'p'), 1},
+                      {std::string(259, 'p') + '\0', 1},
+                      {std::string(260, 'p'), 0},
+                      {std::string(260, 'p') + '\0', 0},
+                      {"", 1}};
+  for (const Row& row : rows) {
+    SetRegistryText(key, "Path", row.bytes);
+    char data[260] = {};
+    DWORD count = sizeof(data);
+    EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, &count), row.result)
+        << row.bytes.size();
+    if (row.result == 1) {
+      EXPECT_STREQ(data, row.bytes.c_str());
+    }
+  }
+  RegistryKey opened;
+  ASSERT_TRUE(opened.Create(HKEY_LOCAL_MACHINE, key.c_str()));
+  constexpr DWORD kBinary = 3;
+  const BYTE bytes[] = {'%', 'x', '%'};
+  ASSERT_EQ(RegSetValueExA(opened.get(), "Path", 0, kBinary, bytes, sizeof(bytes)), ERROR_SUCCESS);
+  char data[260] = {};
+  DWORD count = sizeof(data);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, &count), 1);
+  EXPECT_STREQ(data, "%x%");
+
+  count = sizeof(data);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, "", "Path", data, &count), 0);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", nullptr, &count), 0);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, nullptr), 0);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Absent", data, &count), 0);
+  count = 0;
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, &count), 0);
+}
+
+}  // namespace

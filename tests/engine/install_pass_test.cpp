@@ -1,0 +1,127 @@
+// What the install pass does at its edges.
+#include "engine/install_pass.h"
+
+#include <algorithm>
+
+#include "tests/support/allocation_faults.h"
+#include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
+
+namespace {
+
+using Strings = std::vector<std::string>;
+
+class InstallPass : public ProductTest {
+ protected:
+  InstallPass() {
+    ImageBuilder()
+        .Add("a.dll", "%INSTALL_DIR%;%SYS_DIR%\\sub", "aaaa")
+        .Add("b.dll", "%INSTALL_DIR%", "bbbb")
+        .Write(&pc);
+    EXPECT_EQ(OpenPackage(&context), 1);
+  }
+
+  bool HasFiles() const { return pc.Has("drive_c/Moriv"); }
+};
+
+TEST_F(InstallPass, AStopBeforeTheFirstRecordTouchesNothing) {
+  wizardState.cancelRequested = 1;
+  EXPECT_EQ(InstallFiles(&context), StatusCancelled);
+  EXPECT_FALSE(HasFiles());
+  EXPECT_EQ(Events(), Strings{});
+  EXPECT_NE(context.packageFile, nullptr);
+  ASSERT_NE(context.records, nullptr);
+  const auto* const bytes = reinterpret_cast<const char*>(context.records);
+  EXPECT_EQ(std::count(bytes, bytes + 2 * sizeof(FileRecord), '\0'), 2 * 696);
+}
+
+TEST_F(InstallPass, AStopInAStreamLeavesNoFileOfIt) {
+  TargetList list = {};
+  ASSERT_EQ(AddTarget(&list, "C:\\Moriv\\a.dll", nullptr), 1);
+  ASSERT_EQ(AddTarget(&list, "C:\\Moriv\\b.dll", nullptr), 1);
+  wizardState.cancelRequested = 1;
+  EXPECT_EQ(InstallTargets(&context, &list, 8), StatusCancelled);
+  EXPECT_EQ(Events(), Strings{"29/2 C:\\Moriv\\a.dll"});
+  EXPECT_TRUE(HasFiles()) << "its directory stays";
+  EXPECT_FALSE(pc.Has("drive_c/Moriv/a.dll"));
+  FreeTargets(&list);
+}
+
+TEST_F(InstallPass, ATargetThatFailsLeavesThoseBeforeIt) {
+  pc.Write("drive_c/windows/system32/sub", "a file where a directory should be");
+  EXPECT_EQ(InstallFiles(&context), StatusCreateDirFailed);
+  EXPECT_EQ(Events(), (Strings{"34/0 C:\\Moriv\\a.dll", "28/2 C:\\windows\\system32\\sub\\a.dll"}));
+  EXPECT_EQ(pc.Read("drive_c/Moriv/a.dll"), "aaaa");
+  EXPECT_FALSE(pc.Has("drive_c/Moriv/b.dll"));
+}
+
+TEST_F(InstallPass, WithoutMemoryForTheRecordsThePackageIsClosed) {
+  FailAllocation(1);
+  EXPECT_EQ(InstallFiles(&context), StatusNoMemory);
+  EXPECT_EQ(Events(), Strings{"3/2"});
+  EXPECT_EQ(context.packageFile, nullptr);
+  EXPECT_EQ(InstallFiles(&context), StatusInternal);
+  EXPECT_EQ(InstallFiles(nullptr), StatusInternal);
+}
+
+TEST_F(InstallPass, WithoutMemoryForATargetTheRecordIsUnresolved) {
+  FailAllocation(3);  // the records, the first target, the second
+  EXPECT_EQ(InstallFiles(&context), StatusNoMemory);
+  EXPECT_EQ(Events(), Strings{"5/2 %INSTALL_DIR%;%SYS_DIR%\\suba.dll"});
+  EXPECT_FALSE(HasFiles());
+}
+
+TEST_F(InstallPass, TargetsNeedAPackageAListAndASize) {
+  TargetList list = {};
+  EXPECT_EQ(InstallTargets(&context, nullptr, 8), StatusInternal);
+  EXPECT_EQ(InstallTargets(&context, &list, 8), StatusInternal);
+  ASSERT_EQ(AddTarget(&list, "C:\\Moriv\\a.dll", nullptr), 1);
+  EXPECT_EQ(InstallTargets(nullptr, &list, 8), StatusInternal);
+  EXPECT_EQ(InstallTargets(&context, &list, 0), StatusInternal);
+  FreeTargets(&list);
+  ASSERT_EQ(AddTarget(&list, "abc", nullptr), 1);
+  EXPECT_EQ(InstallTargets(&context, &list, 8), StatusInternal) << "too short for a path";
+  EXPECT_EQ(Events(), Strings{"28/2 abc"});
+  FreeTargets(&list);
+}
+
+using Targets = ProductTest;
+
+TEST_F(Targets, AreAddedWholeOrNotAtAll) {
+  TargetList list = {};
+  EXPECT_EQ(AddTarget(&list, std::string(259, 'p').c_str(), std::string(259, 'd').c_str()), 1);
+  EXPECT_EQ(AddTarget(&list, "second", nullptr), 1);
+  EXPECT_EQ(AddTarget(&list, std::string(260, 'p').c_str(), nullptr), StatusBufferTooSmall);
+  EXPECT_EQ(AddTarget(&list, "p", std::string(260, 'd').c_str()), StatusBufferTooSmall);
+  EXPECT_EQ(AddTarget(&list, nullptr, "d"), StatusBadArgument);
+  EXPECT_EQ(AddTarget(nullptr, "p", "d"), StatusBadArgument);
+  FailAllocation(1);
+  EXPECT_EQ(AddTarget(&list, "p", "d"), StatusNoMemory);
+  ASSERT_EQ(list.count, 2);
+  EXPECT_EQ(list.entries[0].path, std::string(259, 'p'));
+  EXPECT_EQ(list.entries[0].directory, std::string(259, 'd'));
+  EXPECT_STREQ(list.entries[1].path, "second");
+  EXPECT_STREQ(list.entries[1].directory, "");
+  FreeTargets(&list);
+  EXPECT_EQ(list.count, 0);
+}
+
+using Directories = ProductTest;
+
+TEST_F(Directories, AreMadeFromTheTopDown) {
+  EXPECT_EQ(MakeDirectories("C:\\a\\b\\c\\file.txt"), 1);
+  EXPECT_TRUE(pc.Has("drive_c/a/b/c"));
+  EXPECT_FALSE(pc.Has("drive_c/a/b/c/file.txt"));
+  EXPECT_EQ(MakeDirectories("C:\\"), StatusInternal);
+  EXPECT_EQ(MakeDirectories(nullptr), StatusInternal);
+  EXPECT_EQ(MakeDirectories("\\a\\b"), StatusCreateDirFailed);
+  EXPECT_EQ(MakeDirectories("Q:\\a\\b"), StatusCreateDirFailed);
+  for (const size_t length : {size_t{259}, size_t{260}, size_t{5000}}) {
+    const std::string path = std::string(length, 'd') + "\\f";
+    EXPECT_EQ(MakeDirectories(path.c_str()), StatusCreateDirFailed) << length;
+  }
+  EXPECT_EQ(CopyTarget("", "C:\\x"), StatusInternal);
+  EXPECT_EQ(CopyTarget("C:\\absent", "C:\\x"), StatusCopyFailed);
+}
+
+}  // namespace

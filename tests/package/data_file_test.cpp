@@ -1,0 +1,213 @@
+// The one file class, through a handle and through a descriptor.
+#include "package/data_file.h"
+
+#include <climits>
+#include <string>
+
+#include "tests/support/allocation_faults.h"
+#include "tests/support/product_test.h"
+
+namespace {
+
+constexpr char kName[] = "C:\\a.bin";
+constexpr char kHostName[] = "drive_c/a.bin";
+
+std::string ReadAll(DataFile& file, uint32_t count) {
+  std::string bytes(count, '?');
+  bytes.resize(file.Read(bytes.data(), count));
+  return bytes;
+}
+
+bool Write(DataFile& file, const std::string& bytes) {
+  return file.Write(bytes.data(), static_cast<uint32_t>(bytes.size())) == bytes.size();
+}
+
+// What holds whichever way a file is open.
+class DataFileByEitherWay : public ProductTest, public testing::WithParamInterface<bool> {
+ protected:
+  DataFileByEitherWay() {
+    if (GetParam()) FailAllCalls("CreateFileA");
+  }
+
+  DataFile file{kName};
+};
+
+INSTANTIATE_TEST_SUITE_P(Ways, DataFileByEitherWay, testing::Bool(), [](const auto& way) {
+  return std::string(way.param ? "Descriptor" : "Handle");
+});
+
+TEST_P(DataFileByEitherWay, BytesPassUnchanged) {
+  std::string bytes = "\n\r\n\x1A";
+  for (int byte = 0; byte < 256; ++byte) bytes += static_cast<char>(byte);
+  ASSERT_EQ(file.Create(), 1);
+  EXPECT_TRUE(Write(file, bytes));
+  EXPECT_EQ(file.Tell(), static_cast<int32_t>(bytes.size()));
+  EXPECT_EQ(file.SeekTo(0), 1);
+  EXPECT_EQ(ReadAll(file, 1000), bytes) << "a file made can be read too";
+  EXPECT_EQ(ReadAll(file, 1000), "") << "at its end";
+  EXPECT_EQ(file.Close(), 1);
+  EXPECT_EQ(pc.Read(kHostName), bytes);
+
+  ASSERT_EQ(file.OpenForRead(), 1);
+  EXPECT_EQ(ReadAll(file, 4), "\n\r\n\x1A");
+  EXPECT_EQ(ReadAll(file, 0), "");
+  EXPECT_EQ(file.Read(nullptr, 4), 0u);
+  EXPECT_EQ(file.Tell(), 4);
+  EXPECT_FALSE(Write(file, "x")) << "open for reading alone";
+}
+
+TEST_P(DataFileByEitherWay, PositionsStayWhereASeekIsRefused) {
+  pc.Write(kHostName, "0123456789");
+  ASSERT_EQ(file.OpenForRead(), 1);
+  EXPECT_EQ(file.SeekTo(7), 1);
+  EXPECT_EQ(file.SeekTo(-1), 0);
+  EXPECT_EQ(file.SeekTo(INT32_MIN), 0);
+  EXPECT_EQ(file.Tell(), 7);
+  EXPECT_EQ(file.GetSize(), 10u);
+  EXPECT_EQ(file.SeekTo(INT32_MAX), 1) << "beyond the end";
+  EXPECT_EQ(file.Tell(), INT32_MAX);
+  EXPECT_EQ(ReadAll(file, 1), "");
+}
+
+TEST_P(DataFileByEitherWay, OnlyCreateMakesAFileOrCutsOne) {
+  EXPECT_EQ(file.OpenForRead(), 0);
+  EXPECT_EQ(file.OpenForWrite(), 0);
+  EXPECT_FALSE(pc.Has(kHostName));
+  pc.Write(kHostName, "old text");
+  ASSERT_EQ(file.OpenForWrite(), 1);
+  EXPECT_EQ(ReadAll(file, 1), "") << "open for writing alone";
+  EXPECT_EQ(file.SeekToEnd(), 1);
+  EXPECT_TRUE(Write(file, "er"));
+  EXPECT_EQ(file.Close(), 1);
+  EXPECT_EQ(pc.Read(kHostName), "old texter");
+  ASSERT_EQ(file.Create(), 1);
+  EXPECT_EQ(file.GetSize(), 0u);
+}
+
+TEST_P(DataFileByEitherWay, ASecondOpenChangesNothing) {
+  pc.Write(kHostName, "text");
+  ASSERT_EQ(file.OpenForRead(), 1);
+  EXPECT_EQ(ReadAll(file, 2), "te");
+  EXPECT_EQ(file.Create(), 0);
+  EXPECT_EQ(file.OpenForWrite(), 0);
+  EXPECT_EQ(file.OpenForRead(), 0);
+  EXPECT_EQ(ReadAll(file, 9), "xt");
+}
+
+TEST_P(DataFileByEitherWay, AFileMadeCanBeWrittenAgainAndDeletedWhileOpen) {
+  ASSERT_EQ(file.Create(), 1);
+  EXPECT_EQ(file.Close(), 1);
+  FailNothing();  // whichever way made it, the plain one opens it
+  ASSERT_EQ(file.OpenForWrite(), 1);
+  EXPECT_EQ(file.Close(), 1);
+  if (GetParam()) FailAllCalls("CreateFileA");
+  ASSERT_EQ(file.Create(), 1);
+  EXPECT_EQ(file.Delete(), 1);
+  EXPECT_FALSE(pc.Has(kHostName));
+  EXPECT_EQ(file.Tell(), -1) << "it is closed";
+  EXPECT_EQ(file.Delete(), 0);
+}
+
+TEST_P(DataFileByEitherWay, ADirectoryOpensInNoWay) {
+  DataFile directory("C:\\windows");
+  EXPECT_EQ(directory.OpenForRead(), 0);
+  EXPECT_EQ(directory.OpenForWrite(), 0);
+  EXPECT_EQ(directory.Create(), 0);
+  EXPECT_EQ(directory.Delete(), 0);
+  EXPECT_TRUE(pc.Has("drive_c/windows/system32"));
+}
+
+TEST_P(DataFileByEitherWay, CloseTellsTheSystemsVerdictAndIsClosedAnyway) {
+  ASSERT_EQ(file.Create(), 1);
+  FailCall(GetParam() ? "_close" : "CloseHandle");
+  EXPECT_EQ(file.Close(), 0);
+  EXPECT_EQ(file.Close(), 1);
+  EXPECT_EQ(file.Tell(), -1);
+}
+
+using DataFileTest = ProductTest;
+
+TEST_F(DataFileTest, AClosedOneKnowsItsSizeAlone) {
+  pc.Write(kHostName, "text");
+  DataFile file(kName);
+  EXPECT_EQ(file.GetSize(), 4u);
+  EXPECT_EQ(DataFile("C:\\absent").GetSize(), 0u);
+  EXPECT_FALSE(pc.Has("drive_c/absent"));
+  EXPECT_EQ(ReadAll(file, 4), "");
+  EXPECT_FALSE(Write(file, "x"));
+  EXPECT_EQ(file.SeekTo(0), 0);
+  EXPECT_EQ(file.SeekToEnd(), 0);
+  EXPECT_EQ(file.Tell(), -1);
+  EXPECT_EQ(file.Close(), 1);
+}
+
+TEST_F(DataFileTest, ANamelessOneDoesNothing) {
+  FailAllocation(1);
+  DataFile withoutMemory(kName);
+  DataFile empty("");
+  DataFile none(nullptr);
+  for (DataFile* file : {&withoutMemory, &empty, &none}) {
+    EXPECT_EQ(file->OpenForRead(), 0);
+    EXPECT_EQ(file->OpenForWrite(), 0);
+    EXPECT_EQ(file->Create(), 0);
+    EXPECT_EQ(file->Delete(), 0);
+    EXPECT_EQ(file->GetSize(), 0u);
+    EXPECT_EQ(file->Close(), 1);
+    EXPECT_EQ(file->GetName(), nullptr);
+  }
+}
+
+TEST_F(DataFileTest, TheNameIsACopy) {
+  std::string name = kName;
+  DataFile file(name.c_str());
+  name.assign(name.size(), 'x');
+  EXPECT_STREQ(file.GetName(), kName);
+}
+
+TEST_F(DataFileTest, TheFirstWayExcludesAndTheSecondShares) {
+  pc.Write(kHostName, "text");
+  DataFile first(kName);
+  DataFile second(kName);
+  ASSERT_EQ(first.OpenForRead(), 1);
+  EXPECT_EQ(second.OpenForRead(), 0);
+  EXPECT_EQ(first.Close(), 1);
+
+  FailAllCalls("CreateFileA");
+  ASSERT_EQ(first.OpenForRead(), 1);
+  ASSERT_EQ(second.OpenForRead(), 1);
+  EXPECT_EQ(ReadAll(first, 4) + ReadAll(second, 4), "texttext");
+}
+
+TEST_F(DataFileTest, AFileThatCannotBeMadeKeepsItsAttributes) {
+  FailAllCalls("CreateFileA");
+  DataFile file("C:\\windows");
+  EXPECT_EQ(file.Create(), 0);
+  EXPECT_EQ(machine::CallCount("_creat"), 1);
+  EXPECT_EQ(machine::CallCount("_chmod"), 0);
+}
+
+TEST_F(DataFileTest, FailuresOfTheSystemAreCountsOfNothing) {
+  pc.Write(kHostName, "text");
+  DataFile file(kName);
+  ASSERT_EQ(file.OpenForRead(), 1);
+  FailAllCalls("ReadFile");
+  EXPECT_EQ(ReadAll(file, 4), "");
+  FailAllCalls("GetFileSize");
+  EXPECT_EQ(file.GetSize(), 0u);
+  FailAllCalls("SetFilePointer");
+  EXPECT_EQ(file.SeekTo(1), 0);
+  EXPECT_EQ(file.SeekToEnd(), 0);
+  EXPECT_EQ(file.Tell(), -1);
+  EXPECT_EQ(file.Close(), 1);
+
+  FailAllCalls("CreateFileA");
+  ASSERT_EQ(file.OpenForRead(), 1);
+  for (const char* function : {"_read", "_lseek", "_tell"}) {
+    FailAllCalls(function);
+    EXPECT_EQ(std::string(function) == "_read" ? file.Read(&function, 4) : 0, 0u);
+    EXPECT_EQ(std::string(function) == "_lseek" ? file.GetSize() : 0, 0u);
+    EXPECT_EQ(std::string(function) == "_tell" ? file.Tell() : -1, -1);
+  }
+}
+
+}  // namespace

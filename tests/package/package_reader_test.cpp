@@ -1,0 +1,125 @@
+// The package at the tail of the program's own image.
+#include "package/package_reader.h"
+
+#include <climits>
+#include <string>
+
+#include "tests/support/allocation_faults.h"
+#include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
+
+namespace {
+
+using Strings = std::vector<std::string>;
+
+class PackageReader : public ProductTest {
+ protected:
+  // Opens an image of these bytes and leaves it open.
+  StatusCode Open(const std::string& bytes) {
+    EXPECT_EQ(CloseSetup(&context), 1);
+    pc.Write("drive_c/setup.exe", bytes);
+    pc.Restart("drive_c/setup.exe");
+    const StatusCode status = OpenPackage(&context);
+    EXPECT_EQ(context.packageFile != nullptr, status == StatusOk);
+    return status;
+  }
+};
+
+TEST_F(PackageReader, AHeaderAloneIsAnImage) {
+  ImageBuilder builder;
+  builder.executable().clear();
+  builder.header().spaceNeeded = 77;
+  const std::string header = builder.Bytes();
+  ASSERT_EQ(header.size(), 568u);
+  EXPECT_EQ(Open(header), StatusOk);
+  EXPECT_EQ(context.header.spaceNeeded, 77u);
+  EXPECT_EQ(Events(), Strings{});
+  EXPECT_EQ(Open(header.substr(1)), StatusBadPackage);
+  EXPECT_EQ(Events(), Strings{"7/2 C:\\setup.exe"}) << "no room for a header: the seek fails";
+  EXPECT_EQ(Open(""), StatusBadPackage);
+  EXPECT_EQ(Events(), Strings{"7/2 C:\\setup.exe"});
+}
+
+TEST_F(PackageReader, EveryByteOfSizeAndMagicCounts) {
+  const std::string image = ImageBuilder().Bytes();
+  const size_t header = image.size() - sizeof(PackageHeader);
+  for (size_t offset = 0; offset < offsetof(PackageHeader, recordCount); ++offset) {
+    std::string damaged = image;
+    damaged[header + offset] = static_cast<char>(damaged[header + offset] ^ 0x20);
+    EXPECT_EQ(Open(damaged), StatusBadPackage) << "byte " << offset;
+    EXPECT_EQ(Events(), Strings{"9/2 C:\\setup.exe"}) << "byte " << offset;
+  }
+  // Nothing behind them does.
+  EXPECT_EQ(Open(image.substr(0, header + 28) + std::string(540, '\xFF')), StatusOk);
+}
+
+TEST_F(PackageReader, AnImageOf2GibAndAHeaderIsTooLong) {
+  EXPECT_EQ(Open("MZ"), StatusBadPackage);
+  const uintmax_t limit = uintmax_t{INT32_MAX} + sizeof(PackageHeader);
+  std::filesystem::resize_file(pc.Host("drive_c/setup.exe"), limit);
+  EXPECT_EQ(ReadPackageHeader(&context), StatusBadPackage);
+  std::filesystem::resize_file(pc.Host("drive_c/setup.exe"), limit + 1);
+  EXPECT_EQ(ReadPackageHeader(&context), StatusBadPackage);
+  // The longer one can't even be positioned in.
+  EXPECT_EQ(Events(), (Strings{"7/2 C:\\setup.exe", "9/2 C:\\setup.exe", "7/2 C:\\setup.exe"}));
+}
+
+TEST_F(PackageReader, WithoutMemoryThereIsNoPackageAndNoEvent) {
+  ImageBuilder().Write(&pc);
+  FailAllocation(1);
+  EXPECT_EQ(OpenPackage(&context), StatusNoMemory);
+  EXPECT_EQ(context.packageFile, nullptr);
+  EXPECT_EQ(Events(), Strings{});
+  EXPECT_EQ(OpenPackage(nullptr), StatusBadPackage);
+  EXPECT_EQ(ReadPackageHeader(nullptr), StatusBadPackage);
+}
+
+TEST_F(PackageReader, CanBeReleasedAndOpenedAgain) {
+  ASSERT_EQ(Open(ImageBuilder().Bytes()), StatusOk);
+  context.records = new FileRecord[3]();
+  EXPECT_EQ(ReleasePackage(&context), StatusOk);
+  EXPECT_EQ(context.packageFile, nullptr);
+  EXPECT_EQ(context.records, nullptr);
+  EXPECT_EQ(ReleasePackage(&context), StatusOk);
+  EXPECT_EQ(OpenPackage(&context), StatusOk);
+  EXPECT_EQ(ReleasePackage(nullptr), StatusBadArgument);
+  EXPECT_EQ(CloseSetup(nullptr), StatusBadArgument);
+}
+
+TEST_F(PackageReader, ARecordIsReadWholeOrNotAtAll) {
+  ImageBuilder builder;
+  builder.executable().clear();
+  std::string bytes = builder.Add("a.dll", "%SYS_DIR%", "").Bytes().substr(0, 696);
+  const auto read = [&](const std::string& record) {
+    pc.Write("drive_c/record.bin", record);
+    DataFile file("C:\\record.bin");
+    EXPECT_EQ(file.OpenForRead(), 1);
+    FileRecord result = {};
+    return ReadFileRecord(&file, &result);
+  };
+  EXPECT_EQ(read(bytes + "behind"), 696);
+  EXPECT_EQ(read(bytes.substr(0, 695)), 0);
+  EXPECT_EQ(read(""), 0);
+  for (const char size : {'\xB7', '\xB9'}) {  // 695 and 697
+    bytes[0] = size;
+    EXPECT_EQ(read(bytes), 0);
+  }
+  FileRecord record = {};
+  DataFile closed("C:\\record.bin");
+  EXPECT_EQ(ReadFileRecord(nullptr, &record), StatusBadArgument);
+  EXPECT_EQ(ReadFileRecord(&closed, nullptr), StatusBadArgument);
+  EXPECT_EQ(ReadFileRecord(&closed, &record), 0);
+}
+
+TEST_F(PackageReader, TheImagesPathHasToFitWithItsNul) {
+  ImageBuilder().Write(&pc);
+  constexpr uint32_t kNeeded = sizeof("C:\\setup.exe");
+  char path[kNeeded] = {};
+  EXPECT_EQ(GetImagePath(path, kNeeded), StatusOk);
+  EXPECT_STREQ(path, "C:\\setup.exe");
+  EXPECT_EQ(GetImagePath(path, kNeeded - 1), StatusNoModulePath);
+  EXPECT_EQ(GetImagePath(path, 0), StatusBadArgument);
+  EXPECT_EQ(GetImagePath(nullptr, kNeeded), StatusBadArgument);
+}
+
+}  // namespace
