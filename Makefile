@@ -22,6 +22,7 @@ demo-dialog: native win32
 
 # Unit tests and scenarios, natively and under Wine; ends with CTest's own closing line.
 test: all
+	@tools/bootstrap --wine32
 	@tools/test
 
 # What keeps the house in order: tools/check says what it checks.
