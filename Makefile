@@ -3,7 +3,7 @@
 PRESETS := native win32 win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check screenshots clean bootstrap $(PRESETS)
+.PHONY: all demo demo-dialog test check screenshots win32-emulated clean bootstrap $(PRESETS)
 
 all: $(PRESETS)
 
@@ -32,6 +32,10 @@ check: all
 # Every page in five languages, from the real program under Wine, into docs/screenshots/.
 screenshots: all
 	@tools/screenshots
+
+# The 32-bit program in scenarios, in an emulator where the kernel runs no 32-bit code.
+win32-emulated: all
+	@tools/win32-emulated
 
 clean:
 	rm -rf build

@@ -16,7 +16,7 @@ from pathlib import Path
 from file_tree import FileTree
 from registry_text import Registry, Value
 
-TIME_LIMIT = 60  # seconds, for one program
+TIME_LIMIT = int(os.environ.get('MORIV_TIME_LIMIT', 60))  # seconds, for one program
 
 # What a program did: its exit code (None when it ended without one), the lines that it showed, and
 # what is wrong with the run itself, '' when nothing.
