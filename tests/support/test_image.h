@@ -15,7 +15,7 @@
 // The stream of a file's bytes.
 inline std::string PackStream(std::string_view bytes) {
   const auto* const first = reinterpret_cast<const uint8_t*>(bytes.data());
-  const std::vector<uint8_t> stream = image::StreamPacker().Pack({first, bytes.size()});
+  const std::vector<uint8_t> stream = image::PackStream({first, bytes.size()}, image::kPackFast);
   return {stream.begin(), stream.end()};
 }
 

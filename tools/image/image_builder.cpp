@@ -9,6 +9,7 @@
 #include "tools/image/image_contents.h"
 #include "tools/image/output_file.h"
 #include "tools/image/package_description.h"
+#include "tools/image/parallel_packer.h"
 #include "tools/image/progress_bar.h"
 #include "tools/image/record_text.h"
 #include "tools/image/stream_format.h"
@@ -156,21 +157,27 @@ class ImageBuilder {
 
   void WriteRecords(OutputFile* output) {
     ProgressBar progress("packing", sizes_);
-    StreamPacker packer;
+    ParallelPacker packer(description_.isRemoval ? 0 : records_.size(),
+                          [&](size_t i) { return PackSource(i, &progress); });
     for (size_t i = 0; i < records_.size(); ++i) {
       FileRecord& record = records_[i];
       std::vector<uint8_t> stream;
-      if (!description_.isRemoval) {
-        const std::filesystem::path source = SourceOf(description_.files[i]);
-        const std::vector<uint8_t> bytes = ReadWholeFile(source, kLargestSize);
-        if (bytes.size() != record.fileSize) throw BadInput(source, "changed meanwhile; try again");
-        stream = packer.Pack(bytes, [&progress](size_t count) { progress.Advance(count); });
-      }
+      if (!description_.isRemoval) stream = packer.Take(i);
       Advance(sizeof record + stream.size());
       record.storedSize = static_cast<uint32_t>(stream.size());
       output->Write(BytesOf(record));
       output->Write(stream);
     }
+  }
+
+  // Called from several threads at a time, when the records are complete but for their storedSize.
+  std::vector<uint8_t> PackSource(size_t i, ProgressBar* progress) const {
+    const std::filesystem::path source = SourceOf(description_.files[i]);
+    const std::vector<uint8_t> bytes = ReadWholeFile(source, kLargestSize);
+    if (bytes.size() != records_[i].fileSize)
+      throw BadInput(source, "changed meanwhile; try again");
+    return PackStream(bytes, order_.best ? kPackBest : kPackFast,
+                      [progress](size_t count) { progress->Advance(count); });
   }
 
   void Advance(uint64_t bytes) {

@@ -11,6 +11,7 @@ struct PackOrder {
   std::filesystem::path output;
   std::filesystem::path sourceFolder;  // "": the folder of the description
   bool allowUnknownMacros = false;
+  bool best = false;  // the smallest image, at many times the time
 };
 
 // Writes an image that is a function of the bytes of the description, the stub and the sources.

@@ -74,6 +74,7 @@ class ImageTool {
                         "Folder of the files, if not PACKAGE's");
     command->add_flag("--allow-unknown-macros", pack_.allowUnknownMacros,
                       "Take %...% words that are no macro as names");
+    command->add_flag("--best", pack_.best, "Make the image as small as can be; takes much longer");
     command->callback([this] { PackImage(pack_); });
   }
 

@@ -1,7 +1,9 @@
 #include <iostream>
 
 #include "tools/image/image_command_line.h"
+#include "tools/image/temporary_files.h"
 
 int main(int argc, char** argv) {
+  image::DeleteTemporaryFilesOnSignal();
   return image::RunImageTool(argc, argv, std::cout, std::cerr);
 }

@@ -4,10 +4,10 @@
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstdlib>
 #include <string>
 
 #include "tools/image/bad_input.h"
+#include "tools/image/temporary_files.h"
 
 namespace image {
 namespace {
@@ -29,7 +29,7 @@ OutputFile::OutputFile(const std::filesystem::path& target, Kind kind) : target_
   }
   const std::filesystem::path folder = target.has_parent_path() ? target.parent_path() : ".";
   std::string name = (folder / ".moriv-XXXXXX").string();
-  const int descriptor = mkstemp(name.data());
+  const int descriptor = MakeTemporaryFile(&name);
   if (descriptor < 0) Fail(errno);
   temporary_ = name;
   fchmod(descriptor, UsualMode(kind));
@@ -38,6 +38,7 @@ OutputFile::OutputFile(const std::filesystem::path& target, Kind kind) : target_
     const int reason = errno;
     close(descriptor);
     unlink(temporary_.c_str());
+    ForgetTemporaryFile(temporary_);
     Fail(reason);
   }
 }
@@ -45,6 +46,7 @@ OutputFile::OutputFile(const std::filesystem::path& target, Kind kind) : target_
 OutputFile::~OutputFile() {
   if (file_ != nullptr) std::fclose(file_);
   if (!committed_) unlink(temporary_.c_str());
+  ForgetTemporaryFile(temporary_);
 }
 
 void OutputFile::Write(std::span<const uint8_t> bytes) {

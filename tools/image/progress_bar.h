@@ -1,9 +1,10 @@
-// A progress bar on standard error, shown only on a terminal and only for work of more than a
-// second. It takes itself away at the end.
+// A progress bar on standard error with rate and time left, shown only on a terminal and only for
+// work of more than a second. It takes itself away at the end.
 #pragma once
 
 #include <chrono>
 #include <cstdint>
+#include <mutex>
 #include <string>
 
 namespace image {
@@ -17,20 +18,22 @@ class ProgressBar {
   ProgressBar(const ProgressBar&) = delete;
   ProgressBar& operator=(const ProgressBar&) = delete;
 
-  // So many bytes more are done.
+  // So many bytes more are done. May be called from any thread.
   void Advance(uint64_t bytes);
 
  private:
   using Clock = std::chrono::steady_clock;
 
-  void Draw();
+  void Draw(Clock::time_point now);
 
+  std::mutex mutex_;  // guards what changes
   std::string task_;
   uint64_t total_;
   uint64_t done_ = 0;
   bool onTerminal_;
   bool shown_ = false;
-  Clock::time_point nextDraw_;
+  const Clock::time_point start_ = Clock::now();
+  Clock::time_point nextDraw_ = start_ + std::chrono::seconds(1);
 };
 
 }  // namespace image

@@ -12,35 +12,23 @@
 
 namespace image {
 
-class StreamPacker {
- public:
-  // Called now and then with the bytes of the file that were taken since the last call.
-  using Progress = std::function<void(size_t)>;
-
-  StreamPacker();
-
-  // The whole stream, its magic included; an empty file gives the magic and one zero byte, the
-  // shortest stream that an expander takes.
-  std::vector<uint8_t> Pack(std::span<const uint8_t> file, const Progress& progress = nullptr);
-
- private:
-  struct Slot {
-    uint32_t key;   // prefix code and byte of a table entry, kFreeSlot when there is none
-    uint16_t code;  // of the entry
-  };
-
-  void Reset();
-  Slot& FindSlot(uint32_t prefix, uint8_t byte);
-  void PutCode(uint32_t code);
-  void FollowDecoder();
-
-  std::vector<uint8_t> stream_;
-  std::vector<Slot> slots_;
-  uint32_t pendingBits_ = 0;  // the last pendingCount_ bits are not yet in stream_
-  unsigned pendingCount_ = 0;
-  unsigned width_ = 0;
-  uint32_t decoderNext_ = 0;  // the decoder's next free code, once it has read all that was put
-  bool atStart_ = false;      // no code put since the start or the last reset
+// How a stream is made. Every choice gives a stream that any decoder of the format takes.
+struct PackMethod {
+  bool looksAhead;   // shorten a phrase where the next one then reaches further
+  bool plansResets;  // empty the table where that pays, not only when it is full
 };
+
+// Always the longest string that the table has: what the format's plainest packer does.
+inline constexpr PackMethod kPackGreedily = {false, false};
+inline constexpr PackMethod kPackFast = {true, false};
+// The shortest, and about 16 times as slow.
+inline constexpr PackMethod kPackBest = {true, true};
+
+// The whole stream, its magic included; an empty file gives the magic and one zero byte, the
+// shortest stream that an expander takes.
+//
+//   progress  called now and then with the bytes of the file that were taken since the last call
+std::vector<uint8_t> PackStream(std::span<const uint8_t> file, const PackMethod& method,
+                                const std::function<void(size_t)>& progress = nullptr);
 
 }  // namespace image
