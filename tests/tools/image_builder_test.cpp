@@ -2,10 +2,16 @@
 
 #include "tools/image/image_builder.h"
 
+#include <unistd.h>
+
+#include <csignal>
 #include <string>
+#include <utility>
 
 #include "tests/tools/tool_bench.h"
+#include "tools/image/output_file.h"
 #include "tools/image/record_text.h"
+#include "tools/image/temporary_files.h"
 
 namespace {
 
@@ -78,6 +84,67 @@ TEST_F(ImageBuilder, DependsOnNothingButItsInputs) {
                                 "@second.exe", "--source-dir", "@"});
   ASSERT_EQ(run.status, 0) << run.err;
   EXPECT_TRUE(Read("image.exe") == Read("second.exe"));
+}
+
+TEST_F(ImageBuilder, MakesASmallerImageWithBest) {
+  PackSample();
+  std::vector<uint8_t> changing = RandomBytes(20'000, 1);  // then another kind of bytes
+  for (int line = 0; line < 20'000; ++line) {
+    for (const char byte : std::to_string(line * 7) + "\r\n")
+      changing.push_back(static_cast<uint8_t>(byte));
+  }
+  Write("a.exe", changing);
+  const std::vector<std::string> pack = {"pack", "@setup.toml", "--stub", "@stub.exe", "-o"};
+  std::vector<std::string> fast = pack;
+  std::vector<std::string> best = pack;
+  fast.emplace_back("@fast.exe");
+  best.insert(best.end(), {"@best.exe", "--best"});
+  ASSERT_EQ(RunImage(fast).status, 0);
+  ASSERT_EQ(RunImage(best).status, 0);
+  EXPECT_LT(Read("best.exe").size(), Read("fast.exe").size());
+  EXPECT_EQ(RunImage({"verify", "@best.exe"}).status, 0);
+}
+
+TEST_F(ImageBuilder, LeavesNothingWhenItIsInterrupted) {
+  const auto interrupt = [this] {
+    image::DeleteTemporaryFilesOnSignal();
+    const image::OutputFile one(Path("one.exe"), image::OutputFile::Kind::kProgram);
+    const image::OutputFile two(Path("two.exe"), image::OutputFile::Kind::kProgram);
+    if (NamesIn(".").size() == 2) kill(getpid(), SIGTERM);
+    sleep(60);
+  };
+  EXPECT_EXIT(interrupt(), testing::KilledBySignal(SIGTERM), "");
+  EXPECT_TRUE(NamesIn(".").empty());
+}
+
+TEST_F(ImageBuilder, RefusesMoreThanTheFormatHolds) {
+  PackSample();
+  const std::string file = "[[file]]\nsource = 'empty.txt'\nname = 'x'\ndestination = '";
+  std::string tooMany;
+  for (int i = 0; i < 65536; ++i) tooMany += file + std::to_string(i) + "'\n";
+  const uint64_t gibibyte = uint64_t{1} << 30;
+  for (const auto& [name, size] : {std::pair{"half.bin", gibibyte}, {"whole.bin", 2 * gibibyte}}) {
+    Write(name, std::string());
+    std::filesystem::resize_file(Path(name), size);  // takes no room
+  }
+  const struct {
+    std::string description, stub, said;
+  } rows[] = {
+      {tooMany, "@stub.exe", ":262142: more than 65535 files"},
+      {"[[file]]\nsource = 'whole.bin'\ndestination = 'x'\n", "@stub.exe",
+       "whole.bin: has 2 GiB or more"},
+      {"[[file]]\nsource = 'half.bin'\ndestination = 'x'\n"
+       "[[file]]\nsource = 'half.bin'\ndestination = 'y'\n",
+       "@stub.exe", "2 GiB or more together"},
+      {SampleDescription(), "@whole.bin", "whole.bin: has 2 GiB or more"},
+  };
+  for (const auto& row : rows) {
+    Write("full.toml", row.description);
+    const ToolRun run = RunImage({"pack", "@full.toml", "--stub", row.stub, "-o", "@new.exe"});
+    EXPECT_EQ(run.status, 2) << row.said;
+    EXPECT_NE(run.err.find(row.said), std::string::npos) << run.err;
+    EXPECT_FALSE(std::filesystem::exists(Path("new.exe")));
+  }
 }
 
 TEST_F(ImageBuilder, MakesARemovalProgramOfADescriptionThatSaysSo) {
