@@ -7,10 +7,12 @@
 
 #include <random>
 #include <string>
+#include <utility>
 
 #include "tests/support/plain_expander.h"
 #include "tests/tools/tool_bench.h"
 #include "tools/image/parallel_packer.h"
+#include "tools/image/phrase_parser.h"
 
 namespace {
 
@@ -145,6 +147,20 @@ TEST(StreamPacker, MakesShorterStreamsWithMoreWork) {
   const size_t best = PackStream(file, image::kPackBest).size();
   EXPECT_LT(fast, greedy - greedy / 50) << greedy;
   EXPECT_LT(best, fast - fast / 50) << greedy;
+}
+
+// So that a life ends where it was planned to, and costs what was planned.
+TEST(PhraseParser, CutsAPhraseOffWhereALifeEnds) {
+  const Bytes file = {'a', 'b', 'a', 'b', 'a', 'b', 'a'};  // a, b, ab, aba
+  image::PhraseParser parser(file, true);
+  for (const auto& [end, code] : {std::pair{5u, uint32_t{'a'}}, {6u, 259u}, {7u, 261u}}) {
+    parser.Restart(0);
+    image::Phrase phrase;
+    while (parser.Position() < end) phrase = parser.NextUpTo(end);
+    EXPECT_EQ(parser.Position(), end);
+    EXPECT_EQ(phrase.code, code);
+    EXPECT_EQ(phrase.length, end - 4);
+  }
 }
 
 TEST(ParallelPacker, GivesTheSameStreamsHoweverManyThreadsPack) {

@@ -4,7 +4,7 @@
 
 namespace image {
 
-ParallelPacker::ParallelPacker(size_t count, Job job, unsigned threads) {
+ParallelPacker::ParallelPacker(size_t count, const Job& job, unsigned threads) {
   for (size_t file = 0; file < count; ++file) {
     streams_.push_back(tasks_.emplace_back([job, file] { return job(file); }).get_future());
   }

@@ -19,7 +19,8 @@ class ParallelPacker {
   using Job = std::function<Stream(size_t)>;
 
   // Begins to pack the files 0 to `count` - 1, in this order.
-  ParallelPacker(size_t count, Job job, unsigned threads = std::thread::hardware_concurrency());
+  ParallelPacker(size_t count, const Job& job,
+                 unsigned threads = std::thread::hardware_concurrency());
   // Files that are not begun are left out.
   ~ParallelPacker();
   ParallelPacker(const ParallelPacker&) = delete;

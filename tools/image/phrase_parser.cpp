@@ -13,7 +13,7 @@ namespace image {
 namespace {
 
 // Keeps the time for files of long runs in bounds; in others phrases are hardly ever longer.
-constexpr size_t kMostShortened = 64;
+constexpr size_t kMostShortened = 32;
 
 }  // namespace
 
