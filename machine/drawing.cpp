@@ -173,12 +173,12 @@ HBRUSH CreateSolidBrush(COLORREF color) {
 
 // An object that is selected somewhere can't be deleted.
 BOOL DeleteObject(HGDIOBJ handle) {
-  if (CallFails("DeleteObject")) return FALSE;
+  const bool fails = CallFails("DeleteObject");
   const GraphicsObject* const object = FindObject(handle);
   if (object == nullptr || object->timesSelected > 0) return FALSE;
   machine::ObjectClosed(object->kind);
   objects.erase(handle);
-  return TRUE;
+  return !fails;
 }
 
 HDC GetDC(HWND) {
@@ -188,9 +188,10 @@ HDC GetDC(HWND) {
 }
 
 int ReleaseDC(HWND, HDC dc) {
-  if (CallFails("ReleaseDC") || !CloseContext(dc)) return 0;
+  const bool fails = CallFails("ReleaseDC");
+  if (!CloseContext(dc)) return 0;
   machine::ObjectClosed(ObjectKind::kDeviceContext);
-  return 1;
+  return fails ? 0 : 1;
 }
 
 HDC CreateCompatibleDC(HDC) {
@@ -200,9 +201,10 @@ HDC CreateCompatibleDC(HDC) {
 }
 
 BOOL DeleteDC(HDC dc) {
-  if (CallFails("DeleteDC") || !CloseContext(dc)) return FALSE;
+  const bool fails = CallFails("DeleteDC");
+  if (!CloseContext(dc)) return FALSE;
   machine::ObjectClosed(ObjectKind::kDeviceContext);
-  return TRUE;
+  return !fails;
 }
 
 HGDIOBJ SelectObject(HDC dc, HGDIOBJ handle) {

@@ -5,6 +5,7 @@
 #include <map>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace machine {
 namespace {
@@ -12,6 +13,7 @@ namespace {
 constexpr int kStopStatus = 4;
 
 std::vector<Fault> faults;
+std::function<void()> strikeObserver;
 std::map<std::string, int, std::less<>> callCounts;
 
 bool Strikes(const Fault& fault, std::string_view function, int call) {
@@ -19,22 +21,36 @@ bool Strikes(const Fault& fault, std::string_view function, int call) {
          (call == fault.call || (fault.fromThenOn && call > fault.call));
 }
 
+// Counts the call. Returns the fault that strikes it, or null.
+const Fault* CountCall(const char* function) {
+  const int call = ++callCounts[function];
+  for (const Fault& fault : faults) {
+    if (!Strikes(fault, function, call)) continue;
+    if (strikeObserver) strikeObserver();
+    if (fault.stop) _exit(kStopStatus);
+    return &fault;
+  }
+  return nullptr;
+}
+
 }  // namespace
 
-void SetFaults(const std::vector<Fault>& newFaults) {
+void SetFaults(const std::vector<Fault>& newFaults, std::function<void()> observer) {
   faults = newFaults;
+  strikeObserver = std::move(observer);
   callCounts.clear();
 }
 
 bool CallFails(const char* function, DWORD* error) {
-  const int call = ++callCounts[function];
-  for (const Fault& fault : faults) {
-    if (!Strikes(fault, function, call)) continue;
-    if (fault.stop) _exit(kStopStatus);
-    if (error != nullptr) *error = fault.error;
-    return true;
-  }
-  return false;
+  const Fault* const fault = CountCall(function);
+  if (fault != nullptr && error != nullptr) *error = fault->error;
+  return fault != nullptr;
+}
+
+bool TransferFails(const char* function, DWORD* count) {
+  const Fault* const fault = CountCall(function);
+  if (fault != nullptr && fault->isShort) *count /= 2;
+  return fault != nullptr && !fault->isShort;
 }
 
 int CallCount(const char* function) {

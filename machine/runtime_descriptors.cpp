@@ -13,6 +13,7 @@ using machine::CallFails;
 using machine::ObjectKind;
 using machine::OpenFile;
 using machine::OpenMode;
+using machine::TransferFails;
 
 namespace {
 
@@ -107,7 +108,7 @@ int _setmode(int descriptor, int mode) {
 
 // The runtime also reads CR LF as LF in text mode. Nobody reads text that way here, so it fails.
 int _read(int descriptor, void* buffer, unsigned count) {
-  if (CallFails("_read")) return -1;
+  if (TransferFails("_read", &count)) return -1;
   OpenFile* const file = FileOf(descriptor);
   if (file == nullptr || file->text || count > INT32_MAX) return -1;
   if (buffer == nullptr && count != 0) return -1;
@@ -117,7 +118,7 @@ int _read(int descriptor, void* buffer, unsigned count) {
 
 // Answers the caller's bytes; the CRs that text mode adds are not counted.
 int _write(int descriptor, const void* buffer, unsigned count) {
-  if (CallFails("_write")) return -1;
+  if (TransferFails("_write", &count)) return -1;
   OpenFile* const file = FileOf(descriptor);
   if (file == nullptr || count > INT32_MAX || (buffer == nullptr && count != 0)) return -1;
   bool written;

@@ -20,6 +20,7 @@ namespace {
 
 struct User {
   UserScript script;
+  std::function<void()> turn;         // of a user without a script
   std::deque<UserLine> duringClicks;  // wait for the running step's next poll
   int polls = 0;
 };
@@ -168,6 +169,10 @@ bool LoadUser(const std::filesystem::path& script, std::string* error) {
   return true;
 }
 
+void SetUser(std::function<void()> turn) {
+  user.emplace().turn = std::move(turn);
+}
+
 void ForgetUser() {
   user.reset();
 }
@@ -182,6 +187,10 @@ void RequireUser() {
 
 void TakeUserTurn() {
   DrawControls();
+  if (user->turn) {
+    user->turn();
+    return;
+  }
   if (!user->duringClicks.empty()) {
     // The start-up that these were meant for did not poll: they reach the idle dialog.
     Act(TakeFirst(&user->duringClicks));
@@ -215,6 +224,7 @@ int AnswerBox(const std::string& caption, const std::string& text, UINT type) {
     TellUser(box + " ok");
     return IDOK;
   }
+  if (user->turn) return IDYES;
   if (user->script.answers.empty()) Fail(user->script.file + ": no answer to " + box);
   const UserLine answer = TakeFirst(&user->script.answers);
   if (answer.verb == UserVerb::kAnswerLate) {

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <filesystem>
+#include <functional>
 #include <string>
 
 #include "platform/win32.h"
@@ -14,6 +15,9 @@ namespace machine {
 
 // Reads the script. False with "FILE:LINE: what" in `error`.
 bool LoadUser(const std::filesystem::path& script, std::string* error);
+// A user without a script, who decides: `turn` is called each time that the dialog is idle, and a
+// question is answered with yes.
+void SetUser(std::function<void()> turn);
 // Back to a machine without a user.
 void ForgetUser();
 

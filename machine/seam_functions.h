@@ -104,4 +104,9 @@ inline bool IsSeamFunction(std::string_view name) {
   return std::ranges::find(kSeamFunctions, name) != std::ranges::end(kSeamFunctions);
 }
 
+// Whether a call can move fewer bytes than it was asked to.
+inline bool MovesBytes(std::string_view name) {
+  return name == "ReadFile" || name == "WriteFile" || name == "_read" || name == "_write";
+}
+
 }  // namespace machine

@@ -112,6 +112,18 @@ bool TakeFail(const std::string& text, std::vector<Fault>* faults) {
   return true;
 }
 
+// NAME N [on], of a function that moves bytes
+bool TakeShort(const std::string& text, std::vector<Fault>* faults) {
+  const std::vector<std::string> words = SplitWords(text);
+  Fault fault;
+  fault.isShort = true;
+  fault.fromThenOn = words.size() == 3 && words[2] == "on";
+  if (!TakeCall(words, &fault) || !MovesBytes(fault.function)) return false;
+  if (words.size() != 2 && !fault.fromThenOn) return false;
+  faults->push_back(fault);
+  return true;
+}
+
 // NAME N
 bool TakeStop(const std::string& text, std::vector<Fault>* faults) {
   const std::vector<std::string> words = SplitWords(text);
@@ -179,6 +191,10 @@ const SettingRow kSettingRows[] = {
     {"faults", "fail", "FUNCTION N [on] [ERROR]",
      [](Settings& settings, char, const std::string& value) {
        return TakeFail(value, &settings.faults);
+     }},
+    {"faults", "short", "FUNCTION N [on] of a function that moves bytes",
+     [](Settings& settings, char, const std::string& value) {
+       return TakeShort(value, &settings.faults);
      }},
     {"faults", "stop", "FUNCTION N",
      [](Settings& settings, char, const std::string& value) {

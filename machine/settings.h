@@ -12,11 +12,13 @@
 
 namespace machine {
 
-// One line of [faults]. `fail` makes calls fail; `stop` ends the process at the call.
+// One line of [faults]. `fail` makes calls fail, `short` makes them move fewer bytes than they were
+// asked to; `stop` ends the process at the call.
 struct Fault {
   std::string function;     // a function of the seam, by its Win32 name
   int call = 1;             // counted from 1
   bool fromThenOn = false;  // this call and all later ones
+  bool isShort = false;
   bool stop = false;
   DWORD error = ERROR_ACCESS_DENIED;
 };

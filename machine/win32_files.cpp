@@ -21,6 +21,7 @@ using machine::Location;
 using machine::ObjectKind;
 using machine::OpenFile;
 using machine::OpenMode;
+using machine::TransferFails;
 
 namespace {
 
@@ -110,7 +111,7 @@ HANDLE CreateFileA(LPCSTR name, DWORD access, DWORD share, LPSECURITY_ATTRIBUTES
 
 BOOL ReadFile(HANDLE handle, LPVOID buffer, DWORD count, LPDWORD done, OVERLAPPED* overlapped) {
   if (done != nullptr) *done = 0;
-  if (CallFails("ReadFile")) return FALSE;
+  if (TransferFails("ReadFile", &count)) return FALSE;
   OpenFile* const file = FileOf(handle);
   if (file == nullptr || done == nullptr || overlapped != nullptr) return FALSE;
   if (buffer == nullptr && count != 0) return FALSE;
@@ -122,7 +123,7 @@ BOOL ReadFile(HANDLE handle, LPVOID buffer, DWORD count, LPDWORD done, OVERLAPPE
 
 BOOL WriteFile(HANDLE handle, LPCVOID buffer, DWORD count, LPDWORD done, OVERLAPPED* overlapped) {
   if (done != nullptr) *done = 0;
-  if (CallFails("WriteFile")) return FALSE;
+  if (TransferFails("WriteFile", &count)) return FALSE;
   OpenFile* const file = FileOf(handle);
   if (file == nullptr || done == nullptr || overlapped != nullptr) return FALSE;
   if (buffer == nullptr && count != 0) return FALSE;

@@ -110,14 +110,15 @@ HMODULE LoadLibraryA(LPCSTR name) {
   return HandleOf(library->address);
 }
 
-// Windows lets a process free kernel32 as often as it likes; here each call needs its own load.
+// Windows lets a process free kernel32 as often as it likes; here each call needs its own load. A
+// fault makes the answer a failure; the library is freed all the same.
 BOOL FreeLibrary(HMODULE module) {
-  if (machine::CallFails("FreeLibrary")) return FALSE;
+  const bool fails = machine::CallFails("FreeLibrary");
   Library* library = FindLibrary(module);
   if (library == nullptr || library->references == 0) return FALSE;
   --library->references;
   ObjectClosed(machine::ObjectKind::kModule);
-  return TRUE;
+  return !fails;
 }
 
 // Functions by name alone: a name below 0x10000 is an ordinal.

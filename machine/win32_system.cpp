@@ -129,12 +129,13 @@ BOOL GlobalUnlock(HGLOBAL handle) {
   return block.locks > 0 ? TRUE : FALSE;
 }
 
+// A fault makes the answer a failure; the block is freed all the same.
 HGLOBAL GlobalFree(HGLOBAL handle) {
-  if (machine::CallFails("GlobalFree")) return handle;
+  const bool fails = machine::CallFails("GlobalFree");
   if (handle == nullptr) return nullptr;
   if (memoryBlocks.erase(handle) == 0) return handle;
   ObjectClosed(machine::ObjectKind::kMemoryBlock);
-  return nullptr;
+  return fails ? handle : nullptr;
 }
 
 }  // extern "C"

@@ -74,7 +74,8 @@ TEST(Machine, StopTellsAndForgetsWhatIsOpen) {
 
 TEST(Faults, StrikeTheNthCallOnceOrFromThenOn) {
   TestMachine pc(
-      "[faults]\nfail = CreateDirectoryA 2\nfail = RemoveDirectoryA 2 on\nfail = CloseHandle 1\n");
+      "[faults]\nfail = CreateDirectoryA 2\nfail = RemoveDirectoryA 2 on\nfail = CloseHandle 1\n"
+      "short = WriteFile 2\n");
   EXPECT_TRUE(CreateDirectoryA("C:\\a", nullptr));
   EXPECT_FALSE(CreateDirectoryA("C:\\b", nullptr));
   EXPECT_TRUE(CreateDirectoryA("C:\\b", nullptr));
@@ -88,6 +89,15 @@ TEST(Faults, StrikeTheNthCallOnceOrFromThenOn) {
   EXPECT_TRUE(CopyFileA("C:\\file", "C:\\copy", FALSE));
   EXPECT_EQ(machine::CallCount("CreateFileA"), 1);
   EXPECT_EQ(machine::CallCount("CloseHandle"), 1);
+
+  const HANDLE file = Create("C:\\file");
+  DWORD done = 0;
+  for (const DWORD expected : {5u, 2u, 5u}) {
+    EXPECT_TRUE(WriteFile(file, "12345", 5, &done, nullptr));
+    EXPECT_EQ(done, expected);
+  }
+  CloseHandle(file);
+  EXPECT_EQ(pc.Read("drive_c/file"), "123451212345");
   EXPECT_EQ(machine::Stop(), "");
 }
 

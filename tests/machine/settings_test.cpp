@@ -37,6 +37,7 @@ TEST(Settings, EveryKeyIsRead) {
                   "fail = WriteFile 3\n"
                   "fail = _write 2 on 112\n"
                   "fail = RegOpenKeyExA 1 2\n"
+                  "short = ReadFile 7 on\n"
                   "stop = DeleteFileA 4",
                   &settings),
             "");
@@ -55,14 +56,16 @@ TEST(Settings, EveryKeyIsRead) {
   EXPECT_TRUE(settings.disks['D'].readOnly);
   EXPECT_FALSE(settings.disks['D'].writable.has_value());
   EXPECT_FALSE(settings.hasGetDiskFreeSpaceEx);
-  ASSERT_EQ(settings.faults.size(), 4u);
+  ASSERT_EQ(settings.faults.size(), 5u);
   EXPECT_EQ(settings.faults[0].error, 5u);
   EXPECT_TRUE(settings.faults[1].fromThenOn);
   EXPECT_EQ(settings.faults[1].error, 112u);
   EXPECT_FALSE(settings.faults[2].fromThenOn);
   EXPECT_EQ(settings.faults[2].error, 2u);
-  EXPECT_TRUE(settings.faults[3].stop);
-  EXPECT_EQ(settings.faults[3].call, 4);
+  EXPECT_TRUE(settings.faults[3].isShort);
+  EXPECT_TRUE(settings.faults[3].fromThenOn);
+  EXPECT_TRUE(settings.faults[4].stop);
+  EXPECT_EQ(settings.faults[4].call, 4);
 }
 
 TEST(Settings, MistakesNameTheirLineAndTheirKey) {
@@ -92,6 +95,8 @@ TEST(Settings, MistakesNameTheirLineAndTheirKey) {
       {"[faults]\nfail = WriteFile 0\n", ":2: [faults] fail"},
       {"[faults]\nfail = WriteFile 1 off\n", ":2: [faults] fail"},
       {"[faults]\nfail = WriteFile 1 on 5 5\n", ":2: [faults] fail"},
+      {"[faults]\nshort = WriteFile 1 5\n", ":2: [faults] short"},
+      {"[faults]\nshort = DeleteFileA 1\n", ":2: [faults] short"},
       {"[faults]\nstop = WriteFile 1 on\n", ":2: [faults] stop"},
       {"[system]\nnonsense\nplatform = xp\n", ":2: neither [SECTION] nor KEY = VALUE"},
       {"[system]\nplatform = xp\nnonsense\n", ":2: [system] platform"},
