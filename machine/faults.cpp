@@ -13,7 +13,7 @@ namespace {
 constexpr int kStopStatus = 4;
 
 std::vector<Fault> faults;
-std::function<void()> strikeObserver;
+std::function<void(const Fault&)> strikeObserver;
 std::map<std::string, int, std::less<>> callCounts;
 
 bool Strikes(const Fault& fault, std::string_view function, int call) {
@@ -26,7 +26,7 @@ const Fault* CountCall(const char* function) {
   const int call = ++callCounts[function];
   for (const Fault& fault : faults) {
     if (!Strikes(fault, function, call)) continue;
-    if (strikeObserver) strikeObserver();
+    if (strikeObserver) strikeObserver(fault);
     if (fault.stop) _exit(kStopStatus);
     return &fault;
   }
@@ -35,7 +35,7 @@ const Fault* CountCall(const char* function) {
 
 }  // namespace
 
-void SetFaults(const std::vector<Fault>& newFaults, std::function<void()> observer) {
+void SetFaults(const std::vector<Fault>& newFaults, std::function<void(const Fault&)> observer) {
   faults = newFaults;
   strikeObserver = std::move(observer);
   callCounts.clear();

@@ -9,8 +9,8 @@
 namespace machine {
 
 // Replaces all faults and sets every function's count of calls to 0. `observer` (may be empty) is
-// called each time that a fault strikes, ahead of its effect.
-void SetFaults(const std::vector<Fault>& faults, std::function<void()> observer = {});
+// called with each fault that strikes, ahead of its effect.
+void SetFaults(const std::vector<Fault>& faults, std::function<void(const Fault&)> observer = {});
 
 // Counts one call of `function` and asks whether it is to fail; every function of the seam begins
 // with this question, so that only the program's own calls count. When the answer is true,
