@@ -21,11 +21,12 @@ bool BuildFolderPath(const char* service, int32_t kind, ProductPath& path) {
          AppendText(path, "\\") && AppendText(path, SubKeyFolder(kind));
 }
 
-// Deletes `folder`\`name` below an open key.
+// Deletes `folder`\`name` below an open key. One that an earlier deletion took is no refusal.
 bool DeleteBelow(const RegistryKey& key, const char* folder, const char* name) {
   ProductPath path;
-  return FormatText(path, sizeof(path), "%s\\%s", folder, name) &&
-         RegDeleteKeyA(key.get(), path) == ERROR_SUCCESS;
+  if (!FormatText(path, sizeof(path), "%s\\%s", folder, name)) return false;
+  const LSTATUS status = RegDeleteKeyA(key.get(), path);
+  return status == ERROR_SUCCESS || status == ERROR_FILE_NOT_FOUND;
 }
 
 int32_t DeleteRoot() {
