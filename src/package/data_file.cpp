@@ -49,8 +49,9 @@ int DataFile::OpenDescriptor(DWORD access, DWORD disposition) {
     if (descriptor_ == -1) return 0;
     _chmod(name_, kOwnerMayReadAndWrite);
     // creat opens in text mode, where each line feed would grow a carriage return.
-    _setmode(descriptor_, _O_BINARY);
-    return 1;
+    if (_setmode(descriptor_, _O_BINARY) != -1) return 1;
+    (void)Delete();  // a file that would come out changed is none
+    return 0;
   }
   const int direction = access == GENERIC_READ ? _O_RDONLY : _O_WRONLY;
   descriptor_ = _sopen(name_, direction | _O_BINARY, _SH_DENYNO);
