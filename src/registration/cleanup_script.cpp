@@ -34,6 +34,7 @@ bool WriteLines(DataFile* file) {
   char log[kCatalogTextSize] = {};
   LoadCatalogText(nullptr, CatalogRemovalProgram, program);
   LoadCatalogText(nullptr, CatalogLogName, log);
+  if (program[0] == '\0' || log[0] == '\0') return false;
   return WriteFormat(file, "[%s]\r\n%s=%s\r\n", "Version", "Signature", "$Chicago$") &&
          WriteFormat(file, "%s=%s\r\n", "AdvancedINF", "2.0") &&
          WriteFormat(file, "\r\n[%s]\r\n%s=%s\r\n", kCleanupSection, "DelFiles", kDeleteSection) &&

@@ -42,7 +42,7 @@ bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]) {
   char name[sizeof(FileRecord::fileName)] = {};
   char directory[kPathSize] = {};
   LoadCatalogText(nullptr, CatalogRemovalProgram, name);
-  return GetWindowsDir(directory, sizeof(directory)) == 1 &&
+  return name[0] != '\0' && GetWindowsDir(directory, sizeof(directory)) == 1 &&
          FormatText(path, sizeof(path), "%s\\%s", directory, name);
 }
 

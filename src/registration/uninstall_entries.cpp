@@ -19,6 +19,12 @@ bool SetTerminatedText(const RegistryKey& key, const char* name, const char* tex
   return key.SetText(name, text, static_cast<DWORD>(strlen(text) + 1));
 }
 
+// False for a name that can't be had: an empty one would stand for the list itself.
+bool LoadEntryName(char (&name)[kCatalogTextSize]) {
+  LoadCatalogText(nullptr, CatalogUninstallKey, name);
+  return name[0] != '\0';
+}
+
 bool FormatRunOnceCommand(const char* infPath, char* command, size_t size) {
   OSVERSIONINFOA version = {};
   version.dwOSVersionInfoSize = sizeof(version);
@@ -42,9 +48,9 @@ int WriteUninstallEntry(const SetupContext* context) {
   (void)CancelRunOnceCommand();
   char name[kCatalogTextSize] = {};
   char keyPath[kKeySize] = {};
-  LoadCatalogText(nullptr, CatalogUninstallKey, name);
   RegistryKey key;
-  if (!FormatText(keyPath, sizeof(keyPath), "%s\\%s", kUninstallKey, name) ||
+  if (!LoadEntryName(name) ||
+      !FormatText(keyPath, sizeof(keyPath), "%s\\%s", kUninstallKey, name) ||
       !key.Create(HKEY_LOCAL_MACHINE, keyPath)) {
     return 0;
   }
@@ -63,8 +69,7 @@ int DeleteUninstallEntry() {
   RegistryKey key;
   if (!key.Open(HKEY_LOCAL_MACHINE, kUninstallKey, KEY_ALL_ACCESS)) return 0;
   char name[kCatalogTextSize] = {};
-  LoadCatalogText(nullptr, CatalogUninstallKey, name);
-  return RegDeleteKeyA(key.get(), name) == ERROR_SUCCESS;
+  return LoadEntryName(name) && RegDeleteKeyA(key.get(), name) == ERROR_SUCCESS;
 }
 
 int ScheduleFinalCleanup() {
