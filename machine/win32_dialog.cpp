@@ -202,8 +202,12 @@ BOOL SetWindowTextA(HWND handle, LPCSTR text) {
   return TRUE;
 }
 
+// A fault is answered as by a window that can't do what it is told: CB_ERR for the messages of a
+// list, 0 for all others.
 LRESULT SendMessageA(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
-  if (CallFails("SendMessageA")) return 0;
+  if (CallFails("SendMessageA")) {
+    return message >= CB_ADDSTRING && message <= CB_SETITEMDATA ? CB_ERR : 0;
+  }
   Window* const window = FindWindowByHandle(handle);
   if (window == nullptr) return 0;
   if (window->kind == WindowKind::kDialog) {

@@ -16,7 +16,8 @@ bool Exists(int id) {
 }
 
 void Post(UINT message, WPARAM wParam) {
-  PostMessageA(wizardState.window, message, wParam, 0);
+  const HWND dialog = wizardState.window;
+  if (PostMessageA(dialog, message, wParam, 0) == FALSE) SendMessageA(dialog, message, wParam, 0);
 }
 
 void Show(int id) {

@@ -95,6 +95,7 @@ void DrawEntry(const LanguageListArt& art, const DRAWITEMSTRUCT& item, const Lan
 int BuildLanguageList(HWND dialog, LanguageListArt* art) {
   *art = {};
   const HWND list = List(dialog);
+  if (list == nullptr) return 0;  // nobody would own the items
   const int count = CountLanguages();
   LanguageItem* last = nullptr;
   for (int entry = 0; entry < count; ++entry) {
@@ -114,6 +115,8 @@ int BuildLanguageList(HWND dialog, LanguageListArt* art) {
 }
 
 int FreeLanguageList(HWND dialog, LanguageListArt* art) {
+  // First, since a flag that could not be taken out of it can't be deleted while it stands.
+  if (art->memoryDC != nullptr) DeleteDC(art->memoryDC);
   const HWND list = List(dialog);
   const LRESULT count = SendMessageA(list, CB_GETCOUNT, 0, 0);
   for (LRESULT index = 0; index < count; ++index) {
@@ -125,7 +128,6 @@ int FreeLanguageList(HWND dialog, LanguageListArt* art) {
   }
   DeleteBrush(&art->selectedBrush);
   DeleteBrush(&art->normalBrush);
-  if (art->memoryDC != nullptr) DeleteDC(art->memoryDC);
   *art = {};
   return 1;
 }

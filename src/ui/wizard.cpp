@@ -127,7 +127,8 @@ void CloseWizard(StatusCode status) {
   FreeLanguageList(dialog, &languageArt);
   DeleteFonts();
   wizardState.window = nullptr;
-  EndDialog(dialog, status);
+  // A dialog that stays open answers its user further, who can try again.
+  if (EndDialog(dialog, status) == FALSE) wizardState.window = dialog;
 }
 
 // ---- Start: LOAD, IMAGE_KIND, LANGUAGE, PAGE
