@@ -20,7 +20,7 @@ demo: native win32
 demo-dialog: native win32
 	@tools/demo-dialog
 
-# Unit tests and scenarios, natively and under Wine; ends with CTest's own closing line.
+# Unit tests, fault loops and scenarios, natively and under Wine; ends with CTest's own closing line.
 test: all
 	@tools/bootstrap --wine32
 	@tools/test

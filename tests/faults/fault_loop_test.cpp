@@ -1,0 +1,251 @@
+// Every fault in every kind of run: the n-th call of each function of the seam fails, falls short,
+// or is where the power goes, and the n-th allocation fails, for n = 1, 2, 3 ... until a run ends
+// without having met the fault. After each the machine is looked at, and the program run once more
+// without a fault.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstdio>
+#include <fstream>
+#include <map>
+#include <set>
+
+#include "core/status.h"
+#include "machine/seam_functions.h"
+#include "platform/registry_key.h"
+#include "tests/faults/faulty_run.h"
+#include "tests/faults/machine_state.h"
+#include "tests/faults/run_judgement.h"
+#include "tests/support/test_image.h"
+#include "tests/support/test_machine.h"
+#include "ui/control_ids.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// Under sanitizers a run takes many times as long: there every eleventh fault has to do.
+#ifdef __SANITIZE_ADDRESS__
+constexpr int kStride = 11;
+#else
+constexpr int kStride = 1;
+#endif
+
+constexpr int kMostComplaints = 40;  // of one kind of run; they tend to be the same
+
+constexpr char kOldVersion[] = "4.1.6";
+constexpr char kNewVersion[] = "4.1.7";
+
+// The calls that change something: a power loss at any other call is one at the next of these.
+constexpr std::string_view kChangingFunctions[] = {
+    "CreateFileA",      "WriteFile",     "DeleteFileA",     "CopyFileA", "CreateDirectoryA",
+    "RemoveDirectoryA", "_creat",        "_chmod",          "_write",    "RegCreateKeyExA",
+    "RegSetValueExA",   "RegDeleteKeyA", "RegDeleteValueA",
+};
+
+// No pattern repeats, so that a stream is about as long as its file.
+std::string Noise(size_t size, unsigned seed) {
+  std::string bytes(size, '\0');
+  for (char& byte : bytes) byte = static_cast<char>((seed = seed * 1103515245 + 12345) >> 23);
+  return bytes;
+}
+
+// Targets in subdirectories, in the system's and in a browser's; a browser that is missing; streams
+// of one block and of several; no two versions of a file alike.
+void WriteImage(const TestMachine& pc, const std::string& version) {
+  const auto seed = static_cast<unsigned>(version.back());
+  ImageBuilder image(version);
+  image.Add("moriv.exe", "%INSTALL_DIR%", VersionedProgram(version) + Noise(1500, seed))
+      .Add("moriv.dll", "%INSTALL_DIR%\\bin;%SYS_DIR%", Noise(2500, seed + 1))
+      .Add("plugin.dll", "%INSTALL_DIR%\\plug;%PLUGIN_ALL_DIR%", Noise(200, seed + 2))
+      .Add("netscape.dll", "%PLUGIN_NS_DIR%", Noise(300, seed + 3))
+      .Add("empty.txt", "%INSTALL_DIR%", version == kOldVersion ? "not yet" : "");
+  image.header().defaultLanguage = kLanguageFrench;
+  image.header().spaceNeeded = 9000;
+  (void)CopyText(image.header().defaultDirectory, "C:\\Program Files\\Moriv");
+  pc.Write("drive_c/setup.exe", image.Bytes());
+}
+
+// A browser to find, and what belongs to others.
+void FurnishMachine(const TestMachine& pc) {
+  pc.Write("drive_c/Opera/Plugins/other.dll", "other");
+  pc.Write("drive_c/Program Files/other.txt", "other");
+  const std::string system = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\";
+  RegistryKey key;
+  ASSERT_TRUE(key.Create(HKEY_LOCAL_MACHINE, (system + "App Paths\\Opera.exe").c_str()));
+  ASSERT_TRUE(key.SetText("Path", "C:\\Opera", 9));
+  ASSERT_TRUE(key.Create(HKEY_LOCAL_MACHINE, (system + "Uninstall\\Other").c_str()));
+  ASSERT_TRUE(key.SetText("DisplayName", "Other", 6));
+}
+
+class FaultLoop : public testing::Test {
+ protected:
+  enum class Machine { kFresh, kOutdated, kUpToDate };
+
+  // The whole loop of one kind of run, on a machine with no product, an older or the same one.
+  void Run(const RunKind& runKind, Machine installed, const std::string& system = "") {
+    kind = runKind;
+    Prepare(installed, system);
+    const RunReport report = RunFrom(before, {});
+    whole = after;
+    ASSERT_EQ(report.end, RunEnd::kReturned);
+    ASSERT_EQ(report.code, kind.work == kHelp ? 0 : StatusOk);
+
+    for (const std::string_view function : machine::kSeamFunctions) {
+      const bool failsAnyway = std::ranges::count(kind.always, function, &machine::Fault::function);
+      if (!failsAnyway) TryFunction(std::string(function));
+    }
+    TryCalls({.function = kAllocation});
+    TryCalls({.function = kAllocation, .fromThenOn = true});
+    Tell();
+  }
+
+ private:
+  fs::path Folder() const { return pc.Host(""); }
+
+  void Prepare(Machine installed, const std::string& system) {
+    pc.Write("machine.ini", "[system]\nnow = 2001-12-31T23:59:00\n" + system);
+    pc.Restart();
+    FurnishMachine(pc);
+    machine::Stop();
+    if (installed != Machine::kFresh) {
+      WriteImage(pc, installed == Machine::kOutdated ? kOldVersion : kNewVersion);
+      ASSERT_EQ(RunWithFault({.commandLine = "/s /r"}, {}, Folder()).code, StatusOk);
+      fs::remove(Folder() / kLogPath);
+    }
+    WriteImage(pc, kNewVersion);
+    before = ReadMachine(Folder());
+  }
+
+  RunReport RunFrom(const MachineState& state, const Injection& injection) {
+    WriteMachine(Folder(), state);
+    const RunReport report = RunWithFault(kind, injection, Folder());
+    after = ReadMachine(Folder());
+    return report;
+  }
+
+  void TryFunction(const std::string& function) {
+    TryCalls({.function = function});
+    // A dialog that the system never ends can't be ended.
+    if (function != "EndDialog") TryCalls({.function = function, .fromThenOn = true});
+    if (machine::MovesBytes(function)) {
+      TryCalls({.function = function, .isShort = true});
+      TryCalls({.function = function, .fromThenOn = true, .isShort = true});
+    }
+    if (std::ranges::count(kChangingFunctions, function) != 0)
+      TryCalls({.function = function, .stop = true});
+  }
+
+  // The fault at every call, until a run ends without having met it.
+  void TryCalls(Injection injection) {
+    for (injection.call = 1; complaintCount < kMostComplaints; injection.call += kStride) {
+      const RunReport report = RunFrom(before, injection);
+      if (report.end == RunEnd::kReturned && report.strikes == 0) return;
+      Count(injection, report);
+      const MachineState left = after;
+      const FaultyRun run = {kind, injection, report, before, whole, left};
+      Complain(run, JudgeRun(run));
+      RunAgain(run);
+    }
+  }
+
+  // A state is run again once, however many faults led to it.
+  void RunAgain(const FaultyRun& first) {
+    MachineState start = first.after;
+    start.files.erase(kLogPath);
+    start.files.erase(kReportPath);
+    if (start.files == before.files || !statesRunAgain.insert(start.files).second) return;
+    const RunReport second = RunFrom(start, {});
+    Complain(first, JudgeSecondRun(first, second, after));
+  }
+
+  void Count(const Injection& injection, const RunReport& report) {
+    ++(injection.stop ? powerLosses : faults);
+    if (!injection.stop && EndedWell(report.code)) ++endedWell;
+  }
+
+  void Complain(const FaultyRun& run, const std::vector<std::string>& complaints) {
+    for (const std::string& complaint : complaints) {
+      ++complaintCount;
+      ADD_FAILURE() << Describe(run.injection) << ", code " << run.report.code << ": " << complaint;
+    }
+  }
+
+  // One line, which tools/test shows at the end of all tests.
+  void Tell() const {
+    char line[300];
+    std::snprintf(line, sizeof(line),
+                  "faults: %s: %d tried%s, %d complaints; %d ended well, %d with a failure; "
+                  "%d power losses; run again from %zu states",
+                  kind.name.c_str(), faults, kStride > 1 ? " (every eleventh)" : "", complaintCount,
+                  endedWell, faults - endedWell, powerLosses, statesRunAgain.size());
+    std::printf("%s\n", line);
+    fs::create_directories(MORIV_COUNTS_DIR);
+    std::string file = kind.name + ".count";
+    std::ranges::replace(file, ' ', '-');
+    std::ofstream(fs::path(MORIV_COUNTS_DIR) / file) << line << '\n';
+  }
+
+  TestMachine pc;
+  RunKind kind;
+  MachineState before;
+  MachineState whole;  // what a run without a fault leaves
+  MachineState after;  // what the last run has left
+  std::set<std::map<std::string, std::string>> statesRunAgain;
+  int faults = 0;
+  int endedWell = 0;
+  int powerLosses = 0;
+  int complaintCount = 0;
+};
+
+constexpr char kSilentInstall[] = "/s /r /rf:C:\\report.txt";
+
+TEST_F(FaultLoop, FreshInstall) {
+  Run({.name = "fresh install", .commandLine = kSilentInstall}, Machine::kFresh);
+}
+
+TEST_F(FaultLoop, Update) {
+  Run({.name = "update", .commandLine = kSilentInstall}, Machine::kOutdated);
+}
+
+// The image is read, and all that is written goes, through the runtime's descriptors.
+TEST_F(FaultLoop, UpdateByDescriptors) {
+  Run({.name = "update by descriptors",
+       .commandLine = kSilentInstall,
+       .always = {{.function = "CreateFileA", .fromThenOn = true}}},
+      Machine::kOutdated, "platform = 9x\n");
+}
+
+TEST_F(FaultLoop, Removal) {
+  Run({.name = "removal", .work = kRemoval, .commandLine = "/s /u /r"}, Machine::kUpToDate);
+}
+
+TEST_F(FaultLoop, RemovalProgram) {
+  Run({.name = "removal program",
+       .work = kRemoval,
+       .commandLine = "/s /r",
+       .image = "drive_c/windows/MorivRmv.exe"},
+      Machine::kUpToDate, "platform = 9x\n");
+}
+
+TEST_F(FaultLoop, Help) {
+  Run({.name = "help", .work = kHelp, .commandLine = "/h /s /rf:C:\\report.txt"}, Machine::kFresh);
+}
+
+TEST_F(FaultLoop, DialogInstall) {
+  Run({.name = "dialog install", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kFresh);
+}
+
+TEST_F(FaultLoop, DialogUpdate) {
+  Run({.name = "dialog update", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kOutdated);
+}
+
+TEST_F(FaultLoop, DialogRemoval) {
+  Run({.name = "dialog removal",
+       .work = kRemoval,
+       .commandLine = "/u /r",
+       .workButtons = {IDC_REMOVE}},
+      Machine::kUpToDate);
+}
+
+}  // namespace

@@ -1,0 +1,137 @@
+#include "tests/faults/faulty_run.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+#include <new>
+
+#include "core/command_line.h"
+#include "core/driver.h"
+#include "machine/faults.h"
+#include "machine/machine.h"
+#include "machine/scripted_user.h"
+#include "machine/windows.h"
+#include "tests/support/allocation_faults.h"
+#include "ui/control_ids.h"
+
+namespace fs = std::filesystem;
+
+namespace {
+
+constexpr int kStopStatus = 4;
+constexpr unsigned kLongestRun = 10;  // seconds
+
+// Wants the work done and then the dialog closed: presses the end button of an end page, else the
+// button that starts the work, and cancels when that has come to nothing three times.
+class DecidedUser {
+ public:
+  DecidedUser(std::vector<int> workButtons, RunReport* report)
+      : workButtons_(std::move(workButtons)), report_(report) {}
+
+  void operator()() {
+    constexpr int kMostTurns = 12;
+    if (++turns_ > kMostTurns) {
+      report_->end = RunEnd::kStuck;
+      _exit(EXIT_SUCCESS);
+    }
+    if (Press(IDOK) || Press(IDC_FAILURE_END)) return;
+    constexpr int kMostTries = 3;
+    for (const int id : workButtons_) {
+      if (tries_ < kMostTries && Press(id)) {
+        ++tries_;
+        return;
+      }
+    }
+    machine::SendCancel();
+  }
+
+ private:
+  static bool Press(int id) {
+    const machine::Window* const control = machine::OpenDialog()->Find(id);
+    if (control == nullptr || !control->IsShown() || !control->IsEnabled()) return false;
+    machine::Click(control->handle);
+    return true;
+  }
+
+  std::vector<int> workButtons_;
+  RunReport* report_;
+  int turns_ = 0;
+  int tries_ = 0;
+};
+
+void InjectFault(const RunKind& kind, const Injection& injection, const fs::path& folder,
+                 RunReport* report) {
+  const auto observer = [folder, report] {
+    ++report->strikes;
+    report->struckLog |= fs::exists(folder / kLogPath) || fs::exists(folder / kReportPath);
+  };
+  const auto functionObserver = [observer, name = injection.function](const machine::Fault& fault) {
+    if (fault.function == name) observer();
+  };
+  std::vector<machine::Fault> faults = kind.always;
+  if (injection.function == kAllocation) {
+    FailAllocation(injection.call, injection.fromThenOn, observer);
+  } else if (!injection.function.empty()) {
+    faults.push_back(injection);
+  }
+  machine::SetFaults(faults, functionObserver);
+}
+
+[[noreturn]] void RunProgram(const RunKind& kind, const Injection& injection,
+                             const fs::path& folder, RunReport* report) {
+  dup2(open("/dev/null", O_WRONLY | O_CLOEXEC), STDOUT_FILENO);  // what the user sees
+  alarm(kLongestRun);
+  std::string error;
+  if (!machine::Start(folder, folder / kind.image, &error)) {
+    std::fprintf(stderr, "%s\n", error.c_str());
+    _exit(EXIT_FAILURE);
+  }
+  if (!kind.workButtons.empty()) machine::SetUser(DecidedUser(kind.workButtons, report));
+
+  SetupRequest request = {};
+  request.language = kLanguageNone;
+  if (ParseCommandLine(kind.commandLine.c_str(), &request) == 0) request.options = kDefaultOptions;
+  const int liveBefore = LiveAllocations();
+  InjectFault(kind, injection, folder, report);
+  report->code = RunSetup(request);
+  (void)WithdrawAllocationFailure();
+  report->leakedBlocks = LiveAllocations() - liveBefore;
+  const std::string open = machine::Stop();
+  std::snprintf(report->openObjects, sizeof(report->openObjects), "%s", open.c_str());
+  report->end = RunEnd::kReturned;
+  _exit(EXIT_SUCCESS);
+}
+
+// Memory that this process and the one that it makes both see.
+RunReport* SharedReport() {
+  static void* const memory =
+      mmap(nullptr, sizeof(RunReport), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
+  return new (memory) RunReport();
+}
+
+}  // namespace
+
+std::string Describe(const Injection& injection) {
+  return injection.function + " " + std::to_string(injection.call) +
+         (injection.fromThenOn ? " on" : "") + (injection.isShort ? " short" : "") +
+         (injection.stop ? " stop" : "");
+}
+
+RunReport RunWithFault(const RunKind& kind, const Injection& injection, const fs::path& folder) {
+  RunReport* const report = SharedReport();
+  const pid_t child = fork();
+  if (child == 0) RunProgram(kind, injection, folder, report);
+  int status = 0;
+  if (child < 0 || waitpid(child, &status, 0) != child) return {};
+  RunReport result = *report;
+  if (WIFEXITED(status) && WEXITSTATUS(status) == kStopStatus) {
+    result.end = RunEnd::kStopped;
+  } else if (!WIFEXITED(status) || WEXITSTATUS(status) != EXIT_SUCCESS) {
+    result.end = RunEnd::kCrashed;
+  }
+  return result;
+}

@@ -1,0 +1,222 @@
+#include "tests/faults/run_judgement.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "core/status.h"
+#include "tests/faults/log_text.h"
+
+namespace {
+
+using Complaints = std::vector<std::string>;
+
+struct ExitCodeRow {
+  StatusCode code;
+  unsigned works;                   // Work that can give it
+  std::vector<const char*> events;  // one of these tells the reason
+};
+
+const ExitCodeRow kExitCodes[] = {
+    {0, kHelp, {}},
+    {StatusOk, kInstall | kRemoval, {}},
+    {StatusRemovalProgramFailed, kInstall, {"Error installing Uninstall file"}},
+    {StatusNotRegistered, kInstall, {"Couldn't register Moriv"}},
+    {StatusBadPackage,
+     kInstall | kRemoval,
+     {"Cannot initialize Data File", "Error opening Data File", "Error preparing",
+      "Invalide or abscent"}},
+    {StatusNoMemory,
+     kInstall | kRemoval,
+     {"Cannot allocate memory", "Error while constructing", "Cannot create destination file"}},
+    {StatusSeekFailed, kInstall | kRemoval, {"Error preparing"}},
+    {StatusBadRecord, kInstall | kRemoval, {"Cannot read next install file"}},
+    {StatusReadFailed,
+     kInstall | kRemoval,
+     {"Error reading Data File", "Cannot create destination file"}},
+    {StatusNoSystemDir, kInstall | kRemoval, {"Error while constructing"}},
+    {StatusDeleteFailed, kInstall, {"Error deleting file"}},
+    {StatusCreateDirFailed, kInstall, {"Cannot create the file path"}},
+    {StatusCreateFileFailed, kInstall, {"Cannot create destination file"}},
+    {StatusExpandFailed, kInstall, {"Cannot create destination file"}},
+    {StatusCopyFailed, kInstall, {"Error copying"}},
+    {StatusServicesRemain, kRemoval, {"Cannot unsitall"}},
+};
+
+const ExitCodeRow* FindRow(const FaultyRun& run) {
+  const auto row = std::ranges::find_if(kExitCodes, [&](const ExitCodeRow& candidate) {
+    return candidate.code == run.report.code && (candidate.works & run.kind.work) != 0;
+  });
+  return row != std::end(kExitCodes) ? row : nullptr;
+}
+
+bool IsDialog(const RunKind& kind) {
+  return !kind.workButtons.empty();
+}
+
+bool IsOneOf(std::string_view name, std::initializer_list<std::string_view> names) {
+  return std::ranges::find(names, name) != names.end();
+}
+
+// ---- Exit code and log
+
+void JudgeCode(const FaultyRun& run, Complaints* complaints) {
+  const StatusCode code = run.report.code;
+  const bool isKnown = IsDialog(run.kind) ? code == StatusOk || code == StatusCancelled ||
+                                                code == StatusDialogAborted
+                                          : FindRow(run) != nullptr;
+  if (!isKnown) complaints->emplace_back("no exit code of this run");
+}
+
+// A log that has no name, no memory or no directory or can't be made in either way is left out, and
+// so is that of a dialog that was cancelled or never made.
+bool CanLackLog(const FaultyRun& run) {
+  return run.report.code == StatusCancelled ||
+         IsOneOf(run.injection.function,
+                 {kAllocation, "LoadStringA", "GetWindowsDirectoryA", "_creat", "DialogBoxParamA"});
+}
+
+bool TellsReason(const FaultyRun& run, const std::vector<LogLine>& lines) {
+  const ExitCodeRow* const row = FindRow(run);
+  if (row == nullptr || row->events.empty()) return true;
+  return std::ranges::any_of(lines, [row](const LogLine& line) {
+    return line.severity != 'i' && std::ranges::any_of(row->events, [&](const char* event) {
+             return line.text.starts_with(event);
+           });
+  });
+}
+
+bool HasRightEvents(const FaultyRun& run, const std::vector<LogLine>& lines) {
+  // An event that finds no memory is lost, and nothing else.
+  if (run.injection.function == kAllocation) return true;
+  const auto fatal = std::ranges::count(lines, 'f', &LogLine::severity);
+  if (IsDialog(run.kind)) {
+    // A seek that fails in the check for older files closes the package without an event, and the
+    // pass that finds it closed adds none.
+    if (fatal == 0 && run.injection.function == "SetFilePointer") return true;
+    return fatal == (run.report.code == StatusDialogAborted ? 1 : 0);
+  }
+  // A silent run gives up at its fatal event.
+  const bool endsFatally = !lines.empty() && lines.back().severity == 'f';
+  if (fatal != (EndedWell(run.report.code) ? 0 : 1) || (fatal == 1 && !endsFatally)) return false;
+  return TellsReason(run, lines);
+}
+
+void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
+  // Nothing is done about a log that can't be written as it should.
+  if (!run.whole.files.contains(path) || run.report.struckLog) return;
+  const auto log = run.after.files.find(path);
+  if (log == run.after.files.end()) {
+    if (!CanLackLog(run)) complaints->push_back(std::string("missing: ") + path);
+    return;
+  }
+  const auto lines = ReadLog(log->second);
+  if (!lines) {
+    complaints->push_back(std::string("malformed: ") + path);
+  } else if (!HasRightEvents(run, *lines)) {
+    complaints->push_back(std::string("without the right events: ") + path + log->second);
+  }
+}
+
+// ---- The machine
+
+constexpr char kScript[] = "drive_c/windows/Moriv.INF";
+constexpr char kRunOnce[] =
+    "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce] "
+    "\"MorivCommand\"";
+
+bool Holds(const MachineState& state, const std::string& name, const std::string& content) {
+  const auto item = state.items.find(name);
+  return item != state.items.end() && item->second == content;
+}
+
+// Without power nobody cleans up. A script that could not be written whole stays, without the
+// command that would use it. A system that doesn't tell its family gets the 9x family's command.
+bool MayDiffer(const FaultyRun& run, const std::string& name) {
+  return run.report.end == RunEnd::kStopped || name == kScript ||
+         (name == kRunOnce && run.injection.function == "GetVersionExA");
+}
+
+void JudgeMachine(const FaultyRun& run, Complaints* complaints) {
+  for (const auto& [name, content] : run.after.items) {
+    const bool isPartOfWork = run.whole.items.contains(name) && MayDiffer(run, name);
+    if (!Holds(run.before, name, content) && !Holds(run.whole, name, content) && !isPartOfWork) {
+      complaints->push_back("neither old nor whole: " + name);
+    }
+  }
+  for (const auto& [name, content] : run.before.items) {
+    if (Holds(run.whole, name, content) && !run.after.items.contains(name)) {
+      complaints->push_back("gone: " + name);
+    }
+  }
+  const bool isScheduled =
+      run.after.items.contains(kRunOnce) && !run.before.items.contains(kRunOnce);
+  if (isScheduled && !Holds(run.after, kScript, run.whole.items.at(kScript))) {
+    complaints->emplace_back("a command without its whole script");
+  }
+}
+
+// ---- The second run
+
+// The folder, or one in it, holds no file.
+bool HoldsEmptyFolder(const MachineState& state, const std::string& folder) {
+  const auto isBelow = [](const std::string& path, const std::string& above) {
+    return path.starts_with(above + "/");
+  };
+  return std::ranges::any_of(state.files, [&](const auto& inner) {
+    return inner.second == kFolder && (inner.first == folder || isBelow(inner.first, folder)) &&
+           std::ranges::none_of(state.files, [&](const auto& other) {
+             return other.second != kFolder && isBelow(other.first, inner.first);
+           });
+  });
+}
+
+// What a second removal can't know of. A directory is tried only after a file in it was deleted.
+// And after a removal that has ended the product is no longer registered: what stayed in the
+// system's directory or with a browser is out of sight.
+bool IsOutOfSight(const FaultyRun& first, const std::string& name, const std::string& content) {
+  if (first.kind.work != kRemoval) return false;
+  if (content == kFolder) return HoldsEmptyFolder(first.after, name);
+  return first.report.end == RunEnd::kReturned && EndedWell(first.report.code) &&
+         Holds(first.before, name, content) &&
+         (name.starts_with("drive_c/windows/system32/") || name.starts_with("drive_c/Opera/"));
+}
+
+}  // namespace
+
+bool EndedWell(int code) {
+  return code >= 0;
+}
+
+std::vector<std::string> JudgeRun(const FaultyRun& run) {
+  Complaints complaints;
+  if (run.report.end == RunEnd::kCrashed) complaints.emplace_back("crashed");
+  if (run.report.end == RunEnd::kStuck) complaints.emplace_back("the dialog can't be closed");
+  if (run.report.end == RunEnd::kReturned) {
+    const std::string open = run.report.openObjects;
+    const int leaked = run.report.leakedBlocks;
+    if (!open.empty()) complaints.push_back("open: " + open);
+    if (leaked != 0) complaints.push_back(std::to_string(leaked) + " blocks leaked");
+    JudgeCode(run, &complaints);
+    for (const char* path : {kLogPath, kReportPath}) JudgeLog(run, path, &complaints);
+  }
+  JudgeMachine(run, &complaints);
+  return complaints;
+}
+
+std::vector<std::string> JudgeSecondRun(const FaultyRun& first, const RunReport& second,
+                                        const MachineState& after) {
+  Complaints complaints;
+  const int goal = first.kind.work == kHelp ? 0 : StatusOk;
+  if (second.end != RunEnd::kReturned || second.code != goal) {
+    complaints.push_back("a second run gives " + std::to_string(second.code));
+  }
+  for (const auto& [name, content] : first.whole.items) {
+    if (!Holds(after, name, content)) complaints.push_back("a second run doesn't make " + name);
+  }
+  for (const auto& [name, content] : after.items) {
+    if (!first.whole.items.contains(name) && !IsOutOfSight(first, name, content)) {
+      complaints.push_back("a second run leaves " + name);
+    }
+  }
+  return complaints;
+}
