@@ -34,7 +34,7 @@ StatusCode ExpandStream(DataFile* packageFile, const char* path, uint32_t stored
   if (output == nullptr) return StatusNoMemory;
   if (output->Create() != 1) return StatusCreateFileFailed;
 
-  // On the heap: the expander has the size of its string stack, 36 KB.
+  // On the heap: the expander has the size of its longest string and two buffers, 37 KB.
   const std::unique_ptr<PkzFileExpander> expander(new (std::nothrow) PkzFileExpander(output.get()));
   const bool isReady = expander != nullptr && expander->IsReady();
   const StatusCode status =

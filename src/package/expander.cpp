@@ -1,36 +1,53 @@
 #include "package/expander.h"
 
+#include <bit>
 #include <cstring>
 #include <new>
 
 #include "package/data_file.h"
 
-PkzExpander::PkzExpander() : table_(new (std::nothrow) Entry[kTableSize]) {}
+namespace {
+
+constexpr uint32_t kWindowSize = sizeof(uint32_t);
+constexpr uint32_t kWindowBits = 8 * kWindowSize;
+constexpr uint32_t kWidestInWindow = kWindowBits - 7;  // whatever bit of a byte the code begins at
+constexpr uint32_t kMostBytes = UINT32_MAX / 16;       // so that bit positions have 32 bits
+
+static_assert(std::endian::native == std::endian::little);
+
+// The 32 bits of the stream that begin with the top bit of `bytes`.
+uint32_t WindowAt(const uint8_t* bytes) {
+  uint32_t window = 0;
+  memcpy(&window, bytes, kWindowSize);
+  return __builtin_bswap32(window);
+}
+
+}  // namespace
+
+PkzExpander::PkzExpander() : table_(new (std::nothrow) StringTable::Entry[StringTable::kSize + 1]) {
+  if (table_ == nullptr) return;
+  strings_.entries = table_;
+  strings_.SetLiterals();
+}
 
 PkzExpander::~PkzExpander() {
   delete[] table_;
 }
 
 void PkzExpander::Expand(const uint8_t* bytes, uint32_t count) {
-  if (failed_ != 0) return;
   input_ = bytes;
   inputLeft_ = count;
-  while (Step()) {
+  uint32_t code = 0;
+  while (failed_ == 0 && ReadCode(&code)) {
+    if (!TakeCode(code)) {
+      GiveOut();
+      Fail();
+      return;
+    }
+    if (state_ == State::kNextCode) TakeStrings();
+    if (batchFill_ > kBatchSize) GiveOut();
   }
-}
-
-bool PkzExpander::Step() {
-  switch (state_) {
-    case State::kFirstCode:
-      return ReadFirstCode();
-    case State::kNextCode:
-      return ReadNextCode();
-    case State::kFirstCodeAfterReset:
-      return ReadFirstCode() && Emit();
-    case State::kEmit:
-      return Emit();
-  }
-  return false;
+  GiveOut();
 }
 
 bool PkzExpander::ReadCode(uint32_t* code) {
@@ -58,85 +75,80 @@ bool PkzExpander::ReadCode(uint32_t* code) {
   return true;
 }
 
-bool PkzExpander::ReadFirstCode() {
-  uint32_t code = 0;
-  if (!ReadCode(&code)) return false;
-  if (code > 255) {
-    Fail();
-    return false;
-  }
-  PushByte(static_cast<uint8_t>(code));
-  previousCode_ = code;
-  firstByte_ = code;
-  state_ = State::kEmit;
-  return true;
-}
-
-bool PkzExpander::ReadNextCode() {
-  uint32_t code = 0;
-  if (!ReadCode(&code)) return false;
-  if (code == kResetCode) {
-    ResetCodes();
-    state_ = State::kFirstCodeAfterReset;
-    return true;
-  }
-  if (code == kWidenCode) {
-    if (codeWidth_ == kLastWidth) Fail();
-    ++codeWidth_;
-    return failed_ == 0;
-  }
-
-  // Compared unsigned: as a signed number a 32-bit code with its top bit set would look like a
-  // literal. 256 has no meaning and no entry.
-  const uint32_t nextCode = static_cast<uint32_t>(nextCode_);
-  if (code > nextCode || code == 256) {
-    Fail();
-    return false;
-  }
-  if (code == nextCode) {
-    // The entry that this very code makes: the previous string and its own first byte.
-    PushByte(static_cast<uint8_t>(firstByte_));
-    BuildString(previousCode_);
+bool PkzExpander::TakeCode(uint32_t code) {
+  uint8_t* const output = batch_ + batchFill_;
+  uint8_t* end = output;
+  if (state_ == State::kFirstCode) {
+    if (code > UINT8_MAX) return false;
+    end = strings_.AppendFirst(static_cast<uint8_t>(code), output);
+    state_ = State::kNextCode;
+  } else if (code == kResetCode) {
+    codeWidth_ = kFirstWidth;
+    state_ = State::kFirstCode;
+  } else if (code == kWidenCode) {
+    return ++codeWidth_ <= kLastWidth;
+  } else if (strings_.Has(code) && strings_.FreeCount() > 0) {
+    end = strings_.Append(code, output);
   } else {
-    BuildString(code);
-  }
-  firstByte_ = stringStack_[kTableSize - stringLength_];
-
-  if (nextCode_ >= kTableSize) {
-    Fail();
     return false;
   }
-  table_[nextCode_++] = {previousCode_, static_cast<uint8_t>(firstByte_)};
-  previousCode_ = code;
-  state_ = State::kEmit;
+  batchFill_ += static_cast<uint32_t>(end - output);
   return true;
 }
 
-bool PkzExpander::Emit() {
-  WriteOutput(stringStack_ + kTableSize - stringLength_, static_cast<uint32_t>(stringLength_));
-  stringLength_ = 0;
-  state_ = State::kNextCode;
-  return failed_ == 0;
-}
+// Takes codes out of 32-bit windows of the block, with all that changes in locals. It begins and
+// ends between two codes. It ends in front of
+//   - a code that stands for no string: TakeCode acts on it;
+//   - a code whose window would reach beyond the block: ReadCode takes it byte by byte;
+//   - a code that a full table can't take: TakeCode refuses it;
+//   - a string that the batch has no room for: the batch is given out first.
+void PkzExpander::TakeStrings() {
+  // No bits are left over between blocks: a byte begun is of this block.
+  const uint32_t begun = bitsInByte_ > 0 ? 1 : 0;
+  const uint8_t* const bytes = input_ - begun;
+  const uint32_t count = begun + (inputLeft_ < kMostBytes ? inputLeft_ : kMostBytes);
+  const auto width = static_cast<uint32_t>(codeWidth_);
+  if (width > kWidestInWindow || count < kWindowSize) return;
 
-void PkzExpander::ResetCodes() {
-  nextCode_ = kFirstEntry;
-  codeWidth_ = kFirstWidth;
-}
+  // In bits. A code at lastPosition or before it lies in a window that ends with the last byte.
+  uint32_t position = 8 * begun - static_cast<uint32_t>(bitsInByte_);
+  const uint32_t lastPosition = 8 * (count - kWindowSize) + 7;
 
-// A prefix is always older than the entry that names it, so a chain shrinks and ends at a literal.
-// The longest string: 34764 entries (259 to 35022), 1 literal and 1 byte for a code equal to
-// nextCode make 34766, below the 35023 bytes of the stack.
-void PkzExpander::PushByte(uint8_t value) {
-  stringStack_[kTableSize - ++stringLength_] = value;
-}
-
-void PkzExpander::BuildString(uint32_t code) {
-  while (code > 255) {
-    PushByte(table_[code].suffix);
-    code = table_[code].prefix;
+  StringTable strings = strings_;
+  const uint32_t codesInBlock = (lastPosition - position) / width + 1;
+  const uint32_t codesInTable = strings.FreeCount();
+  const uint32_t endCode =
+      strings.nextCode + (codesInBlock < codesInTable ? codesInBlock : codesInTable);
+  uint8_t* output = batch_ + batchFill_;
+  const uint8_t* const lastOutput = batch_ + kBatchSize;
+  // Each round moves on by one code and one entry, so endCode bounds both `position` and the table.
+  // Up to lastOutput there is room for any string.
+  while (strings.nextCode < endCode && output <= lastOutput) {
+    const uint32_t window = WindowAt(bytes + position / 8);
+    const uint32_t code = (window << position % 8) >> (kWindowBits - width);
+    if (!strings.Has(code)) break;
+    output = strings.Append(code, output);
+    position += width;
   }
-  PushByte(static_cast<uint8_t>(code));
+  strings_ = strings;
+  batchFill_ = static_cast<uint32_t>(output - batch_);
+
+  const uint32_t taken = (position + 7) / 8;
+  bitsInByte_ = static_cast<int32_t>(8 * taken - position);
+  currentByte_ = bitsInByte_ > 0 ? bytes[taken - 1] & ((1u << bitsInByte_) - 1) : 0;
+  input_ = bytes + taken;
+  inputLeft_ -= taken - begun;
+}
+
+// The string that made the batch too long is given out by itself. What is in front of it has at
+// most 1024 bytes and so makes at most one write of that size: when it fails, none of a later
+// string follows.
+void PkzExpander::GiveOut() {
+  const uint32_t fill = batchFill_;
+  const uint32_t last = fill > kBatchSize ? strings_.LastLength() : 0;
+  batchFill_ = 0;
+  if (fill > last) WriteOutput(batch_, fill - last);
+  if (last > 0 && failed_ == 0) WriteOutput(batch_ + fill - last, last);
 }
 
 void PkzFileExpander::ExpandBlock(const uint8_t* bytes, uint32_t count) {

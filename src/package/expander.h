@@ -14,6 +14,8 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "package/string_table.h"
+
 class DataFile;
 
 inline constexpr char kStreamMagic[] = "PKZ";
@@ -36,57 +38,50 @@ class PkzExpander {
   void Expand(const uint8_t* bytes, uint32_t count);
 
  protected:
-  // Takes `count` bytes of output, which stay valid during the call alone.
+  // Takes `count` bytes of output, which stay valid during the call alone: several whole strings of
+  // at most 1024 bytes together, or one string. All strings of a block come before Expand returns;
+  // none comes after a call that failed.
   virtual void WriteOutput(const uint8_t* bytes, uint32_t count) = 0;
 
   void Fail() { failed_ = 1; }
 
  private:
-  static constexpr int32_t kTableSize = 35023;
-  static constexpr int32_t kWidenCode = 257;
-  static constexpr int32_t kResetCode = 258;
-  static constexpr int32_t kFirstEntry = 259;
+  static constexpr uint32_t kWidenCode = 257;
+  static constexpr uint32_t kResetCode = 258;
   static constexpr int32_t kFirstWidth = 9;
   static constexpr int32_t kLastWidth = 32;
+  static constexpr uint32_t kBatchSize = 1024;
 
-  struct Entry {
-    uint32_t prefix;
-    uint8_t suffix;
-  };
-
-  enum class State { kFirstCode, kNextCode, kFirstCodeAfterReset, kEmit };
-
-  // The steps of the machine answer whether to go on: not when the block has run out, and not when
-  // the stream has been found bad.
-  bool Step();
-  bool ReadFirstCode();
-  bool ReadNextCode();
-  bool Emit();
+  enum class State { kFirstCode, kNextCode };  // the first one: at the start and after a reset
 
   // The next code, in `code`; false when the block has run out. A code split between blocks keeps
   // the width that it began with.
   bool ReadCode(uint32_t* code);
-  void ResetCodes();
-  void PushByte(uint8_t value);
-  void BuildString(uint32_t code);
+
+  // Acts on one code. False for a bad one, which adds nothing to the batch.
+  bool TakeCode(uint32_t code);
+
+  // Takes codes that stand for strings, as many as it can: the hot loop.
+  void TakeStrings();
+
+  // Hands the batch to WriteOutput and empties it.
+  void GiveOut();
 
   int32_t failed_ = 0;
   int32_t bitsWanted_ = 0;    // bits still missing from the code in assembly; 0: none in assembly
   uint32_t codeValue_ = 0;    // its bits so far
-  int32_t bitsInByte_ = 0;    // unread bits of currentByte, 0 to 8
+  int32_t bitsInByte_ = 0;    // unread bits of currentByte, 0 to 8; 0 between two blocks
   uint32_t currentByte_ = 0;  // with its used bits cleared
   const uint8_t* input_ = nullptr;  // next byte of the present block; not owned
   uint32_t inputLeft_ = 0;
   State state_ = State::kFirstCode;
   int32_t codeWidth_ = kFirstWidth;
-  // Owned. Entries 0 to 258 are not used. Neither cleared nor walked at a reset: an entry above
-  // nextCode can't be reached, since a code above nextCode is refused.
-  Entry* table_;
-  uint8_t stringStack_[kTableSize];  // the present string, filled from its last byte backwards
-  int32_t stringLength_ = 0;         // it ends with the last byte of stringStack
-  uint32_t previousCode_ = 0;        // widen and reset not counted
-  uint32_t firstByte_ = 0;           // of the string of previousCode
-  int32_t nextCode_ = kFirstEntry;   // next free code
+  StringTable::Entry* table_;  // owned
+  StringTable strings_;
+  // Strings not yet given out. All but the last together have at most kBatchSize bytes, so that
+  // there always is room for one more.
+  uint8_t batch_[kBatchSize + StringTable::kStringRoom];
+  uint32_t batchFill_ = 0;
 };
 
 // Tests the magic and collects the output in pieces of 1024 bytes on its way to a file.

@@ -1,80 +1,178 @@
-// A slow and plain decoder of code sequences, to compare the program's with: it has the whole
-// sequence at hand and keeps each entry of the table as a string of its own.
+// A plain decoder of the streams, step by step as the format is described: bits byte by byte, each
+// string built backwards and handed on by itself, output collected in pieces of 1024 bytes. The
+// program's expander has to answer as this one does, and is measured against it.
 #pragma once
 
 #include <cstdint>
-#include <map>
-#include <string>
-#include <string_view>
-
-struct PlainExpansion {
-  std::string bytes;  // up to the fault, if there was one
-  bool failed = false;
-};
+#include <cstring>
+#include <memory>
 
 class PlainExpander {
  public:
-  static PlainExpansion Expand(std::string_view codes) {
-    PlainExpander expander(codes);
-    while (expander.HasCode() && !expander.result_.failed) expander.Take(expander.NextCode());
-    return expander.result_;
+  PlainExpander() = default;
+  virtual ~PlainExpander() = default;
+  PlainExpander(const PlainExpander&) = delete;
+  PlainExpander& operator=(const PlainExpander&) = delete;
+
+  int32_t failed() const { return failed_; }
+  uint32_t bufferFill() const { return bufferFill_; }
+
+  // Takes the next block of the stream, the first one with the magic.
+  void ExpandBlock(const uint8_t* bytes, uint32_t count) {
+    if (failed_ != 0) return;
+    if (!magicSeen_) {
+      magicSeen_ = true;
+      if (count < 4 || memcmp(bytes, "PKZ", 3) != 0) {
+        failed_ = 1;
+        return;
+      }
+      bytes += 3;
+      count -= 3;
+    }
+    input_ = bytes;
+    inputLeft_ = count;
+    while (failed_ == 0 && Step()) {
+    }
   }
+
+  // Writes what is collected.
+  void Flush() {
+    if (Write(buffer_, bufferFill_) < bufferFill_) failed_ = 1;
+    bufferFill_ = 0;
+  }
+
+ protected:
+  // Answers how many of the bytes the output took.
+  virtual uint32_t Write(const uint8_t* bytes, uint32_t count) = 0;
 
  private:
-  static constexpr uint64_t kEntryLimit = 35023;
+  static constexpr uint32_t kTableSize = 35023;
+  static constexpr uint32_t kBufferSize = 1024;
 
-  explicit PlainExpander(std::string_view codes) : codes_(codes) {}
+  enum class State { kFirstCode, kNextCode, kFirstCodeAfterReset, kEmit };
 
-  bool HasCode() const { return position_ + width_ <= 8 * codes_.size(); }
+  struct Entry {
+    uint32_t prefix;
+    uint8_t suffix;
+  };
 
-  uint64_t NextCode() {
-    uint64_t code = 0;
-    for (const size_t end = position_ + width_; position_ < end; ++position_) {
-      const auto byte = static_cast<uint8_t>(codes_[position_ / 8]);
-      code = code * 2 + (byte >> (7 - position_ % 8) & 1);
+  bool Step() {
+    switch (state_) {
+      case State::kFirstCode:
+        return ReadFirstCode();
+      case State::kNextCode:
+        return ReadNextCode();
+      case State::kFirstCodeAfterReset:
+        return ReadFirstCode() && Emit();
+      default:
+        return Emit();
     }
-    return code;
   }
 
-  void Take(uint64_t code) {
-    if (previous_.empty()) {  // at the start, or behind a reset
-      if (code > 255) return Fail();
-      return Emit(std::string(1, static_cast<char>(code)));
+  bool ReadCode(uint32_t* code) {
+    if (bitsWanted_ == 0) {
+      codeValue_ = 0;
+      bitsWanted_ = codeWidth_;
     }
-    if (code == 257) {
-      if (++width_ > 32) Fail();
-      return;
+    for (;;) {
+      if (bitsInByte_ == 0) {
+        if (inputLeft_ == 0) return false;
+        currentByte_ = *input_++;
+        --inputLeft_;
+        bitsInByte_ = 8;
+      }
+      if (bitsInByte_ >= bitsWanted_) break;
+      codeValue_ = (codeValue_ << bitsInByte_) | currentByte_;
+      bitsWanted_ -= bitsInByte_;
+      bitsInByte_ = 0;
     }
+    bitsInByte_ -= bitsWanted_;
+    codeValue_ = (codeValue_ << bitsWanted_) | (currentByte_ >> bitsInByte_);
+    currentByte_ &= (1u << bitsInByte_) - 1;
+    bitsWanted_ = 0;
+    *code = codeValue_;
+    return true;
+  }
+
+  bool Refuse() {
+    failed_ = 1;
+    return false;
+  }
+
+  bool ReadFirstCode() {
+    uint32_t code = 0;
+    if (!ReadCode(&code)) return false;
+    if (code > 255) return Refuse();
+    Push(static_cast<uint8_t>(code));
+    previousCode_ = code;
+    firstByte_ = static_cast<uint8_t>(code);
+    state_ = State::kEmit;
+    return true;
+  }
+
+  bool ReadNextCode() {
+    uint32_t code = 0;
+    if (!ReadCode(&code)) return false;
     if (code == 258) {
-      table_.clear();
-      previous_.clear();
-      width_ = 9;
-      return;
+      nextCode_ = 259;
+      codeWidth_ = 9;
+      state_ = State::kFirstCodeAfterReset;
+      return true;
     }
-    const uint64_t free = 259 + table_.size();
-    std::string text;
-    if (code < 256) {
-      text = std::string(1, static_cast<char>(code));
-    } else if (code == free) {
-      text = previous_ + previous_[0];
-    } else if (table_.count(code) != 0) {
-      text = table_[code];
-    }
-    if (text.empty() || free >= kEntryLimit) return Fail();
-    table_[free] = previous_ + text[0];
-    Emit(text);
+    if (code == 257) return ++codeWidth_ <= 32 || Refuse();
+    if (code > nextCode_ || code == 256) return Refuse();
+    if (code == nextCode_) Push(firstByte_);
+    BuildString(code == nextCode_ ? previousCode_ : code);
+    firstByte_ = stringStack_[kTableSize - stringLength_];
+    if (nextCode_ >= kTableSize) return Refuse();
+    table_[nextCode_++] = {previousCode_, firstByte_};
+    previousCode_ = code;
+    state_ = State::kEmit;
+    return true;
   }
 
-  void Emit(const std::string& text) {
-    result_.bytes += text;
-    previous_ = text;
+  bool Emit() {
+    WriteOutput(stringStack_ + kTableSize - stringLength_, stringLength_);
+    stringLength_ = 0;
+    state_ = State::kNextCode;
+    return true;
   }
-  void Fail() { result_.failed = true; }
 
-  std::string_view codes_;
-  size_t position_ = 0;  // in bits
-  unsigned width_ = 9;
-  std::map<uint64_t, std::string> table_;
-  std::string previous_;  // string of the code before; empty when there is none
-  PlainExpansion result_;
+  void BuildString(uint32_t code) {
+    for (; code > 255; code = table_[code].prefix) Push(table_[code].suffix);
+    Push(static_cast<uint8_t>(code));
+  }
+  void Push(uint8_t byte) { stringStack_[kTableSize - ++stringLength_] = byte; }
+
+  void WriteOutput(const uint8_t* bytes, uint32_t count) {
+    while (bufferFill_ + count > kBufferSize) {
+      const uint32_t taken = kBufferSize - bufferFill_;
+      memcpy(buffer_ + bufferFill_, bytes, taken);
+      bufferFill_ = kBufferSize;
+      bytes += taken;
+      count -= taken;
+      Flush();
+    }
+    memcpy(buffer_ + bufferFill_, bytes, count);
+    bufferFill_ += count;
+  }
+
+  int32_t failed_ = 0;
+  int32_t bitsWanted_ = 0;
+  uint32_t codeValue_ = 0;
+  int32_t bitsInByte_ = 0;
+  uint32_t currentByte_ = 0;
+  const uint8_t* input_ = nullptr;
+  uint32_t inputLeft_ = 0;
+  State state_ = State::kFirstCode;
+  int32_t codeWidth_ = 9;
+  std::unique_ptr<Entry[]> table_ = std::make_unique<Entry[]>(kTableSize);
+  uint8_t stringStack_[kTableSize];
+  uint32_t stringLength_ = 0;
+  uint32_t previousCode_ = 0;
+  uint8_t firstByte_ = 0;
+  uint32_t nextCode_ = 259;
+  bool magicSeen_ = false;
+  uint8_t buffer_[kBufferSize] = {};
+  uint32_t bufferFill_ = 0;
 };
