@@ -2,7 +2,10 @@
 // and plain files is seen, and no link that leads out of the machine's folder.
 #include "machine/drives.h"
 
+#include <dirent.h>
+
 #include <algorithm>
+#include <memory>
 
 #include "machine/code_page.h"
 #include "machine/dos_path.h"
@@ -39,35 +42,39 @@ bool IsImageDrive(char drive) {
          !PathBelow(DriveFolder(kImageDrive), imageFile);
 }
 
-// A plain file or folder, or a link to one that lies inside the machine.
-bool IsReachable(const fs::path& path) {
+// What stands there: a regular file or a directory, also through a link that stays inside the
+// machine; not_found for nothing; none for what the program can't reach.
+fs::file_type TypeOf(const fs::path& path) {
   std::error_code error;
-  const fs::file_type type = fs::status(path, error).type();
-  if (type != fs::file_type::regular && type != fs::file_type::directory) return false;
-  if (!fs::is_symlink(path, error)) return true;
-  const fs::path target = fs::canonical(path, error);
-  return !error && PathBelow(machineFolder, target);
+  fs::file_type type = fs::symlink_status(path, error).type();
+  if (type == fs::file_type::none) return fs::file_type::not_found;  // too long for the host
+  if (type == fs::file_type::symlink) {
+    const fs::path target = fs::canonical(path, error);
+    if (error || !PathBelow(machineFolder, target)) return fs::file_type::none;
+    type = fs::status(path, error).type();
+  }
+  const bool isKnown = type == fs::file_type::regular || type == fs::file_type::directory ||
+                       type == fs::file_type::not_found;
+  return isKnown ? type : fs::file_type::none;
 }
 
 bool DriveExists(char drive) {
-  std::error_code error;
-  const fs::path folder = DriveFolder(drive);
-  return fs::is_directory(folder, error) && IsReachable(folder);
+  return TypeOf(DriveFolder(drive)) == fs::file_type::directory;
 }
 
-// What stands under this name, whatever its case. Of several that differ in case only, the one
-// spelled as given, else the first in byte order, so that the answer does not hang on the host's
-// order.
-std::optional<fs::path> FindEntry(const fs::path& folder, const std::string& name) {
-  std::error_code error;
-  const fs::path exact = folder / ToUtf8(name);
-  if (fs::exists(fs::symlink_status(exact, error))) return exact;
-  std::optional<fs::path> found;
-  for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
-       entry.increment(error)) {
-    const fs::path& path = entry->path();
-    const bool matches = EqualNoCase(FromUtf8(path.filename().string()), name);
-    if (matches && (!found || path < *found)) found = path;
+struct FolderClose {
+  void operator()(DIR* folder) const { closedir(folder); }
+};
+
+// The name of what stands in the folder under this name in any case. Of several the first in byte
+// order, so that the answer does not hang on the host's order. Empty for nothing.
+std::string FindSpelling(const fs::path& folder, const std::string& name) {
+  std::string found;
+  const std::unique_ptr<DIR, FolderClose> open(opendir(folder.c_str()));
+  while (const dirent* const entry = open ? readdir(open.get()) : nullptr) {
+    const std::string_view spelling = entry->d_name;
+    if (!EqualNoCase(FromUtf8(spelling), name)) continue;
+    if (found.empty() || spelling < found) found = spelling;
   }
   return found;
 }
@@ -87,19 +94,26 @@ std::optional<Location> LocateInFolder(const DosPath& path, Location location) {
   if (!DriveExists(path.drive)) return std::nullopt;
   location.host = DriveFolder(path.drive);
   location.isRoot = path.names.empty();
-  location.exists = true;
   location.parentExists = true;
-  std::error_code error;
+  fs::file_type type = fs::file_type::directory;
   for (const std::string& name : path.names) {
-    location.parentExists = location.exists && fs::is_directory(location.host, error);
-    const auto found =
-        location.parentExists ? FindEntry(location.host, name) : std::optional<fs::path>();
-    if (found && !IsReachable(*found)) return std::nullopt;
-    location.exists = found.has_value();
-    location.host = found ? *found : location.host / ToUtf8(name);
+    location.parentExists = type == fs::file_type::directory;
+    const fs::path folder = location.host;
+    location.host /= ToUtf8(name);
+    type = location.parentExists ? TypeOf(location.host) : fs::file_type::not_found;
+    if (type == fs::file_type::not_found && location.parentExists) {
+      const std::string spelling = FindSpelling(folder, name);
+      if (!spelling.empty()) {
+        location.host = folder / spelling;
+        type = TypeOf(location.host);
+      }
+    }
+    if (type == fs::file_type::none) return std::nullopt;
   }
-  const bool isFile = location.exists && !fs::is_directory(location.host, error);
+  location.exists = type != fs::file_type::not_found;
+  const bool isFile = type == fs::file_type::regular;
   if (isFile && location.endsInSeparator) return std::nullopt;
+  std::error_code error;
   location.isImage =
       isFile && !imageFile.empty() && fs::equivalent(location.host, imageFile, error);
   return location;

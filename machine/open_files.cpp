@@ -73,7 +73,7 @@ int OpenOnHost(const Location& location, const OpenMode& mode) {
   if (host < 0) return -1;
   GiveRoomBack(location.drive, oldSize);
   MarkProgram(location.host);
-  SetReadOnly(location.host, mode.readOnly);
+  if (mode.readOnly) SetReadOnly(location.host, true);
   return host;
 }
 
@@ -90,11 +90,12 @@ std::optional<uint64_t> Growth(uint64_t size, uint64_t position, uint64_t count)
   return std::max(size, position + count) - size;
 }
 
-bool WriteAll(int host, const char* bytes, size_t count) {
+bool WriteAll(int host, const char* bytes, size_t count, off_t position) {
   while (count > 0) {
-    const ssize_t written = write(host, bytes, count);
+    const ssize_t written = pwrite(host, bytes, count, position);
     if (written <= 0) return false;
     bytes += written;
+    position += written;
     count -= static_cast<size_t>(written);
   }
   return true;
@@ -115,7 +116,8 @@ int OpenProgramFile(ObjectKind kind, std::string_view dosPath, const OpenMode& m
                                      .drive = location->drive,
                                      .device = status.st_dev,
                                      .inode = status.st_ino,
-                                     .host = host});
+                                     .host = host,
+                                     .size = static_cast<uint64_t>(status.st_size)});
   ObjectOpened(kind);
   return number;
 }
@@ -158,7 +160,7 @@ uint64_t FileSize(const OpenFile& file) {
 std::optional<int64_t> MovePosition(OpenFile& file, int64_t distance, DWORD origin, int64_t limit) {
   int64_t position = 0;
   if (origin == FILE_CURRENT) {
-    position = lseek(file.host, 0, SEEK_CUR);
+    position = file.position;
   } else if (origin == FILE_END) {
     position = static_cast<int64_t>(FileSize(file));
   } else if (origin != FILE_BEGIN) {
@@ -166,7 +168,7 @@ std::optional<int64_t> MovePosition(OpenFile& file, int64_t distance, DWORD orig
   }
   if (__builtin_add_overflow(position, distance, &position)) return std::nullopt;
   if (position < 0 || position > limit) return std::nullopt;
-  if (lseek(file.host, position, SEEK_SET) != position) return std::nullopt;
+  file.position = position;
   return position;
 }
 
@@ -174,10 +176,12 @@ std::optional<size_t> ReadBytes(OpenFile& file, void* buffer, size_t count) {
   if ((file.mode.access & kRead) == 0) return std::nullopt;
   size_t done = 0;
   while (done < count) {
-    const ssize_t got = read(file.host, static_cast<char*>(buffer) + done, count - done);
+    const ssize_t got =
+        pread(file.host, static_cast<char*>(buffer) + done, count - done, file.position);
     if (got < 0) return std::nullopt;
     if (got == 0) break;
     done += static_cast<size_t>(got);
+    file.position += got;
   }
   return done;
 }
@@ -185,15 +189,19 @@ std::optional<size_t> ReadBytes(OpenFile& file, void* buffer, size_t count) {
 bool WriteBytes(OpenFile& file, const void* buffer, size_t count) {
   if ((file.mode.access & kWrite) == 0) return false;
   if (count == 0) return true;
-  const off_t position = lseek(file.host, 0, SEEK_CUR);
-  const uint64_t size = FileSize(file);
-  const auto growth = Growth(size, static_cast<uint64_t>(position), count);
+  if ((file.mode.share & kWrite) != 0) file.size = FileSize(file);
+  const auto growth = Growth(file.size, static_cast<uint64_t>(file.position), count);
   if (!growth || !TakeRoom(file.drive, *growth)) return false;
-  if (WriteAll(file.host, static_cast<const char*>(buffer), count)) return true;
+  if (WriteAll(file.host, static_cast<const char*>(buffer), count, file.position)) {
+    file.position += static_cast<int64_t>(count);
+    file.size += *growth;
+    return true;
+  }
 
   // The host's own disk is full: undo what went through.
-  if (ftruncate(file.host, static_cast<off_t>(size)) == 0) GiveRoomBack(file.drive, *growth);
-  lseek(file.host, position, SEEK_SET);
+  if (ftruncate(file.host, static_cast<off_t>(file.size)) == 0) {
+    GiveRoomBack(file.drive, *growth);
+  }
   return false;
 }
 

@@ -34,8 +34,10 @@ struct OpenFile {
   char drive;
   dev_t device;  // with the inode: which file it is, whatever its path
   ino_t inode;
-  int host;           // the host's descriptor, owned
-  bool text = false;  // a descriptor that writes LF as CR LF
+  int host;              // the host's descriptor, owned
+  int64_t position = 0;  // the program's; the host's own is not used
+  uint64_t size = 0;     // as last seen; the file's own while nobody else may write it
+  bool text = false;     // a descriptor that writes LF as CR LF
 };
 
 // Opens a file of the program's. Refuses what Windows refuses: directories, writing a read-only
