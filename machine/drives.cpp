@@ -2,13 +2,11 @@
 // and plain files is seen, and no link that leads out of the machine's folder.
 #include "machine/drives.h"
 
-#include <dirent.h>
-
 #include <algorithm>
-#include <memory>
 
 #include "machine/code_page.h"
 #include "machine/dos_path.h"
+#include "machine/folder_names.h"
 #include "machine/machine.h"
 
 namespace fs = std::filesystem;
@@ -60,23 +58,6 @@ fs::file_type TypeOf(const fs::path& path) {
 
 bool DriveExists(char drive) {
   return TypeOf(DriveFolder(drive)) == fs::file_type::directory;
-}
-
-struct FolderClose {
-  void operator()(DIR* folder) const { closedir(folder); }
-};
-
-// The name of what stands in the folder under this name in any case. Of several the first in byte
-// order, so that the answer does not hang on the host's order. Empty for nothing.
-std::string FindSpelling(const fs::path& folder, const std::string& name) {
-  std::string found;
-  const std::unique_ptr<DIR, FolderClose> open(opendir(folder.c_str()));
-  while (const dirent* const entry = open ? readdir(open.get()) : nullptr) {
-    const std::string_view spelling = entry->d_name;
-    if (!EqualNoCase(FromUtf8(spelling), name)) continue;
-    if (found.empty() || spelling < found) found = spelling;
-  }
-  return found;
 }
 
 std::optional<Location> LocateOnImageDrive(const DosPath& path, Location location) {
@@ -172,6 +153,7 @@ void OpenDrives(const fs::path& folder, const fs::path& image) {
 }
 
 void CloseDrives() {
+  ForgetFolders();
   machineFolder.clear();
   imageFile.clear();
   imageDosPath.clear();

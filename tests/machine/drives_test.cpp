@@ -76,6 +76,29 @@ TEST(Drives, SomePathsLeadNowhere) {
   for (const std::string& path : rows) EXPECT_FALSE(Locate(path).has_value()) << path;
 }
 
+TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
+  TestMachine pc;
+  const auto exists = [](const char* path) { return Locate(path)->exists; };
+  pc.Write("drive_c/dir/One", "x");
+  EXPECT_TRUE(exists("C:\\DIR\\ONE"));
+  EXPECT_FALSE(exists("C:\\DIR\\TWO"));
+  pc.Write("drive_c/dir/Two", "x");
+  EXPECT_TRUE(exists("C:\\DIR\\TWO"));
+  fs::rename(pc.Host("drive_c/dir/Two"), pc.Host("drive_c/dir/Three"));
+  EXPECT_FALSE(exists("C:\\DIR\\TWO"));
+  EXPECT_TRUE(exists("C:\\DIR\\THREE"));
+  // Another folder under the same path: moved there, or made anew.
+  fs::rename(pc.Host("drive_c/dir"), pc.Host("drive_c/old"));
+  pc.Write("drive_c/dir/Four", "x");
+  EXPECT_FALSE(exists("C:\\DIR\\ONE"));
+  EXPECT_TRUE(exists("C:\\DIR\\FOUR"));
+  EXPECT_TRUE(exists("C:\\OLD\\ONE"));
+  fs::remove_all(pc.Host("drive_c/old"));
+  pc.Write("drive_c/old/Five", "x");
+  EXPECT_FALSE(exists("C:\\OLD\\ONE"));
+  EXPECT_TRUE(exists("C:\\OLD\\FIVE"));
+}
+
 TEST(Drives, LengthIsThatOfTheFullPath) {
   TestMachine pc;
   EXPECT_TRUE(Locate("C:\\" + std::string(256, 'a')).has_value());
