@@ -20,8 +20,8 @@ namespace {
 
 struct User {
   UserScript script;
-  std::function<void()> turn;         // of a user without a script
-  std::deque<UserLine> duringClicks;  // wait for the running step's next poll
+  std::function<void()> turn;   // of a user without a script
+  std::deque<UserLine> during;  // wait for the running step's next poll
   int polls = 0;
 };
 
@@ -55,8 +55,14 @@ const Window* DefaultButton(const Dialog& dialog) {
   return nullptr;
 }
 
-void ShowDialog() {
+// The whole dialog, or the one control of that id.
+void ShowDialog(int id = 0) {
   const Dialog& dialog = *OpenDialog();
+  if (id != 0) {
+    const Window* const control = dialog.Find(id);
+    TellUser(control != nullptr ? Shown(*control) : std::to_string(id) + " absent");
+    return;
+  }
   TellUser("dialog " + Quoted(dialog.frame.text) + " focus " +
            IdOrNone(FindWindowByHandle(dialog.focus)) + " default " +
            IdOrNone(DefaultButton(dialog)));
@@ -87,6 +93,19 @@ Window* Clickable(const UserLine& line) {
   return control;
 }
 
+// Where a click lands that does not look: on the control, whatever has become of it.
+Window* Existing(const UserLine& line) {
+  Window* const control = OpenDialog()->Find(line.control);
+  if (control == nullptr) Fail(line.place + ": there is no such control");
+  return control;
+}
+
+bool IsRead(const std::string& text) {
+  return std::ranges::any_of(OpenDialog()->controls, [&text](const auto& control) {
+    return control->IsShown() && control->text.find(text) != std::string::npos;
+  });
+}
+
 void Type(const UserLine& line) {
   Window* const control = Clickable(line);
   if (control->kind != WindowKind::kEdit) Fail(line.place + ": not an edit field");
@@ -102,18 +121,25 @@ void MakeRegistryKey(const std::string& path) {
 void Act(const UserLine& line) {
   switch (line.verb) {
     case UserVerb::kPress:
-    case UserVerb::kClickDuring:
       Click(Clickable(line)->handle);
+      break;
+    case UserVerb::kClickDuring:
+      Click(Existing(line)->handle);
       break;
     case UserVerb::kType:
       Type(line);
       break;
     case UserVerb::kEscape:
+    case UserVerb::kEscapeDuring:
     case UserVerb::kClose:
+    case UserVerb::kCloseDuring:
       SendCancel();
       break;
+    case UserVerb::kUntilDuring:
+      if (!IsRead(FromUtf8(line.detail))) Fail(line.place + ": the step never said that");
+      break;
     case UserVerb::kShow:
-      ShowDialog();
+      ShowDialog(line.control);
       break;
     case UserVerb::kKey:
       MakeRegistryKey(line.detail);
@@ -128,14 +154,17 @@ void Act(const UserLine& line) {
 void ActDuringStep(const UserLine& line) {
   switch (line.verb) {
     case UserVerb::kPress:
-    case UserVerb::kClickDuring:
       PostClick(Clickable(line)->handle);
       break;
+    case UserVerb::kClickDuring:
+      PostClick(Existing(line)->handle);
+      break;
     case UserVerb::kClose:
+    case UserVerb::kCloseDuring:
       PostCancel();
       break;
     case UserVerb::kShow:
-      ShowDialog();
+      ShowDialog(line.control);
       break;
     case UserVerb::kKey:
       MakeRegistryKey(line.detail);
@@ -147,16 +176,39 @@ void ActDuringStep(const UserLine& line) {
   }
 }
 
-// The clicks of the lines that follow an action go to the step that it has started.
-void TakeDuringClicks() {
+// The lines that follow an action go to the step that it has started.
+void TakeDuring() {
   std::deque<UserLine>& actions = user->script.actions;
-  while (!actions.empty() && actions.front().verb == UserVerb::kClickDuring) {
-    user->duringClicks.push_back(TakeFirst(&actions));
+  while (!actions.empty() && IsDuring(actions.front().verb)) {
+    user->during.push_back(TakeFirst(&actions));
   }
 }
 
-void PostDuringClicks() {
-  while (!user->duringClicks.empty()) ActDuringStep(TakeFirst(&user->duringClicks));
+void PostDuring() {
+  std::deque<UserLine>& lines = user->during;
+  while (!lines.empty()) {
+    const UserLine& next = lines.front();
+    if (next.verb == UserVerb::kUntilDuring && !IsRead(FromUtf8(next.detail))) return;
+    ActDuringStep(TakeFirst(&lines));
+  }
+}
+
+// Windows disables the owner for as long as a box or a picker stands.
+class OwnerDisabled {
+ public:
+  OwnerDisabled() {
+    if (OpenDialog() != nullptr) OpenDialog()->frame.style |= WS_DISABLED;
+  }
+  ~OwnerDisabled() {
+    if (OpenDialog() != nullptr) OpenDialog()->frame.style &= ~uint32_t{WS_DISABLED};
+  }
+  OwnerDisabled(const OwnerDisabled&) = delete;
+  OwnerDisabled& operator=(const OwnerDisabled&) = delete;
+};
+
+void DispatchAll() {
+  while (DispatchNext()) {
+  }
 }
 
 }  // namespace
@@ -165,7 +217,7 @@ bool LoadUser(const std::filesystem::path& script, std::string* error) {
   std::optional<UserScript> read = ReadUserScript(script, error);
   if (!read) return false;
   user.emplace().script = std::move(*read);
-  TakeDuringClicks();
+  TakeDuring();
   return true;
 }
 
@@ -191,9 +243,9 @@ void TakeUserTurn() {
     user->turn();
     return;
   }
-  if (!user->duringClicks.empty()) {
-    // The start-up that these were meant for did not poll: they reach the idle dialog.
-    Act(TakeFirst(&user->duringClicks));
+  if (!user->during.empty()) {
+    // The step that these were meant for did not poll: they reach the idle dialog.
+    Act(TakeFirst(&user->during));
     return;
   }
   std::deque<UserLine>& actions = user->script.actions;
@@ -201,9 +253,9 @@ void TakeUserTurn() {
   const UserLine line = TakeFirst(&actions);
   // A click that follows is met by the first poll of what the action starts: inside its very
   // handler, or in the step that the handler has posted, behind which the click then waits.
-  TakeDuringClicks();
+  TakeDuring();
   Act(line);
-  if (!OpenDialog()->hasEnded) PostDuringClicks();
+  if (!OpenDialog()->hasEnded) PostDuring();
 }
 
 void UserAtPoll() {
@@ -215,7 +267,7 @@ void UserAtPoll() {
   std::ranges::copy_if(waiting, std::back_inserter(now), isNow);
   std::erase_if(waiting, isNow);
   for (const UserLine& line : now) ActDuringStep(line);
-  PostDuringClicks();
+  PostDuring();
 }
 
 int AnswerBox(const std::string& caption, const std::string& text, UINT type) {
@@ -227,9 +279,10 @@ int AnswerBox(const std::string& caption, const std::string& text, UINT type) {
   if (user->turn) return IDYES;
   if (user->script.answers.empty()) Fail(user->script.file + ": no answer to " + box);
   const UserLine answer = TakeFirst(&user->script.answers);
+  const OwnerDisabled modal;
   if (answer.verb == UserVerb::kAnswerLate) {
-    while (DispatchNext()) {
-    }
+    PostDuring();
+    DispatchAll();
   }
   TellUser(box + " " + answer.detail);
   return answer.detail == "yes" ? IDYES : IDNO;
@@ -240,6 +293,9 @@ bool PickFolder(const std::string& prompt, std::string* path) {
   const std::string picker = "picker " + Quoted(prompt);
   if (user->script.picks.empty()) Fail(user->script.file + ": no answer to " + picker);
   const std::string picked = TakeFirst(&user->script.picks).detail;
+  const OwnerDisabled modal;
+  PostDuring();
+  DispatchAll();
   TellUser(picker + " " + picked);
   *path = FromUtf8(picked);
   return picked != "none";
@@ -268,7 +324,7 @@ std::string Quoted(const std::string& text) {
 void EndUser() {
   if (!user) return;
   const UserScript& script = user->script;
-  for (const auto& left : {user->duringClicks, script.actions, script.answers, script.picks}) {
+  for (const auto& left : {user->during, script.actions, script.answers, script.picks}) {
     if (!left.empty()) Fail(left.front().place + ": left over when the dialog ended");
   }
   if (!script.atPolls.empty()) {

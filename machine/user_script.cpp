@@ -8,7 +8,7 @@ namespace machine {
 namespace {
 
 // What stands behind a verb.
-enum class Operand { kNone, kControl, kControlAndText, kYesOrNo, kPath };
+enum class Operand { kNone, kControl, kPerhapsControl, kControlAndText, kYesOrNo, kText };
 
 struct VerbForm {
   const char* name;
@@ -20,14 +20,17 @@ constexpr VerbForm kVerbs[] = {
     {"wait", UserVerb::kWait, Operand::kNone},
     {"press", UserVerb::kPress, Operand::kControl},
     {"click-during", UserVerb::kClickDuring, Operand::kControl},
+    {"close-during", UserVerb::kCloseDuring, Operand::kNone},
+    {"escape-during", UserVerb::kEscapeDuring, Operand::kNone},
+    {"until-during", UserVerb::kUntilDuring, Operand::kText},
     {"type", UserVerb::kType, Operand::kControlAndText},
     {"escape", UserVerb::kEscape, Operand::kNone},
     {"close", UserVerb::kClose, Operand::kNone},
-    {"show", UserVerb::kShow, Operand::kNone},
-    {"key", UserVerb::kKey, Operand::kPath},
+    {"show", UserVerb::kShow, Operand::kPerhapsControl},
+    {"key", UserVerb::kKey, Operand::kText},
     {"answer", UserVerb::kAnswer, Operand::kYesOrNo},
     {"answer-late", UserVerb::kAnswerLate, Operand::kYesOrNo},
-    {"pick", UserVerb::kPick, Operand::kPath},
+    {"pick", UserVerb::kPick, Operand::kText},
 };
 
 // Takes the first word off, with the one blank behind it.
@@ -51,6 +54,9 @@ bool TakeOperand(Operand operand, std::string text, UserLine* line) {
   switch (operand) {
     case Operand::kNone:
       return text.empty();
+    case Operand::kPerhapsControl:
+      if (text.empty()) return true;
+      [[fallthrough]];
     case Operand::kControl:
       return TakeNumber(&text, &line->control) && text.empty();
     case Operand::kControlAndText:
@@ -60,7 +66,7 @@ bool TakeOperand(Operand operand, std::string text, UserLine* line) {
     case Operand::kYesOrNo:
       line->detail = text;
       return text == "yes" || text == "no";
-    case Operand::kPath:
+    case Operand::kText:
       line->detail = text;
       return !text.empty();
   }
@@ -99,6 +105,11 @@ bool Sort(const UserLine& line, UserScript* script) {
 }
 
 }  // namespace
+
+bool IsDuring(UserVerb verb) {
+  return verb == UserVerb::kClickDuring || verb == UserVerb::kCloseDuring ||
+         verb == UserVerb::kEscapeDuring || verb == UserVerb::kUntilDuring;
+}
 
 std::optional<UserScript> ReadUserScript(const std::filesystem::path& file, std::string* error) {
   UserScript script;

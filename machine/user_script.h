@@ -13,6 +13,9 @@ enum class UserVerb {
   kWait,
   kPress,
   kClickDuring,
+  kCloseDuring,
+  kEscapeDuring,
+  kUntilDuring,
   kType,
   kEscape,
   kClose,
@@ -26,10 +29,13 @@ enum class UserVerb {
 struct UserLine {
   std::string place;  // "FILE:LINE: TEXT", for messages
   UserVerb verb = UserVerb::kWait;
-  int control = 0;     // id, of the verbs that name a control
-  std::string detail;  // UTF-8: what is typed, the path, "yes", "no", "none"
+  int control = 0;     // id, of the verbs that name a control; 0 for a "show" of the whole dialog
+  std::string detail;  // UTF-8: what is typed or waited for, the path, "yes", "no", "none"
   int poll = 0;        // of a line that belongs to the n-th poll of the run; 0 for the others
 };
+
+// Whether the line belongs to the step that the line before it has started.
+bool IsDuring(UserVerb verb);
 
 // Each kind of line in the script's order. Answers and picks are queues of their own: the n-th box
 // takes the n-th answer, wherever it stands.

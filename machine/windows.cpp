@@ -184,6 +184,7 @@ bool DispatchNext() {
 void Click(HWND handle) {
   Window* const control = FindWindowByHandle(handle);
   if (control == nullptr || !control->IsShown() || !control->IsEnabled()) return;
+  if (!openDialog->frame.IsEnabled()) return;
   if (control->kind == WindowKind::kButton) {
     openDialog->focus = handle;
     Command(control->id, 0, handle);

@@ -74,9 +74,9 @@ bool DispatchNext();
 // ---- What a user does
 
 // A click on a control. On one that is hidden or disabled it has no effect, as on Windows, where it
-// reaches the dialog under the control. A button or an edit field takes the focus. Windows' dialog
-// manager then also makes the button that has it the default one for as long; not every system
-// does, and here the style stays as the program set it.
+// reaches the dialog under the control; nor has it while the dialog itself is disabled. A button or
+// an edit field takes the focus. Windows' dialog manager then also makes the button that has it the
+// default one for as long; not every system does, and here the style stays as the program set it.
 void Click(HWND control);
 // A click that waits in the queue.
 void PostClick(HWND control);

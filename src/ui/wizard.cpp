@@ -465,9 +465,16 @@ void CarryOut(int id, SetupContext* context) {
   }
 }
 
+// The system disables the dialog for as long as a box or the folder picker stands. No user can mean
+// it then, but a command that was posted before is still dispatched by the box's loop: it must not
+// open a second question, nor release the context under the handler that waits for the first.
+bool IsUnderABox() {
+  return (GetWindowLongA(wizardState.window, GWL_STYLE) & WS_DISABLED) != 0;
+}
+
 void OnCommand(WPARAM command, HWND control) {
   const int id = LOWORD(command);
-  if (wizardState.window == nullptr || !IsCommand(id, HIWORD(command))) return;
+  if (wizardState.window == nullptr || !IsCommand(id, HIWORD(command)) || IsUnderABox()) return;
   if (!HoldCommand(command, control)) CarryOut(id, wizardState.context);
 }
 

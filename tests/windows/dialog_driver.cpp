@@ -7,11 +7,12 @@
 // it is. OUTPUT is a file, made anew, in UTF-8; its last line is "exit code: N", or one that begins
 // with "failed: " when the script doesn't fit the run.
 //
-// "at-poll" is the stand-in's alone. "until-during TEXT", behind a line that starts a step, waits
-// until the message area has this text: the pass has come so far, and a "click-during" then meets
-// its next poll. Three lines more are for tools/screenshots: "picture NAME" prints itself and waits
-// until the file OUTPUT.NAME is there; "picture-during NAME" does so at once behind the line before
-// it, "picture-box NAME" when the next box stands.
+// "at-poll" is the stand-in's alone. A line that begins a step and the lines "...-during" behind it
+// reach the program's queue while its thread stands still, so that nothing comes between them.
+// "until-during TEXT" lets it run until the message area has this text: the pass has come so far,
+// and what follows meets its next polls. Three lines more are for tools/screenshots: "picture NAME"
+// prints itself and waits until the file OUTPUT.NAME is there; "picture-during NAME" does so at
+// once behind the line before it, "picture-box NAME" when the next box stands.
 #include <windows.h>
 // After windows.h.
 #include <shlobj.h>
@@ -21,6 +22,7 @@
 #include <cstdlib>
 #include <deque>
 #include <fstream>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -68,8 +70,11 @@ void WaitForPicture(const std::string& name) {
   Fail("nobody took the picture " + name);
 }
 
-void Show(HWND dialog) {
-  for (const std::string& line : DescribeDialog(dialog)) Print(line);
+// The whole dialog, or the line of the one control that bears the id.
+void Show(HWND dialog, const std::string& id = "") {
+  for (const std::string& line : DescribeDialog(dialog)) {
+    if (id.empty() || line.starts_with(id + " ")) Print(line);
+  }
 }
 
 bool HasEnded() {
@@ -196,6 +201,12 @@ void WaitForMessage(HWND dialog, const std::wstring& text) {
   Fail("the message area never had the text");
 }
 
+HWND Existing(HWND dialog, const std::string& id) {
+  const HWND control = GetDlgItem(dialog, std::atoi(id.c_str()));
+  if (control == nullptr) Fail("there is no control " + id);
+  return control;
+}
+
 HWND Clickable(HWND dialog, const std::string& id) {
   const HWND control = GetDlgItem(dialog, std::atoi(id.c_str()));
   if (control == nullptr || !IsShown(control) || !IsWindowEnabled(control)) {
@@ -205,30 +216,49 @@ HWND Clickable(HWND dialog, const std::string& id) {
   return control;
 }
 
-// The messages of a mouse on the control. They go through the program's own queue as a real click's
-// do; the pointer itself stays where it is, so that no other window of the display matters.
+// A click of the pointer in the middle of the control's place. What lies there is found out when
+// the program takes the message; posted messages come first.
 void Click(HWND control) {
+  constexpr LONG kSteps = 65536;  // across and down the screen
   RECT area = {};
-  GetClientRect(control, &area);
-  const LPARAM middle = MAKELPARAM(area.right / 2, area.bottom / 2);
-  PostMessageA(control, WM_LBUTTONDOWN, MK_LBUTTON, middle);
-  PostMessageA(control, WM_LBUTTONUP, 0, middle);
+  GetWindowRect(control, &area);
+  const LONG x = (area.left + area.right) / 2;
+  const LONG y = (area.top + area.bottom) / 2;
+  INPUT inputs[3] = {};
+  inputs[0].mi.dx = (x * kSteps + kSteps / 2) / GetSystemMetrics(SM_CXSCREEN);
+  inputs[0].mi.dy = (y * kSteps + kSteps / 2) / GetSystemMetrics(SM_CYSCREEN);
+  inputs[0].mi.dwFlags = MOUSEEVENTF_MOVE | MOUSEEVENTF_ABSOLUTE;
+  inputs[1].mi.dwFlags = MOUSEEVENTF_LEFTDOWN;
+  inputs[2].mi.dwFlags = MOUSEEVENTF_LEFTUP;
+  SendInput(std::size(inputs), inputs, sizeof inputs[0]);
+}
+
+void PressKey(WORD key) {
+  INPUT inputs[2] = {};
+  for (INPUT& input : inputs) {
+    input.type = INPUT_KEYBOARD;
+    input.ki.wVk = key;
+  }
+  inputs[1].ki.dwFlags = KEYEVENTF_KEYUP;
+  SendInput(std::size(inputs), inputs, sizeof inputs[0]);
 }
 
 void Act(HWND dialog, const Line& line) {
-  if (line.verb == "press" || line.verb == "click-during") {
+  if (line.verb == "press") {
     Click(Clickable(dialog, line.rest));
+  } else if (line.verb == "click-during") {
+    Click(Existing(dialog, line.rest));
   } else if (line.verb == "type") {
     const size_t blank = std::min(line.rest.find(' '), line.rest.size());
     const std::wstring text = Wide(line.rest.substr(std::min(blank + 1, line.rest.size())));
     const HWND edit = Clickable(dialog, line.rest.substr(0, blank));
     Ask(edit, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(text.c_str()));
-  } else if (line.verb == "escape") {
-    PostMessageA(dialog, WM_KEYDOWN, VK_ESCAPE, 1);
-  } else if (line.verb == "close") {
+  } else if (line.verb == "escape" || line.verb == "escape-during") {
+    PressKey(VK_ESCAPE);
+  } else if (line.verb == "close" || line.verb == "close-during") {
     PostMessageA(dialog, WM_SYSCOMMAND, SC_CLOSE, 0);
   } else if (line.verb == "show") {
-    Show(dialog);
+    Show(dialog, line.rest);
   } else if (line.verb == "picture" || line.verb == "picture-during") {
     Sleep(10 * kStepTime);  // until it is drawn
     WaitForPicture(line.rest);
@@ -240,6 +270,28 @@ void Act(HWND dialog, const Line& line) {
     RegCloseKey(key);
   } else if (line.verb != "wait") {
     Fail("not a line for a real window: " + line.verb);
+  }
+}
+
+bool IsInputDuring() {
+  return !script.empty() && script.front().verb.ends_with("-during") &&
+         script.front().verb != "until-during" && script.front().verb != "picture-during";
+}
+
+// A line and those that belong to its step. A press goes by way of a posted message then, so that
+// it comes before all of them.
+void ActWithDuring(HWND dialog, const Line& line) {
+  const bool isJoined = line.verb == "press" && IsInputDuring();
+  const HWND pressed = isJoined ? Clickable(dialog, line.rest) : nullptr;
+  if (!isJoined) Act(dialog, line);
+  if (IsInputDuring()) {
+    SuspendThread(process.hThread);
+    if (isJoined) PostMessageA(pressed, BM_CLICK, 0, 0);
+    for (; IsInputDuring(); script.pop_front()) Act(dialog, script.front());
+    ResumeThread(process.hThread);
+  }
+  for (; !script.empty() && script.front().verb.ends_with("-during"); script.pop_front()) {
+    Act(dialog, script.front());
   }
 }
 
@@ -264,11 +316,7 @@ void Play() {
   while (!script.empty() && dialog != nullptr) {
     const Line line = script.front();
     script.pop_front();
-    Act(dialog, line);
-    while (!script.empty() && script.front().verb.ends_with("-during")) {
-      Act(dialog, script.front());
-      script.pop_front();
-    }
+    ActWithDuring(dialog, line);
     dialog = WaitForPage();
   }
   if (dialog != nullptr) {
