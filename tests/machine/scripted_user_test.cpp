@@ -111,6 +111,8 @@ TEST_F(ScriptedUser, ScriptThatDoesNotFitTheRunEndsTheProcess) {
       {"answer no\nescape\n", "user.txt:1: answer no: left over"},
       {"pick none\nescape\n", "user.txt:1: pick none: left over"},
       {"escape\nclick-during 10\n", "user.txt:2: click-during 10: left over"},
+      {"until-during Sure\nescape\n", "user.txt:1: until-during Sure: the step never said that"},
+      {"click-during 99\nescape\n", "user.txt:1: click-during 99: there is no such control"},
       {"at-poll 1 escape\nescape\n", "user.txt:1: at-poll 1 escape: the run polled 0 times only"},
       {"press 10\n", "user.txt: no answer to box \"Question\" \"Sure\\?\""},
       {"press 99\n", "user.txt:1: press 99: no user could click"},
@@ -141,6 +143,7 @@ class UserDuringAPass : public ScriptedUser {
     const auto poll = [&] {
       for (int count = 1; count <= 5; ++count) {
         order.push_back("poll " + std::to_string(count));
+        SetWindowTextA(GetDlgItem(machine::OpenDialog()->frame.handle, 11), order.back().c_str());
         MSG message = {};
         if (PeekMessageA(&message, nullptr, 0, 0, PM_REMOVE) != FALSE) DispatchMessageA(&message);
       }
@@ -174,6 +177,13 @@ TEST_F(UserDuringAPass, LineIsDoneAtItsPoll) {
       PlayPass("at-poll 2 escape\nat-poll 3 close\nat-poll 4 press 11\npress 10\nescape\n", false),
       (std::vector<std::string>{"command 10", "poll 1", "poll 2", "poll 3", "command 2", "poll 4",
                                 "command 11", "poll 5", "command 2"}));
+}
+
+TEST_F(UserDuringAPass, LinesWaitUntilTheStepSaysSomething) {
+  // The third poll shows the text; the close box behind it is met at once.
+  EXPECT_EQ(PlayPass("press 10\nuntil-during poll 3\nclose-during\nescape\n", true),
+            (std::vector<std::string>{"command 10", "poll 1", "poll 2", "poll 3", "command 2",
+                                      "poll 4", "poll 5", "command 2"}));
 }
 
 TEST_F(UserDuringAPass, KeyIsMadeInTheRegistry) {

@@ -107,6 +107,7 @@ TEST_F(Windows, PostedMessagesComeInTheirOrderAndNeverInsideTheCall) {
 }
 
 // A box that is answered at once runs nothing; one that is answered late has run all that waited.
+// The dialog is disabled under it.
 TEST_F(Windows, BoxDispatchesWhatIsPostedWhileItIsOpen) {
   for (const bool late : {false, true}) {
     Order order;
@@ -121,6 +122,7 @@ TEST_F(Windows, BoxDispatchesWhatIsPostedWhileItIsOpen) {
           }
           if (message == kSecondStep) {
             order.push_back("second step");
+            EXPECT_EQ((GetWindowLongA(dialog, GWL_STYLE) & WS_DISABLED) != 0, late);
             PostMessageA(dialog, kThirdStep, 0, 0);
           }
           if (message == kThirdStep) {
