@@ -141,6 +141,8 @@ class Wine:
 
     # All that the program and the scenarios touch; the rest of Wine's registry is not looked at.
     WATCHED = (r'SOFTWARE\Zeb', r'SOFTWARE\Netscape',
+               r'SOFTWARE\Classes\http\shell\open\command',
+               r'SOFTWARE\Classes\htmlfile\shell\open\command',
                r'SOFTWARE\Microsoft\Windows\CurrentVersion\Uninstall',
                r'SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce',
                r'SOFTWARE\Microsoft\Windows\CurrentVersion\App Paths')
@@ -178,7 +180,7 @@ class Wine:
         for key in self.WATCHED:
             self.agent.ask(f'delete {key}')
         # As on a fresh stand-in machine.
-        for key in self.WATCHED[2:]:
+        for key in self.WATCHED[4:]:
             self.agent.ask(f'key {key}')
 
     def clean_files(self):

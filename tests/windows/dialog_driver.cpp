@@ -10,7 +10,8 @@
 // "at-poll" is the stand-in's alone. A line that begins a step and the lines "...-during" behind it
 // reach the program's queue while its thread stands still, so that nothing comes between them.
 // "until-during TEXT" lets it run until the message area has this text: the pass has come so far,
-// and what follows meets its next polls. Three lines more are for tools/screenshots: "picture NAME"
+// and what follows meets its next polls. "until-file PATH" waits for a file that another program
+// writes. Three lines more are for tools/screenshots: "picture NAME"
 // prints itself and waits until the file OUTPUT.NAME is there; "picture-during NAME" does so at
 // once behind the line before it, "picture-box NAME" when the next box stands.
 #include <windows.h>
@@ -22,11 +23,11 @@
 #include <cstdlib>
 #include <deque>
 #include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
 #include "tests/windows/dialog_view.h"
+#include "tests/windows/user_input.h"
 
 namespace {
 
@@ -201,6 +202,18 @@ void WaitForMessage(HWND dialog, const std::wstring& text) {
   Fail("the message area never had the text");
 }
 
+// Another program, which the dialog has started, writes it.
+void WaitForFile(const std::string& path) {
+  for (int look = 0; look < kMostLooks; ++look) {
+    WIN32_FILE_ATTRIBUTE_DATA file = {};
+    if (GetFileAttributesExA(path.c_str(), GetFileExInfoStandard, &file) && file.nFileSizeLow > 0) {
+      return;
+    }
+    Sleep(kStepTime);
+  }
+  Fail("nobody wrote " + path);
+}
+
 HWND Existing(HWND dialog, const std::string& id) {
   const HWND control = GetDlgItem(dialog, std::atoi(id.c_str()));
   if (control == nullptr) Fail("there is no control " + id);
@@ -214,33 +227,6 @@ HWND Clickable(HWND dialog, const std::string& id) {
     Fail("no user could click on " + id);
   }
   return control;
-}
-
-// A click of the pointer in the middle of the control's place. What lies there is found out when
-// the program takes the message; posted messages come first.
-void Click(HWND control) {
-  constexpr LONG kSteps = 65536;  // across and down the screen
-  RECT area = {};
-  GetWindowRect(control, &area);
-  const LONG x = (area.left + area.right) / 2;
-  const LONG y = (area.top + area.bottom) / 2;
-  INPUT inputs[3] = {};
-  inputs[0].mi.dx = (x * kSteps + kSteps / 2) / GetSystemMetrics(SM_CXSCREEN);
-  inputs[0].mi.dy = (y * kSteps + kSteps / 2) / GetSystemMetrics(SM_CYSCREEN);
-  inputs[0].mi.dwFlags = MOUSEEVENTF_MOVE | MOUSEEVENTF_ABSOLUTE;
-  inputs[1].mi.dwFlags = MOUSEEVENTF_LEFTDOWN;
-  inputs[2].mi.dwFlags = MOUSEEVENTF_LEFTUP;
-  SendInput(std::size(inputs), inputs, sizeof inputs[0]);
-}
-
-void PressKey(WORD key) {
-  INPUT inputs[2] = {};
-  for (INPUT& input : inputs) {
-    input.type = INPUT_KEYBOARD;
-    input.ki.wVk = key;
-  }
-  inputs[1].ki.dwFlags = KEYEVENTF_KEYUP;
-  SendInput(std::size(inputs), inputs, sizeof inputs[0]);
 }
 
 void Act(HWND dialog, const Line& line) {
@@ -264,6 +250,8 @@ void Act(HWND dialog, const Line& line) {
     WaitForPicture(line.rest);
   } else if (line.verb == "until-during") {
     WaitForMessage(dialog, Wide(line.rest));
+  } else if (line.verb == "until-file") {
+    WaitForFile(line.rest);
   } else if (line.verb == "key") {
     HKEY key = nullptr;
     RegCreateKeyW(HKEY_LOCAL_MACHINE, Wide(line.rest).c_str(), &key);
