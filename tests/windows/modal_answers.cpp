@@ -1,0 +1,108 @@
+#include "tests/windows/modal_answers.h"
+
+// After windows.h.
+#include <shlobj.h>
+
+#include <vector>
+
+#include "tests/windows/driven_program.h"
+
+namespace {
+
+constexpr int kQuietLooks = 16;  // a dialog that has not changed for so many looks is quiet
+
+Line TakeFirst(std::deque<Line>* lines) {
+  Line line = lines->front();
+  lines->pop_front();
+  return line;
+}
+
+void PressButton(HWND window, int id) {
+  PostMessageA(GetDlgItem(window, id), BM_CLICK, 0, 0);
+  for (int look = 0; look < kMostLooks && IsWindow(window) && IsWindowVisible(window); ++look) {
+    Sleep(kStepTime);
+  }
+}
+
+// Until the dialog under the box has not changed for a while: all that was posted is through.
+void WaitForQuiet(HWND dialog) {
+  std::vector<std::string> before;
+  for (int same = 0; same < kQuietLooks; ++same) {
+    const std::vector<std::string> now = DescribeDialog(dialog);
+    if (now != before) same = 0;
+    before = now;
+    Sleep(kStepTime);
+  }
+}
+
+BOOL CALLBACK FindTree(HWND window, LPARAM data) {
+  if (ClassOf(window) != "SysTreeView32") return TRUE;
+  *reinterpret_cast<bool*>(data) = true;
+  return FALSE;
+}
+
+// The picker takes the path from its own memory.
+void SelectFolder(HWND picker, const std::string& path) {
+  const std::wstring text = Wide(path);
+  const size_t size = (text.size() + 1) * sizeof(wchar_t);
+  void* const place = VirtualAllocEx(DrivenProcess().hProcess, nullptr, size,
+                                     MEM_COMMIT | MEM_RESERVE, PAGE_READWRITE);
+  WriteProcessMemory(DrivenProcess().hProcess, place, text.c_str(), size, nullptr);
+  Ask(picker, BFFM_SETSELECTIONW, TRUE, reinterpret_cast<LPARAM>(place));
+  VirtualFreeEx(DrivenProcess().hProcess, place, 0, MEM_RELEASE);
+}
+
+void AnswerPicker(HWND picker, std::deque<Line>* picks) {
+  if (picks->empty()) Fail("no answer to the folder picker");
+  const std::string pick = TakeFirst(picks).rest;
+  std::wstring prompt;
+  for (HWND child = GetWindow(picker, GW_CHILD); child != nullptr && prompt.empty();
+       child = GetWindow(child, GW_HWNDNEXT)) {
+    if (ClassOf(child) == "Static") prompt = TextOf(child);
+  }
+  Print("picker " + Quoted(prompt) + " " + pick);
+  if (pick != "none") SelectFolder(picker, pick);
+  PressButton(picker, pick == "none" ? IDCANCEL : IDOK);
+}
+
+void AnswerBox(const ProgramWindows& windows, ModalAnswers* script) {
+  const HWND box = windows.modal;
+  if (!script->pictures.empty()) WaitForPicture(TakeFirst(&script->pictures).rest);
+  std::wstring text;
+  for (HWND child = GetWindow(box, GW_CHILD); child != nullptr;
+       child = GetWindow(child, GW_HWNDNEXT)) {
+    if (ClassOf(child) == "Static" && !TextOf(child).empty()) text = TextOf(child);
+  }
+  const std::string shown = "box " + Quoted(TextOf(box)) + " " + Quoted(text) + " ";
+  if (GetDlgItem(box, IDYES) == nullptr) {
+    Print(shown + "ok");
+    PressButton(box, GetDlgItem(box, IDOK) != nullptr ? IDOK : IDCANCEL);
+    return;
+  }
+  if (script->answers.empty()) Fail("no answer to " + shown);
+  const Line answer = TakeFirst(&script->answers);
+  if (answer.verb == "answer-late" && windows.dialog != nullptr) WaitForQuiet(windows.dialog);
+  Print(shown + answer.rest);
+  PressButton(box, answer.rest == "yes" ? IDYES : IDNO);
+}
+
+}  // namespace
+
+bool ModalAnswers::Take(const Line& line) {
+  std::deque<Line>* const queue = line.verb == "answer" || line.verb == "answer-late" ? &answers
+                                  : line.verb == "pick"                               ? &picks
+                                  : line.verb == "picture-box"                        ? &pictures
+                                                                                      : nullptr;
+  if (queue != nullptr) queue->push_back(line);
+  return queue != nullptr;
+}
+
+void AnswerModal(const ProgramWindows& windows, ModalAnswers* script) {
+  bool isPicker = false;
+  EnumChildWindows(windows.modal, FindTree, reinterpret_cast<LPARAM>(&isPicker));
+  if (isPicker) {
+    AnswerPicker(windows.modal, &script->picks);
+  } else {
+    AnswerBox(windows, script);
+  }
+}
