@@ -1,0 +1,16 @@
+// The yardstick of the packer: packs files by plain greedy LZW and prints the bytes of all streams
+// together.
+#include <cstdio>
+
+#include "tools/image/input_file.h"
+#include "tools/image/stream_packer.h"
+
+int main(int argc, char** argv) {
+  constexpr uint64_t kLargestFile = 1u << 30;
+  size_t total = 0;
+  for (int i = 1; i < argc; ++i) {
+    total += image::StreamPacker().Pack(image::ReadWholeFile(argv[i], kLargestFile)).size();
+  }
+  std::printf("%zu\n", total);
+  return 0;
+}

@@ -1,0 +1,53 @@
+"""A plot of lines over a logarithmic axis, as SVG text."""
+
+import math
+from html import escape
+
+WIDTH, HEIGHT = 640, 360
+LEFT, RIGHT, TOP, BOTTOM = 64, 24, 44, 52
+COLOURS = ('#1f6fb4', '#c4541c')
+
+
+def line_plot(title, x_title, y_title, lines):
+    """lines: [(x, y), ...] by name; every x above 0. The y axis begins at 0."""
+    xs = sorted({x for points in lines.values() for x, _ in points})
+    step = _tick_step(max(y for points in lines.values() for _, y in points))
+    ticks = math.floor(max(y for points in lines.values() for _, y in points) / step) + 1
+    span = math.log(xs[-1] / xs[0])
+
+    def place(x, y):
+        return (LEFT + (WIDTH - LEFT - RIGHT) * math.log(x / xs[0]) / span,
+                HEIGHT - BOTTOM - (HEIGHT - TOP - BOTTOM) * y / (step * ticks))
+
+    parts = [f'<svg xmlns="http://www.w3.org/2000/svg" width="{WIDTH}" height="{HEIGHT}" '
+             f'viewBox="0 0 {WIDTH} {HEIGHT}" font-family="sans-serif" font-size="12">',
+             f'<rect width="{WIDTH}" height="{HEIGHT}" fill="#ffffff"/>',
+             _text(WIDTH / 2, 20, title, 'middle', ' font-size="14" font-weight="bold"'),
+             _text(WIDTH / 2, HEIGHT - 12, x_title, 'middle'),
+             _text(16, HEIGHT / 2, y_title, 'middle',
+                   f' transform="rotate(-90 16 {HEIGHT / 2:.0f})"')]
+    for tick in range(ticks + 1):
+        _, y = place(xs[0], tick * step)
+        parts.append(f'<path d="M{LEFT} {y:.1f}H{WIDTH - RIGHT}" stroke="#dddddd"/>')
+        parts.append(_text(LEFT - 8, y + 4, f'{tick * step:g}', 'end'))
+    for x in xs:
+        parts.append(_text(place(x, 0)[0], HEIGHT - BOTTOM + 18, f'{x:g}', 'middle'))
+    for number, (name, points) in enumerate(lines.items()):
+        colour = COLOURS[number % len(COLOURS)]
+        places = [place(x, y) for x, y in points]
+        path = ' '.join(f'{x:.1f},{y:.1f}' for x, y in places)
+        parts.append(f'<polyline points="{path}" fill="none" stroke="{colour}" stroke-width="2"/>')
+        parts += [f'<circle cx="{x:.1f}" cy="{y:.1f}" r="3.5" fill="{colour}"/>' for x, y in places]
+        parts.append(_text(LEFT + 12, TOP + 4 + 16 * number, name, 'start',
+                           f' fill="{colour}" font-weight="bold"'))
+    return '\n'.join([*parts, '</svg>', ''])
+
+
+def _tick_step(largest):
+    """1, 2 or 5 times a power of ten, so that there are four to ten ticks."""
+    power = 10 ** math.floor(math.log10(largest / 4))
+    return max(factor * power for factor in (1, 2, 5) if factor * power * 4 <= largest)
+
+
+def _text(x, y, text, anchor, attributes=''):
+    return f'<text x="{x:.1f}" y="{y:.1f}" text-anchor="{anchor}"{attributes}>{escape(text)}</text>'

@@ -1,0 +1,20 @@
+"""What the bench has found, in the order in which it is told."""
+
+from dataclasses import dataclass, field
+
+
+@dataclass
+class Table:
+    title: str
+    text: str        # what is seen in it, before the table
+    heads: list
+    rows: list       # of texts
+    command: str
+    plot: str = ''   # file name of a picture beside it
+
+
+@dataclass
+class Results:
+    figures: dict = field(default_factory=dict)  # Figure by Goal.key
+    tables: list = field(default_factory=list)
+    plots: dict = field(default_factory=dict)    # SVG text by file name

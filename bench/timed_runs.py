@@ -1,0 +1,92 @@
+"""Programs run in turn on one CPU, and what each run took."""
+
+import os
+import shlex
+import shutil
+import statistics
+import subprocess
+import time
+from contextlib import contextmanager
+from dataclasses import dataclass, field
+from pathlib import Path
+from typing import Optional
+
+
+class BenchError(Exception):
+    pass
+
+
+@dataclass
+class Run:
+    """A command, and what it must find and leave."""
+    command: list
+    makes: Optional[Path] = None  # a folder or file: taken away before each run
+    folder: Optional[Path] = None  # made anew before each run
+    environment: dict = field(default_factory=dict)
+    success: int = 0              # exit status
+
+    def text(self):
+        settings = [f'{name}={shlex.quote(str(value))}' for name, value in self.environment.items()]
+        return ' '.join([*settings, shlex.join(str(word) for word in self.command)])
+
+
+@dataclass
+class Sample:
+    seconds: float
+    cpu: float  # seconds, user and system
+    peak: int   # bytes
+
+
+@contextmanager
+def pinned():
+    """All that is started meanwhile shares the last CPU, servers too."""
+    cpus = os.sched_getaffinity(0)
+    os.sched_setaffinity(0, {max(cpus)})
+    try:
+        yield
+    finally:
+        os.sched_setaffinity(0, cpus)
+
+
+def run_once(run):
+    for stale in (run.makes, run.folder):
+        if stale and stale.is_dir():
+            shutil.rmtree(stale)
+        elif stale:
+            stale.unlink(missing_ok=True)
+    if run.folder:
+        run.folder.mkdir(parents=True)
+    start = time.perf_counter()
+    process = subprocess.Popen([str(word) for word in run.command], stdin=subprocess.DEVNULL,
+                               stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL,
+                               env=os.environ | {k: str(v) for k, v in run.environment.items()})
+    _, status, usage = os.wait4(process.pid, 0)
+    seconds = time.perf_counter() - start
+    process.returncode = os.waitstatus_to_exitcode(status)
+    if process.returncode != run.success:
+        raise BenchError(f'exit status {process.returncode}: {run.text()}')
+    return Sample(seconds, usage.ru_utime + usage.ru_stime, usage.ru_maxrss * 1024)
+
+
+def run_in_turn(runs, rounds):
+    """Samples of each run, by its name, after a round that warms the caches."""
+    samples = {name: [] for name in runs}
+    for number in range(rounds + 1):
+        for name, run in runs.items():
+            sample = run_once(run)
+            if number > 0:
+                samples[name].append(sample)
+    return samples
+
+
+def median_seconds(samples):
+    return {name: statistics.median(sample.seconds for sample in group)
+            for name, group in samples.items()}
+
+
+def output_of(command, error_output=False):
+    done = subprocess.run([str(word) for word in command], capture_output=True, text=True)
+    if done.returncode != 0:
+        raise BenchError(f'exit status {done.returncode}: {shlex.join(str(w) for w in command)}\n'
+                         + done.stderr)
+    return done.stderr if error_output else done.stdout

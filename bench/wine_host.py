@@ -1,0 +1,42 @@
+"""The Windows builds under Wine: the 32-bit program where this host can run it, else the 64-bit one."""
+
+import subprocess
+
+from corpora import BUILD, ROOT
+from timed_runs import output_of
+
+TOOL = ROOT / 'tools/wine'
+
+
+class WineHost:
+    """The Wine that the figures are taken with; `why_not` says why there is none, '' when there is."""
+
+    def __init__(self):
+        self.bits, self.why_not = 0, ''
+        for bits in (32, 64):
+            answer = subprocess.run([TOOL, 'can-run', str(bits)], capture_output=True, text=True)
+            self.why_not = '' if answer.returncode == 0 else answer.stdout.strip()
+            if not self.why_not:
+                self.bits = bits
+                break
+        self.build = ROOT / f'build/bench-win{self.bits}'
+        self.prefix = BUILD / f'prefix{self.bits}'
+
+    def __enter__(self):
+        if not self.why_not:
+            output_of([TOOL, 'prefix', self.prefix, self.bits])
+        return self
+
+    def __exit__(self, *error):
+        if not self.why_not:
+            output_of([TOOL, 'stop', self.prefix])
+
+    def command(self, program, *arguments):
+        return [TOOL, 'run', self.prefix, program, *arguments]
+
+    def path(self, host_path):
+        """Drive Z: of a prefix is the whole host."""
+        return 'Z:' + str(host_path).replace('/', '\\')
+
+    def drive(self):
+        return self.prefix / 'drive_c'
