@@ -1,9 +1,10 @@
 # The front doors. Everything behind them is CMake (CMakePresets.json), CTest and the scripts in
 # tools/. On a bare Debian the first of them to run installs what is missing.
 PRESETS := native win32 win64
+BENCH_PRESETS := bench bench-win32 bench-win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check screenshots win32-emulated clean bootstrap $(PRESETS)
+.PHONY: all demo demo-dialog test check bench screenshots win32-emulated clean bootstrap $(PRESETS)
 
 all: $(PRESETS)
 
@@ -28,6 +29,14 @@ test: all
 # What keeps the house in order: tools/check says what it checks.
 check: all
 	@tools/check
+
+# The figures of docs/performance.md; BENCH=quick gives a first look and leaves that page alone.
+bench:
+	@tools/bootstrap --bench
+	@for preset in $(BENCH_PRESETS); do \
+	  cmake --preset $$preset $(CMAKE_QUIET) >/dev/null && cmake --build --preset $$preset || exit 1; \
+	done
+	@bench/run_bench.py $(BENCH)
 
 # Every page in five languages, from the real program under Wine, into docs/screenshots/.
 screenshots: all

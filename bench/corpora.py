@@ -5,20 +5,23 @@
   text        C headers and documentation, in files of 1,000,000 bytes
 """
 
+import os
 import random
 import re
 import shutil
 import subprocess
 import sys
+from dataclasses import dataclass
 from pathlib import Path
 
 from timed_runs import BenchError, output_of
 
-ROOT = Path(__file__).resolve().parent.parent
-sys.path.insert(0, str(ROOT / 'tests/scenarios'))
+# All paths are relative to the root, so that a command can be told and repeated as it was run.
+os.chdir(Path(__file__).resolve().parent.parent)
+sys.path.insert(0, 'tests/scenarios')
 from package_image import Image  # noqa: E402
 
-BUILD = ROOT / 'build/bench'
+BUILD = Path('build/bench')
 STUB = BUILD / 'MorivSetup'
 IMAGE_TOOL = BUILD / 'moriv-image'
 
@@ -26,8 +29,54 @@ LIBRARIES = Path('/usr/lib/x86_64-linux-gnu/wine/x86_64-windows')
 STRIP = 'x86_64-w64-mingw32-strip'
 LARGEST_LIBRARY = 3_000_000
 TEXT_FILE = 1_000_000
+PEER_PACKERS = {'.Z': ('compress', '-b16', '-f', '-c'), '.gz': ('gzip', '-9', '-n', '-c')}
 HEADERS = Path('/usr/include')
 DOCUMENTS = Path('/usr/share/doc')
+
+
+@dataclass
+class Corpus:
+    name: str
+    words: str
+    files: list
+
+    @property
+    def folder(self):
+        return self.files[0].parent
+
+    @property
+    def streams(self):
+        return self.folder.with_suffix('.streams')
+
+    @property
+    def image(self):
+        return self.folder.with_suffix('.image')
+
+    @property
+    def size(self):
+        return sum(file.stat().st_size for file in self.files)
+
+
+def make_corpora(libraries, text):
+    """Corpora of so many files, each with its image and its streams."""
+    folder = BUILD / 'corpora'
+    corpora = [Corpus('libraries', "Wine's own libraries, stripped",
+                      make_libraries(folder / 'libraries', libraries)),
+               Corpus('text', 'C headers and documentation', make_text(folder / 'text', text))]
+    for corpus in corpora:
+        output_of(pack_command(corpus.files, corpus.image))
+        write_streams(corpus)
+    return corpora
+
+
+def megabyte_of(corpus):
+    """Equal parts out of the middle of each file."""
+    size = 1_000_000 // len(corpus.files)
+    parts = []
+    for file in corpus.files:
+        content = file.read_bytes()
+        parts.append(content[len(content) // 2:][:size])
+    return b''.join(parts)
 
 
 def make_libraries(folder, count):
@@ -90,7 +139,6 @@ def make_slices(folder, content, count):
 
 def pack_command(files, image, stub=STUB, options=()):
     """The command that makes a setup image of the files; its description is written here."""
-    image.parent.mkdir(parents=True, exist_ok=True)
     lines = ['[package]']
     for file in files:
         lines += ['[[file]]', f"source = '{file.name}'", "destination = '%INSTALL_DIR%'"]
@@ -104,17 +152,14 @@ def packed_streams(image):
     return Image(image.read_bytes()).streams
 
 
-def write_streams(files, image, folder):
-    """The streams of the files in a folder: the image's, and those of the peers' formats."""
-    _make_anew(folder)
-    for file, stream in zip(files, packed_streams(image)):
-        (folder / f'{file.name}.pkz').write_bytes(stream)
-        (folder / f'{file.name}.Z').write_bytes(_piped(['compress', '-b16', '-f', '-c', file]))
-        (folder / f'{file.name}.gz').write_bytes(_piped(['gzip', '-9', '-n', '-c', file]))
-
-
-def _piped(command):
-    return subprocess.run([str(word) for word in command], capture_output=True, check=True).stdout
+def write_streams(corpus):
+    """For each file the stream of the image, and those of the peers' formats."""
+    _make_anew(corpus.streams)
+    for file, stream in zip(corpus.files, packed_streams(corpus.image)):
+        (corpus.streams / f'{file.name}.pkz').write_bytes(stream)
+        for extension, packer in PEER_PACKERS.items():
+            packed = subprocess.run([*packer, file], capture_output=True, check=True).stdout
+            (corpus.streams / f'{file.name}{extension}').write_bytes(packed)
 
 
 def _make_anew(folder):

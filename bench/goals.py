@@ -50,7 +50,7 @@ GOALS = [
     _at_most('install-wine', 'Silent install under Wine against {peer}', '', 1.0, 0.75),
     _at_most('install-wine-small', 'Silent install of 3 small files under Wine against NSIS', '',
              1.0, 0.85),
-    _at_most('wine-memory', 'Peak memory of that install over an empty program', 'MB', 1.5, 1),
+    _at_most('wine-memory', 'Peak memory of the install under Wine over an empty program', 'MB', 1.5, 1),
     _at_most('time-per-file', 'Time per file of 1000 small files against `cp`', 'times', 4, 2),
     _at_most('growth', 'Time per MB at {large} MB against 4 MB', 'times', 1.2, 1.05),
     _at_most('region', 'Executable region with all resources', 'bytes', 172_032, 155_000),
@@ -62,7 +62,7 @@ GOALS = [
 class Figure:
     """What was measured for a goal: a number, or why there is none."""
     value: Optional[float] = None
-    command: str = ''        # that gave it
+    section: str = ''        # of the page: title of the table that it stands in
     why_not: str = ''
     words: Optional[dict] = None  # for the places of Goal.what
 
@@ -71,7 +71,7 @@ def verdict(goal, figure):
     if figure.value is None:
         return 'not measured'
     if _misses(goal, figure.value, goal.floor):
-        return 'below the floor'
+        return 'floor missed'
     return 'goal missed' if _misses(goal, figure.value, goal.goal) else 'reached'
 
 

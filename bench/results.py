@@ -9,8 +9,8 @@ class Table:
     text: str        # what is seen in it, before the table
     heads: list
     rows: list       # of texts
-    command: str
-    plot: str = ''   # file name of a picture beside it
+    commands: list   # that gave the figures, as texts
+    plot: str = ''   # file name of a picture under it
 
 
 @dataclass

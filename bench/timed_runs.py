@@ -7,8 +7,9 @@ import statistics
 import subprocess
 import time
 from contextlib import contextmanager
-from dataclasses import dataclass, field
+from dataclasses import dataclass, field, replace
 from pathlib import Path
+from tempfile import NamedTemporaryFile
 from typing import Optional
 
 
@@ -20,21 +21,20 @@ class BenchError(Exception):
 class Run:
     """A command, and what it must find and leave."""
     command: list
-    makes: Optional[Path] = None  # a folder or file: taken away before each run
-    folder: Optional[Path] = None  # made anew before each run
+    makes: Optional[Path] = None   # a folder, taken away before each run
+    folder: Optional[Path] = None  # a folder, made anew before each run
     environment: dict = field(default_factory=dict)
     success: int = 0              # exit status
 
     def text(self):
         settings = [f'{name}={shlex.quote(str(value))}' for name, value in self.environment.items()]
-        return ' '.join([*settings, shlex.join(str(word) for word in self.command)])
+        return ' '.join([*settings, text_of(self.command)])
 
 
 @dataclass
 class Sample:
     seconds: float
     cpu: float  # seconds, user and system
-    peak: int   # bytes
 
 
 @contextmanager
@@ -48,12 +48,14 @@ def pinned():
         os.sched_setaffinity(0, cpus)
 
 
-def run_once(run):
+def discard_output(run):
     for stale in (run.makes, run.folder):
-        if stale and stale.is_dir():
-            shutil.rmtree(stale)
-        elif stale:
-            stale.unlink(missing_ok=True)
+        if stale:
+            shutil.rmtree(stale, ignore_errors=True)
+
+
+def run_once(run):
+    discard_output(run)
     if run.folder:
         run.folder.mkdir(parents=True)
     start = time.perf_counter()
@@ -65,7 +67,7 @@ def run_once(run):
     process.returncode = os.waitstatus_to_exitcode(status)
     if process.returncode != run.success:
         raise BenchError(f'exit status {process.returncode}: {run.text()}')
-    return Sample(seconds, usage.ru_utime + usage.ru_stime, usage.ru_maxrss * 1024)
+    return Sample(seconds, usage.ru_utime + usage.ru_stime)
 
 
 def run_in_turn(runs, rounds):
@@ -84,9 +86,20 @@ def median_seconds(samples):
             for name, group in samples.items()}
 
 
+def peak_memory(run):
+    """Bytes. Asked of time(1): a child of this program would be charged with its memory too."""
+    with NamedTemporaryFile('r') as answer:
+        run_once(replace(run, command=['/usr/bin/time', '-q', '-f', '%M', '-o', answer.name,
+                                       *run.command]))
+        return int(answer.read()) * 1024
+
+
+def text_of(command):
+    return shlex.join(str(word) for word in command)
+
+
 def output_of(command, error_output=False):
     done = subprocess.run([str(word) for word in command], capture_output=True, text=True)
     if done.returncode != 0:
-        raise BenchError(f'exit status {done.returncode}: {shlex.join(str(w) for w in command)}\n'
-                         + done.stderr)
+        raise BenchError(f'exit status {done.returncode}: {text_of(command)}\n{done.stderr}')
     return done.stderr if error_output else done.stdout

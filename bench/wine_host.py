@@ -1,11 +1,14 @@
 """The Windows builds under Wine: the 32-bit program where this host can run it, else the 64-bit one."""
 
+import shutil
 import subprocess
 
-from corpora import BUILD, ROOT
+from pathlib import Path
+
+from corpora import BUILD
 from timed_runs import output_of
 
-TOOL = ROOT / 'tools/wine'
+TOOL = Path('tools/wine')
 
 
 class WineHost:
@@ -19,11 +22,13 @@ class WineHost:
             if not self.why_not:
                 self.bits = bits
                 break
-        self.build = ROOT / f'build/bench-win{self.bits}'
+        self.build = Path(f'build/bench-win{self.bits}')
         self.prefix = BUILD / f'prefix{self.bits}'
 
     def __enter__(self):
+        """A fresh prefix: an installed product would say where the next install goes."""
         if not self.why_not:
+            shutil.rmtree(self.prefix, ignore_errors=True)
             output_of([TOOL, 'prefix', self.prefix, self.bits])
         return self
 
@@ -33,10 +38,6 @@ class WineHost:
 
     def command(self, program, *arguments):
         return [TOOL, 'run', self.prefix, program, *arguments]
-
-    def path(self, host_path):
-        """Drive Z: of a prefix is the whole host."""
-        return 'Z:' + str(host_path).replace('/', '\\')
 
     def drive(self):
         return self.prefix / 'drive_c'
