@@ -59,6 +59,7 @@ std::vector<fs::path> FilesIn(const fs::path& folder) {
 std::vector<Content> ReadStreams(const std::vector<fs::path>& files, const fs::path& folder,
                                  const char* extension) {
   std::vector<Content> streams;
+  streams.reserve(files.size());
   for (const fs::path& file : files) {
     streams.push_back(ReadFile(folder / (file.filename().string() + extension)));
   }
