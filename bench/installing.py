@@ -76,7 +76,7 @@ def measure_wine_install(corpus, rounds, wine, results):
 
 
 def measure_small_wine_install(corpus, rounds, wine, results):
-    why_not = wine.why_not or ('' if wine.bits == 32 else 'no 32-bit programs here')
+    why_not = wine.why_not or ('' if wine.bits == 32 else 'no 32-bit Wine here')
     if why_not:
         results.figures['install-wine-small'] = Figure(why_not=why_not)
         return

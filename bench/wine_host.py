@@ -18,7 +18,7 @@ class WineHost:
         self.bits, self.why_not = 0, ''
         for bits in (32, 64):
             answer = subprocess.run([TOOL, 'can-run', str(bits)], capture_output=True, text=True)
-            self.why_not = '' if answer.returncode == 0 else answer.stdout.strip()
+            self.why_not = '' if answer.returncode == 0 else answer.stdout.strip().removeprefix('no: ')
             if not self.why_not:
                 self.bits = bits
                 break
