@@ -26,7 +26,8 @@ STUB = BUILD / 'MorivSetup'
 IMAGE_TOOL = BUILD / 'moriv-image'
 
 LIBRARIES = Path('/usr/lib/x86_64-linux-gnu/wine/x86_64-windows')
-STRIP = 'x86_64-w64-mingw32-strip'
+# It writes the time into a library, unless it is told one.
+STRIP = ('env', 'SOURCE_DATE_EPOCH=0', 'x86_64-w64-mingw32-strip')
 LARGEST_LIBRARY = 3_000_000
 TEXT_FILE = 1_000_000
 PEER_PACKERS = {'.Z': ('compress', '-b16', '-f', '-c'), '.gz': ('gzip', '-9', '-n', '-c')}
@@ -90,7 +91,7 @@ def make_libraries(folder, count):
             break
         if family in families:
             continue
-        output_of([STRIP, '-o', stripped, source])
+        output_of([*STRIP, '-o', stripped, source])
         if stripped.stat().st_size <= LARGEST_LIBRARY:
             families[family] = stripped.rename(folder / source.name)
     stripped.unlink(missing_ok=True)
