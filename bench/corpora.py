@@ -1,7 +1,7 @@
 """The files that are packed, expanded and installed.
 
-  libraries   40 of Wine's own libraries, stripped: the largest, one of a family (msvcp70, msvcp71 and
-              so on are nearly the same file), none above 3,000,000 bytes
+  libraries   40 of Wine's own libraries, stripped: the largest, one of a family (msvcp70, msvcp71
+              and so on are nearly the same file), none above 3,000,000 bytes
   text        C headers and documentation, in files of 1,000,000 bytes
 """
 

@@ -38,7 +38,8 @@ def measure_native_install(corpus, rounds, results):
     require_installed(corpus.files, WORK / 'machine/drive_c' / INSTALLED)
     require_installed(corpus.files, extracted)
     table = _install_table('Install, natively', f'{len(corpus.files)} libraries, {corpus.size:,} '
-                           f'bytes, on one CPU, in turn. Medians of {rounds} rounds.', runs, seconds)
+                           f'bytes, on one CPU, in turn. Medians of {rounds} rounds.',
+                           runs, seconds)
     results.figures['install-native'] = Figure(seconds[OWN] / seconds[peer], table.title)
     results.tables.append(table)
 

@@ -1,4 +1,5 @@
-"""The Windows builds under Wine: the 32-bit program where this host can run it, else the 64-bit one."""
+"""The Windows builds under Wine: the 32-bit program where this host can run it, else the 64-bit
+one."""
 
 import shutil
 import subprocess
@@ -12,16 +13,16 @@ TOOL = Path('tools/wine')
 
 
 class WineHost:
-    """The Wine that the figures are taken with; `why_not` says why there is none, '' when there is."""
+    """The Wine that the figures are taken with; `why_not` says why there is none."""
 
     def __init__(self):
         self.bits, self.why_not = 0, ''
         for bits in (32, 64):
             answer = subprocess.run([TOOL, 'can-run', str(bits)], capture_output=True, text=True)
-            self.why_not = '' if answer.returncode == 0 else answer.stdout.strip().removeprefix('no: ')
-            if not self.why_not:
-                self.bits = bits
+            if answer.returncode == 0:
+                self.bits, self.why_not = bits, ''
                 break
+            self.why_not = answer.stdout.strip().removeprefix('no: ')
         self.build = Path(f'build/bench-win{self.bits}')
         self.prefix = BUILD / f'prefix{self.bits}'
 
