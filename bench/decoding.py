@@ -15,9 +15,9 @@ PROGRAM = BUILD / 'decode_bench'
 
 
 def measure_decoding(corpora, rounds, results):
-    table = Table('Expansion', 'All decoders in one process, in turn, on one CPU. The expander has '
-                  'the streams that `pack` makes, the peers those of their own formats. Medians of '
-                  f'{rounds} rounds.', HEADS, [], [])
+    table = Table('Expansion', 'All decoders in one process, in turn, on one CPU; processor time. The '
+                  'expander has the streams that `pack` makes, the peers those of their own '
+                  f'formats. Medians of {rounds} rounds.', HEADS, [], [])
     for corpus in corpora:
         command = [PROGRAM, corpus.folder, corpus.streams, rounds]
         seconds = _time_decoders(command, corpus, table)
