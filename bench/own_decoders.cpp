@@ -1,3 +1,4 @@
+// The project's own decoders, fed as an install feeds them.
 #include <algorithm>
 #include <memory>
 #include <string_view>

@@ -1,3 +1,4 @@
+// Other makers' decoders, each with the streams of its own format.
 #include <archive.h>
 #include <zlib.h>
 
