@@ -8,6 +8,7 @@ fewer rounds and smaller corpora, and leaves docs alone: its page is build/bench
 """
 import re
 import shutil
+import subprocess
 import sys
 from dataclasses import dataclass
 from pathlib import Path
@@ -101,7 +102,7 @@ def main():
     installing.WORK.mkdir(parents=True)
     try:
         corpora, results = measure(QUICK if quick else WHOLE)
-    except (BenchError, OSError) as error:
+    except (BenchError, OSError, subprocess.SubprocessError) as error:
         print(f'bench: {error}', file=sys.stderr)
         return 2
     write_document(BUILD if quick else Path('docs'), results, corpora, quick)
