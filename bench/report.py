@@ -1,5 +1,6 @@
 """The figures as a table on the terminal, and as docs/performance.md with its plots."""
 
+import os
 import platform
 import re
 import subprocess
@@ -95,6 +96,7 @@ def _host():
     rows = [['CPU', f'{cpus[0]}, {len(cpus)} of them'],
             ['Memory', f'{memory / 1024 / 1024:.0f} GiB'],
             ['Kernel', f'{platform.system()} {platform.release()} {platform.machine()}'],
+            ['Load', f'{os.getloadavg()[2]:.1f} programs at a time, over the last 15 minutes'],
             ['System', platform.freedesktop_os_release()['PRETTY_NAME']]]
     rows += [['Compiler', _output([compiler, '--version']).split('\n')[0]]
              for compiler in COMPILERS]
