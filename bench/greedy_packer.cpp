@@ -9,7 +9,8 @@ int main(int argc, char** argv) {
   constexpr uint64_t kLargestFile = 1u << 30;
   size_t total = 0;
   for (int i = 1; i < argc; ++i) {
-    total += image::StreamPacker().Pack(image::ReadWholeFile(argv[i], kLargestFile)).size();
+    const auto file = image::ReadWholeFile(argv[i], kLargestFile);
+    total += image::PackStream(file, image::kPackGreedily).size();
   }
   std::printf("%zu\n", total);
   return 0;

@@ -1,7 +1,6 @@
 // The project's own decoders, fed as an install feeds them.
 #include <algorithm>
 #include <memory>
-#include <string_view>
 
 #include "bench/decoders.h"
 #include "package/expander.h"
@@ -30,10 +29,23 @@ class CountingExpander : public PkzFileExpander {
   Output* output_;
 };
 
-}  // namespace
+class CountingPlainExpander : public PlainExpander {
+ public:
+  explicit CountingPlainExpander(Output* output) : output_(output) {}
 
-bool DecodeByExpander(Bytes stream, Output* output) {
-  const auto expander = std::make_unique<CountingExpander>(output);
+ protected:
+  uint32_t Write(const uint8_t* bytes, uint32_t count) override {
+    output_->Take(bytes, count);
+    return count;
+  }
+
+ private:
+  Output* output_;
+};
+
+template <class Expander>
+bool DecodeInBlocks(Bytes stream, Output* output) {
+  const auto expander = std::make_unique<Expander>(output);
   while (!stream.empty()) {
     const size_t count = std::min(stream.size(), kBlockSize);
     expander->ExpandBlock(stream.data(), static_cast<uint32_t>(count));
@@ -43,12 +55,14 @@ bool DecodeByExpander(Bytes stream, Output* output) {
   return expander->failed() == 0;
 }
 
+}  // namespace
+
+bool DecodeByExpander(Bytes stream, Output* output) {
+  return DecodeInBlocks<CountingExpander>(stream, output);
+}
+
 bool DecodeByLetter(Bytes stream, Output* output) {
-  const Bytes codes = stream.subspan(kStreamMagicSize);
-  const PlainExpansion expansion = PlainExpander::Expand(
-      std::string_view(reinterpret_cast<const char*>(codes.data()), codes.size()));
-  output->Take(expansion.bytes.data(), expansion.bytes.size());
-  return !expansion.failed;
+  return DecodeInBlocks<CountingPlainExpander>(stream, output);
 }
 
 uint64_t ExpanderMemory() {
