@@ -20,7 +20,6 @@ void CodeTable::Add(uint32_t prefix, uint8_t byte, uint32_t code) {
   while (slots_[index].key != kFreeSlot) index = (index + 1) % kSlotCount;
   slots_[index] = {key, code};
 
-  // No length is above the number of entries, which fits 15 bits.
   const auto length = static_cast<uint16_t>(lengths_[prefix] + 1);
   prefixes_[code] = static_cast<uint16_t>(prefix);
   lengths_[code] = reaches_[code] = length;

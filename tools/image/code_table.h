@@ -29,7 +29,7 @@ class CodeTable {
     }
   }
 
-  // Gives that string, which has no entry yet, the code `code`, below kCodeLimit.
+  // Gives that string, which has no entry yet, the code `code`, at most kLastCode.
   void Add(uint32_t prefix, uint8_t byte, uint32_t code);
 
   // The code of an entry's string without its last byte.
@@ -46,15 +46,17 @@ class CodeTable {
   // At most half of the slots are ever taken, so each search ends soon.
   static constexpr uint32_t kSlotBits = 16;
   static constexpr uint32_t kSlotCount = 1u << kSlotBits;
-  static constexpr uint32_t kFreeSlot = 0;  // the key of two zero bytes is not 0: see KeyOf
+  static constexpr uint32_t kFreeSlot = 0;
 
+  // Never kFreeSlot.
   static uint32_t KeyOf(uint32_t prefix, uint8_t byte) { return (prefix << 8 | byte) + 1; }
   static uint32_t HomeOf(uint32_t key) { return key * 0x9E3779B1u >> (32 - kSlotBits); }
 
   std::vector<Slot> slots_;
-  std::array<uint16_t, kCodeLimit> prefixes_ = {};
-  std::array<uint16_t, kCodeLimit> lengths_ = {};
-  std::array<uint16_t, kCodeLimit> reaches_ = {};
+  // By code. No length is above the number of entries, which fits 15 bits.
+  std::array<uint16_t, kLastCode + 1> prefixes_ = {};
+  std::array<uint16_t, kLastCode + 1> lengths_ = {};
+  std::array<uint16_t, kLastCode + 1> reaches_ = {};
 };
 
 }  // namespace image

@@ -12,7 +12,7 @@
 namespace image {
 namespace {
 
-// Keeps the time for files of long runs in bounds; in others phrases are hardly ever longer.
+// Keeps the time for files of long runs in bounds; in others hardly more is ever won.
 constexpr size_t kMostShortened = 32;
 
 }  // namespace
@@ -32,8 +32,7 @@ Phrase PhraseParser::Next() {
   const size_t end = position_ + phrase.length;
   if (phrase.length == longest_.length && end < file_.size()) {
     table_.Add(phrase.code, file_[end], kFirstFreeCode + count_);
-    // The new entry can lengthen the phrase behind it, but only from the string that it was made
-    // of.
+    // The new entry can lengthen the phrase behind it, but only from the string it was made of.
     if (following.code == phrase.code) Lengthen(&following, end, 0);
   }
   position_ = end;

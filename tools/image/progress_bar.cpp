@@ -39,7 +39,8 @@ void ProgressBar::Draw(Clock::time_point now) {
   const auto filled = static_cast<size_t>(done_ * kBarWidth / total_);
   const std::string bar = std::string(filled, '#') + std::string(kBarWidth - filled, '.');
   const auto done = static_cast<double>(done_);
-  const double rate = std::max(done, 1.0) / std::chrono::duration<double>(now - start_).count();  // bytes a second
+  const double seconds = std::chrono::duration<double>(now - start_).count();
+  const double rate = std::max(done, 1.0) / seconds;
   const auto secondsLeft = std::lround(static_cast<double>(total_ - done_) / rate);
   std::fprintf(stderr, "\r%s [%s] %3d %%  %.1f MB/s  %ld:%02ld left\033[K", task_.c_str(),
                bar.c_str(), static_cast<int>(done_ * 100 / total_), rate / 1e6, secondsLeft / 60,

@@ -9,12 +9,12 @@
 
 namespace image {
 
-// The positions behind which the table is to be emptied, ascending, and the file's size as the last
-// one. No stream of the same phrases with its resets at other candidates is shorter, and candidates
-// are the places where a full table would be emptied too.
+// The positions at which the table is to be emptied, ascending, and the file's size as the last one.
+// They are chosen among candidates, to which belong the places where a table that is emptied only
+// when it is full would be; no other choice makes a shorter stream.
 //
 //   looksAhead  as PhraseParser's
-//   progress   called with the bytes of the file that were planned since the last call
+//   progress    called with the bytes of the file that were planned since the last call
 std::vector<size_t> PlanResets(std::span<const uint8_t> file, bool looksAhead,
                                const std::function<void(size_t)>& progress);
 

@@ -17,9 +17,9 @@ inline constexpr unsigned kFirstWidth = 9;
 
 // What packers keep to; a decoder takes wider codes and more entries.
 inline constexpr unsigned kLastWidth = 15;
-inline constexpr uint32_t kCodeLimit = (1u << kLastWidth) - 1;
-// Codes behind which the decoder's next free code is kCodeLimit; the first makes no entry.
-inline constexpr uint32_t kMostPhrases = kCodeLimit - kFirstFreeCode + 1;
+inline constexpr uint32_t kLastCode = (1u << kLastWidth) - 1;
+// Codes behind which the decoder's next free code is kLastCode; the first makes no entry.
+inline constexpr uint32_t kMostPhrases = kLastCode - kFirstFreeCode + 1;
 
 // The width of the code that comes behind `count` codes that stand for strings: wider as soon as
 // the decoder's next free code is the last that fits.
