@@ -9,9 +9,9 @@
 
 namespace image {
 
-// The positions at which the table is to be emptied, ascending, and the file's size as the last one.
-// They are chosen among candidates, to which belong the places where a table that is emptied only
-// when it is full would be; no other choice makes a shorter stream.
+// The positions at which the table is to be emptied, ascending, and the file's size as the last
+// one. They are chosen among candidates, to which belong the places where a table that is emptied
+// only when it is full would be; no other choice makes a shorter stream.
 //
 //   looksAhead  as PhraseParser's
 //   progress    called with the bytes of the file that were planned since the last call
