@@ -1,0 +1,99 @@
+// Runs every case, by name. Prints "ok NAME" or "failed NAME: what", one line a case, and a closing
+// line with the counts. Returns 0 when all hold, else -1, which no exit status takes for a success.
+#include <algorithm>
+#include <cstdio>
+#include <cstring>
+#include <vector>
+
+#include "tests/contract/contract.h"
+
+namespace {
+
+// Cases are registered before main; a local static is there when the first one comes.
+std::vector<contract::Case>& Cases() {
+  static std::vector<contract::Case> cases;
+  return cases;
+}
+
+std::string failures;  // of the case that runs
+
+// A key and all below it; one that is not there is no failure.
+void DeleteTree(const std::string& path) {
+  HKEY key = nullptr;
+  if (RegOpenKeyExA(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ, &key) != ERROR_SUCCESS) return;
+  char name[MAX_PATH];
+  while (RegEnumKeyA(key, 0, name, sizeof(name)) == ERROR_SUCCESS) {
+    const std::string below = path + '\\' + name;
+    DeleteTree(below);
+  }
+  RegCloseKey(key);
+  RegDeleteKeyA(HKEY_LOCAL_MACHINE, path.c_str());
+}
+
+bool Holds(const contract::Case& one) {
+  failures.clear();
+  DeleteTree(contract::kKey);
+  one.body();
+  if (failures.empty()) {
+    std::printf("ok %s\n", one.name);
+  } else {
+    std::printf("failed %s:%s\n", one.name, failures.c_str());
+  }
+  std::fflush(stdout);
+  return failures.empty();
+}
+
+}  // namespace
+
+namespace contract {
+
+Case::Case(const char* caseName, void (*caseBody)()) : name(caseName), body(caseBody) {
+  Cases().push_back(*this);
+}
+
+bool IsWine() {
+  return GetProcAddress(GetModuleHandleA("ntdll.dll"), "wine_get_version") != nullptr;
+}
+
+void Compare(const std::string& actual, const std::string& expected, const std::string& row,
+             std::source_location where) {
+  if (actual == expected) return;
+  const char* const slash = std::strrchr(where.file_name(), '/');
+  failures += std::string(" ") + (slash != nullptr ? slash + 1 : where.file_name()) + ':' +
+              std::to_string(where.line()) + (row.empty() ? "" : " [" + row + ']') + " is " +
+              actual + ", not " + expected + ';';
+}
+
+void WriteText(const std::string& path, const std::string& bytes) {
+  const HANDLE file =
+      CreateFileA(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
+  DWORD done = 0;
+  Expect(WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr), TRUE,
+         path);
+  CloseHandle(file);
+}
+
+std::string ReadText(const std::string& path) {
+  const HANDLE file =
+      CreateFileA(path.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
+  if (file == INVALID_HANDLE_VALUE) return "none";
+  std::string bytes(GetFileSize(file, nullptr), '?');
+  DWORD done = 0;
+  ReadFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
+  CloseHandle(file);
+  bytes.resize(done);
+  return bytes;
+}
+
+}  // namespace contract
+
+int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR, int) {
+  std::vector<contract::Case>& cases = Cases();
+  std::ranges::sort(cases,
+                    [](const auto& a, const auto& b) { return std::strcmp(a.name, b.name) < 0; });
+  const auto held = std::ranges::count_if(cases, Holds);
+  const auto failed = static_cast<long long>(cases.size()) - held;
+  DeleteTree(contract::kKey);
+  std::printf("%lld held, %lld failed\n", static_cast<long long>(held), failed);
+  return failed == 0 ? 0 : -1;
+}
