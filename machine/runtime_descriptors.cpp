@@ -34,6 +34,15 @@ int OpenDescriptor(const char* name, const OpenMode& mode, bool text) {
   return descriptor;
 }
 
+// The new position has 32 bits; from 2 GiB on the answer is negative, but never -1.
+int32_t Move(int descriptor, int32_t offset, int origin) {
+  OpenFile* const file = FileOf(descriptor);
+  if (file == nullptr || origin < 0) return -1;
+  constexpr int64_t kLimit = UINT32_MAX - 1;
+  const auto position = machine::MovePosition(*file, offset, static_cast<DWORD>(origin), kLimit);
+  return position ? static_cast<int32_t>(*position) : -1;
+}
+
 std::string WithCarriageReturns(std::string_view text) {
   std::string result;
   result.reserve(text.size());
@@ -132,19 +141,11 @@ int _write(int descriptor, const void* buffer, unsigned count) {
 }
 
 int32_t _lseek(int descriptor, int32_t offset, int origin) {
-  if (CallFails("_lseek")) return -1;
-  OpenFile* const file = FileOf(descriptor);
-  if (file == nullptr || origin < 0) return -1;
-  const auto position = machine::MovePosition(*file, offset, static_cast<DWORD>(origin), INT32_MAX);
-  return position ? static_cast<int32_t>(*position) : -1;
+  return CallFails("_lseek") ? -1 : Move(descriptor, offset, origin);
 }
 
 int32_t _tell(int descriptor) {
-  if (CallFails("_tell")) return -1;
-  OpenFile* const file = FileOf(descriptor);
-  if (file == nullptr) return -1;
-  const auto position = machine::MovePosition(*file, 0, FILE_CURRENT, INT32_MAX);
-  return position ? static_cast<int32_t>(*position) : -1;
+  return CallFails("_tell") ? -1 : Move(descriptor, 0, FILE_CURRENT);
 }
 
 // A fault makes the answer a failure; the file is closed all the same.
@@ -154,11 +155,12 @@ int _close(int descriptor) {
   return closed && !fails ? 0 : -1;
 }
 
-// A size above 31 bits makes the call fail, as in the runtime.
+// A size above 31 bits makes the call fail, as in the runtime, and so does a separator at the end.
 int _stat(const char* name, struct _stat* status) {
   if (CallFails("_stat") || name == nullptr || status == nullptr) return -1;
   const auto location = machine::Locate(name);
   if (!location || !location->exists) return -1;
+  if (location->endsInSeparator && !location->isRoot) return -1;
   std::error_code error;
   if (location->isRoot || fs::is_directory(location->host, error)) {
     *status = {.st_mode = kDirectoryBit | _S_IREAD | _S_IWRITE, .st_size = 0};
