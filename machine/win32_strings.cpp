@@ -38,7 +38,8 @@ extern "C" {
 
 int LoadStringA(HINSTANCE, UINT id, LPSTR buffer, int size) {
   const bool fails = machine::CallFails("LoadStringA");
-  if (buffer == nullptr || size <= 0) return 0;
+  if (buffer == nullptr || size < 0) return 0;
+  if (size == 0) return -1;  // as Windows answers where there is no room for a NUL
   const std::string text = fails ? "" : machine::FromUtf16(FindString(id & 0xFFFF));
   const size_t count = std::min(text.size(), static_cast<size_t>(size) - 1);
   std::memcpy(buffer, text.data(), count);
