@@ -143,8 +143,8 @@ LSTATUS RegQueryValueExA(HKEY key, LPCSTR name, LPDWORD reserved, LPDWORD type, 
   return ERROR_SUCCESS;
 }
 
-// The default value of a key or of one below it, a REG_SZ, which gets a NUL if it has none. A key
-// without that value answers an empty text.
+// The default value of a key or of one below it, a REG_SZ, which gets a NUL behind it if it has
+// none and the buffer has room. A key without that value answers an empty text.
 LSTATUS RegQueryValueA(HKEY key, LPCSTR subkey, LPSTR data, LONG* size) {
   constexpr LSTATUS kInvalidData = 13;
   DWORD fault = 0;
@@ -158,13 +158,14 @@ LSTATUS RegQueryValueA(HKEY key, LPCSTR subkey, LPSTR data, LONG* size) {
 
   const RegistryValue* const value = machine::FindValue(*found, "");
   if (value != nullptr && value->type != REG_SZ) return kInvalidData;
-  std::string text = value != nullptr ? std::string(value->data.begin(), value->data.end()) : "";
-  if (text.empty() || text.back() != '\0') text += '\0';
+  const std::string text =
+      value != nullptr ? std::string(value->data.begin(), value->data.end()) : std::string(1, '\0');
   const size_t room = static_cast<size_t>(*size);
   *size = static_cast<LONG>(text.size());
   if (data == nullptr) return ERROR_SUCCESS;
   if (room < text.size()) return ERROR_MORE_DATA;
   std::memcpy(data, text.data(), text.size());
+  if (room > text.size()) data[text.size()] = '\0';
   return ERROR_SUCCESS;
 }
 
