@@ -61,7 +61,7 @@ LRESULT SendToList(Window* list, UINT message, WPARAM wParam, LPARAM lParam) {
     case CB_SETITEMDATA:
       if (!HasItem(*list, wParam)) return CB_ERR;
       list->items[wParam] = static_cast<ULONG_PTR>(lParam);
-      return 0;
+      return TRUE;
     default:
       return 0;
   }
@@ -177,6 +177,7 @@ BOOL DestroyWindow(HWND handle) {
     return FALSE;
   }
   machine::DeleteItems(*window);
+  machine::ForgetMessages(handle);
   std::erase_if(OpenDialog()->controls,
                 [handle](const auto& control) { return control->handle == handle; });
   OpenDialog()->TakeFocusFrom(handle);
@@ -210,15 +211,17 @@ LRESULT SendMessageA(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
   }
   Window* const window = FindWindowByHandle(handle);
   if (window == nullptr) return 0;
-  if (window->kind == WindowKind::kDialog) {
-    const LRESULT result = machine::SendToDialog(message, wParam, lParam);
-    if (result != FALSE) return result;  // else the system does what it does for every window
-  }
+  // What the dialog's procedure returns tells only whether it has handled the message; if not, the
+  // system does what it does for every window.
+  const bool isDialog = window->kind == WindowKind::kDialog;
+  if (isDialog && machine::SendToDialog(message, wParam, lParam) != FALSE) return 0;
   return SendToControl(window, message, wParam, lParam);
 }
 
+// A message to no window, for null, waits like others, and is dispatched to nobody.
 BOOL PostMessageA(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
-  if (CallFails("PostMessageA") || FindWindowByHandle(handle) == nullptr) return FALSE;
+  const bool isForNobody = handle != nullptr && FindWindowByHandle(handle) == nullptr;
+  if (CallFails("PostMessageA") || isForNobody) return FALSE;
   MSG posted = {};
   posted.hwnd = handle;
   posted.message = message;

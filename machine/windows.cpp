@@ -157,6 +157,10 @@ void PostToQueue(const MSG& message) {
   queue.push_back(message);
 }
 
+void ForgetMessages(HWND window) {
+  std::erase_if(queue, [window](const MSG& message) { return message.hwnd == window; });
+}
+
 bool TakeMessage(MSG* message) {
   if (queue.empty()) return false;
   *message = queue.front();
@@ -166,7 +170,7 @@ bool TakeMessage(MSG* message) {
 
 void DispatchToWindow(const MSG& message) {
   const Window* const window = FindWindowByHandle(message.hwnd);
-  if (window == nullptr) return;  // it has gone since
+  if (window == nullptr) return;
   if (window->kind == WindowKind::kDialog) {
     SendToDialog(message.message, message.wParam, message.lParam);
   } else if (message.message == kClickMessage) {

@@ -65,6 +65,8 @@ INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam);
 // ---- Messages. First in, first out.
 
 void PostToQueue(const MSG& message);
+// Takes away what waits for a window that goes.
+void ForgetMessages(HWND window);
 // Takes the next message; false when there is none.
 bool TakeMessage(MSG* message);
 void DispatchToWindow(const MSG& message);
