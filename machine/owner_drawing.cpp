@@ -5,10 +5,11 @@
 namespace machine {
 namespace {
 
-constexpr UINT kStaticType = 5;       // ODT_STATIC
-constexpr UINT kDrawEntire = 1;       // ODA_DRAWENTIRE
-constexpr UINT kDisabledState = 4;    // ODS_DISABLED
-constexpr UINT kFieldState = 0x1000;  // ODS_COMBOBOXEDIT: the field, no entry of the open list
+constexpr UINT kStaticType = 5;        // ODT_STATIC
+constexpr UINT kDrawEntire = 1;        // ODA_DRAWENTIRE
+constexpr UINT kDisabledState = 4;     // ODS_DISABLED
+constexpr UINT kUsualItemHeight = 16;  // pixels, of a line of the dialog's font
+constexpr UINT kFieldState = 0x1000;   // ODS_COMBOBOXEDIT: the field, no entry of the open list
 
 // The field of a list shows the selected entry; without one its number is -1 and it has no data.
 void DescribeField(const Window& list, DRAWITEMSTRUCT* item) {
@@ -42,6 +43,7 @@ void MeasureItems(Window* control) {
   MEASUREITEMSTRUCT measure = {};
   measure.CtlType = ODT_COMBOBOX;
   measure.CtlID = static_cast<UINT>(control->id);
+  measure.itemHeight = kUsualItemHeight;
   SendToDialog(WM_MEASUREITEM, measure.CtlID, reinterpret_cast<LPARAM>(&measure));
   control->itemHeight = measure.itemHeight;
 }
@@ -56,7 +58,7 @@ void DrawControls() {
 }
 
 void DeleteItems(const Window& control) {
-  for (size_t index = 0; index < control.items.size(); ++index) {
+  for (size_t index = control.items.size(); index-- > 0;) {
     DELETEITEMSTRUCT deleted = {};
     deleted.CtlType = ODT_COMBOBOX;
     deleted.CtlID = static_cast<UINT>(control.id);

@@ -12,7 +12,7 @@ void MeasureItems(Window* control);
 // Lets every owner-drawn control that is shown and has changed draw itself.
 void DrawControls();
 
-// Tells of each entry of a list that goes.
+// Tells of each entry of a list that goes, the last one first.
 void DeleteItems(const Window& control);
 
 }  // namespace machine
