@@ -8,6 +8,7 @@
 #include <map>
 
 #include "machine/disk_room.h"
+#include "machine/dos_path.h"
 #include "machine/file_attributes.h"
 #include "machine/machine.h"
 
@@ -15,6 +16,7 @@ namespace machine {
 namespace {
 
 constexpr int kFirstNumber = 3;
+constexpr char kNoDrive = '\0';  // of a device
 
 std::map<int, OpenFile> openFiles;
 int permissionMask = 0;
@@ -101,25 +103,31 @@ bool WriteAll(int host, const char* bytes, size_t count, off_t position) {
   return true;
 }
 
-}  // namespace
-
-int OpenProgramFile(ObjectKind kind, std::string_view dosPath, const OpenMode& mode) {
-  const std::optional<Location> location = Locate(dosPath);
-  if (!location || !CanOpen(*location, mode)) return -1;
-  const int host = OpenOnHost(*location, mode);
+// The program's number for a host's descriptor, which it owns from now on; -1 for none.
+int Enter(ObjectKind kind, const OpenMode& mode, char drive, int host) {
   struct stat status;
   if (host < 0 || fstat(host, &status) != 0) return -1;
-
   const int number = FreeNumber();
   openFiles.emplace(number, OpenFile{.kind = kind,
                                      .mode = mode,
-                                     .drive = location->drive,
+                                     .drive = drive,
                                      .device = status.st_dev,
                                      .inode = status.st_ino,
                                      .host = host,
                                      .size = static_cast<uint64_t>(status.st_size)});
   ObjectOpened(kind);
   return number;
+}
+
+}  // namespace
+
+int OpenProgramFile(ObjectKind kind, std::string_view dosPath, const OpenMode& mode) {
+  if (IsNullDevicePath(dosPath)) {
+    return Enter(kind, mode, kNoDrive, open("/dev/null", HostFlags(mode.access)));
+  }
+  const std::optional<Location> location = Locate(dosPath);
+  if (!location || !CanOpen(*location, mode)) return -1;
+  return Enter(kind, mode, location->drive, OpenOnHost(*location, mode));
 }
 
 OpenFile* FindOpenFile(int number, ObjectKind kind) {

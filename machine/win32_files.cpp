@@ -6,6 +6,7 @@
 #include <cstring>
 
 #include "machine/disk_room.h"
+#include "machine/dos_path.h"
 #include "machine/drives.h"
 #include "machine/faults.h"
 #include "machine/file_attributes.h"
@@ -214,6 +215,7 @@ BOOL RemoveDirectoryA(LPCSTR name) {
 
 DWORD GetFileAttributesA(LPCSTR name) {
   if (CallFails("GetFileAttributesA")) return INVALID_FILE_ATTRIBUTES;
+  if (machine::IsDevicePath(TextOf(name))) return FILE_ATTRIBUTE_ARCHIVE;
   const auto location = Locate(TextOf(name));
   if (!location || !location->exists) return INVALID_FILE_ATTRIBUTES;
   if (location->isRoot) return FILE_ATTRIBUTE_DIRECTORY;
