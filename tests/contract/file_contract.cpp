@@ -99,7 +99,10 @@ CONTRACT(Files, PositionsHaveThirtyTwoBits) {
   Expect(SetFilePointer(file, 5, &high, FILE_BEGIN), 5);
   Expect(high, 1);
   Expect(Read(file, 4), "", "far behind the end");
-  Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER, "nowhere for the upper half");
+  // Wine gives the lower half.
+  if (!contract::IsWine()) {
+    Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER, "nowhere for the upper half");
+  }
   Expect(Seek(file, 2, FILE_END), 5);
   Expect(GetFileSize(file, nullptr), 3, "a move behind the end adds nothing");
   Expect(Write(file, "z"), TRUE);
@@ -141,13 +144,13 @@ CONTRACT(Files, SomeCanBeNeitherOpenedNorMade) {
     Expect(_sopen(name, _O_RDONLY | _O_BINARY, _SH_DENYNO), -1, name);
     Expect(DeleteFileA(name), FALSE, name);
     Expect(CopyFileA("C:\\contract\\plain", name, FALSE), FALSE, name);
-    Expect(CopyFileA(name, "C:\\contract\\copy", FALSE), FALSE, name);
+    Expect(CopyFileA(name, "C:\\contract\\copy of it", FALSE), FALSE, name);
   }
   Expect(Opens(Open("C:\\contract\\absent", GENERIC_WRITE)), false);
   Expect(CreateFileA(nullptr, GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr),
          INVALID_HANDLE_VALUE);
   Expect(GetFileAttributesA("C:\\contract\\absent"), INVALID_FILE_ATTRIBUTES);
-  Expect(GetFileAttributesA("C:\\contract\\copy"), INVALID_FILE_ATTRIBUTES);
+  Expect(GetFileAttributesA("C:\\contract\\copy of it"), INVALID_FILE_ATTRIBUTES);
 }
 
 CONTRACT(Files, CreateCutsAndKeepsTheNameThatIsThere) {
@@ -190,9 +193,14 @@ CONTRACT(Files, CopiesCarryBytesAndAttributes) {
   Expect(CopyFileA("C:\\contract\\from", "C:\\contract\\to", TRUE), FALSE);
   Expect(ReadText("C:\\contract\\to"), "something else");
   _chmod("C:\\contract\\from", _S_IREAD);
-  Expect(CopyFileA("C:\\contract\\from", "C:\\contract\\to", FALSE), TRUE);
-  Expect(ReadText("C:\\contract\\to") == bytes, true);
-  Expect(GetFileAttributesA("C:\\contract\\to"), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY);
+  for (const std::string to : {"C:\\contract\\to", "C:\\contract\\new to"}) {
+    Expect(CopyFileA("C:\\contract\\from", to.c_str(), FALSE), TRUE, to);
+    Expect(ReadText(to) == bytes, true, to);
+    // Wine leaves a file that is there its attributes.
+    if (contract::IsWine() && to == "C:\\contract\\to") continue;
+    Expect(GetFileAttributesA(to.c_str()), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY, to);
+    _chmod(to.c_str(), kOwnerMayReadAndWrite);
+  }
   _chmod("C:\\contract\\from", kOwnerMayReadAndWrite);
   _chmod("C:\\contract\\to", kOwnerMayReadAndWrite);
 
@@ -260,6 +268,21 @@ CONTRACT(Files, NamesLeadToTheirFiles) {
       {"C:\\contract\\dir. ", kDirectory},
       {"C:\\contract\\dir.\\read me.txt", kFile},
       {"C:\\contract\\dir \\read me.txt", kNone},
+      {"C:\\contract\\dir..\\read me.txt", kNone},
+      {"C:\\contract\\dir. .\\read me.txt", kNone},
+      {"C:\\contract\\...\\dir", kNone},
+      {"C:\\contract\\dir\\. \\read me.txt", kNone},
+      {"C:\\contract\\dir\\.. \\dir", kNone},
+      {"C:\\contract\\dir\\.. ", kDirectory},
+      {"C:\\contract\\dir\\. . ", kDirectory},
+      {"C:\\contract\\dir\\read me.txt \\", kNone},
+      {"C:contract\\dir", kDirectory},
+      {"contract/dir", kDirectory},
+      {"C:\\contract\\nul ", kFile},
+      {"C:\\contract\\nul\\", kNone},
+      {"C:\\contract\\nul.", kFile},
+      {"nul:x", kFile},
+      {"C:nul", kFile},
       {"C:\\contract\\dir\\..", kDirectory},
       {"C:\\contract\\dir\\...", kDirectory},
       {"C:\\contract\\dir\\ ", kDirectory},
@@ -281,7 +304,6 @@ CONTRACT(Files, NamesLeadToTheirFiles) {
       {"C:\\contract\\aux .x", kFile},
       {"C:\\contract\\Com1", kFile},
       {"C:\\contract\\lpt9:", kFile},
-      {"C:\\contract\\absent\\nul", kFile},
       {"C:\\contract\\nul\\x", kNone},
       {"nul", kFile},
   };
@@ -304,7 +326,8 @@ CONTRACT(Files, NullDeviceIsOpenedForAName) {
   Expect(Write(device, "x"), TRUE);
   Expect(Read(device, 1), "");
   Expect(CloseHandle(device), TRUE);
-  Expect(CreateDirectoryA("C:\\contract\\nul", nullptr), FALSE);
+  // Wine makes a directory of that name.
+  if (!contract::IsWine()) Expect(CreateDirectoryA("C:\\contract\\nul", nullptr), FALSE);
   Expect(DeleteFileA("C:\\contract\\nul"), FALSE);
 }
 
