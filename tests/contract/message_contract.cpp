@@ -1,0 +1,159 @@
+// Messages: what is sent, posted and polled, what a click and a change of text bring.
+#include <string>
+#include <vector>
+
+#include "tests/contract/standing_dialog.h"
+
+using contract::Expect;
+using contract::IsStep;
+using contract::kLastStep;
+using contract::kNextStep;
+using contract::kStep;
+using contract::RunDialog;
+using contract::RunStanding;
+
+namespace {
+
+constexpr UINT kButtonDown = 0x201;
+constexpr UINT kButtonUp = 0x202;
+constexpr int kEditChange = 0x300;
+constexpr int kEditUpdate = 0x400;
+
+// The next posted step, taken out of the queue; others are dispatched on the way. 0 for none.
+MSG TakeStep() {
+  MSG message = {};
+  while (PeekMessageA(&message, nullptr, 0, 0, PM_REMOVE) != FALSE) {
+    if (IsStep(message.message)) return message;
+    TranslateMessage(&message);
+    DispatchMessageA(&message);
+  }
+  return {};
+}
+
+void PostClick(HWND control) {
+  PostMessageA(control, kButtonDown, 1, 0x00020002);
+  PostMessageA(control, kButtonUp, 0, 0x00020002);
+}
+
+}  // namespace
+
+CONTRACT(Messages, SentMessageAnswersNothingOfTheHandlers) {
+  RunDialog([](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
+    if (message == WM_INITDIALOG) {
+      // What a handler returns tells only whether it has handled the message.
+      Expect(SendMessageA(dialog, kStep, 1, 0), 0);
+      Expect(SendMessageA(dialog, WM_COMMAND, 77, 0), 0);
+      EndDialog(dialog, 1);
+    }
+    return message == kStep || (message == WM_COMMAND && LOWORD(wParam) == 77) ? 5 : FALSE;
+  });
+}
+
+CONTRACT(Messages, PostedMessagesComeInTheirOrder) {
+  std::vector<UINT> order;
+  RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+    if (message == WM_INITDIALOG) {
+      Expect(PostMessageA(dialog, kStep, 1, 2), TRUE);
+      Expect(PostMessageA(dialog, kNextStep, 0, 0), TRUE);
+    }
+    if (IsStep(message)) order.push_back(message);
+    if (message == kStep) {
+      Expect(wParam, 1);
+      Expect(lParam, 2);
+      PostMessageA(dialog, kLastStep, 0, 0);
+      Expect(order.size(), 1, "none runs inside the call");
+    }
+    if (message == kLastStep) {
+      EndDialog(dialog, 1);
+      PostMessageA(dialog, kStep, 0, 0);  // too late: the loop has ended
+    }
+    return FALSE;
+  });
+  Expect(order == std::vector<UINT>{kStep, kNextStep, kLastStep}, true);
+}
+
+CONTRACT(Messages, PolledMessagesAreThoseOfWindowsThatStand) {
+  RunStanding([](HWND dialog) {
+    const HWND gone = GetDlgItem(dialog, 9);
+    Expect(PostMessageA(gone, kStep, 0, 0), TRUE);
+    Expect(PostMessageA(dialog, kNextStep, 3, 4), TRUE);
+    Expect(PostMessageA(nullptr, kLastStep, 0, 0), TRUE, "of the thread");
+    DestroyWindow(gone);
+    Expect(PostMessageA(gone, kStep, 0, 0), FALSE);
+    MSG message = TakeStep();
+    Expect(message.message, kNextStep);
+    Expect(message.hwnd, dialog);
+    Expect(message.wParam, 3);
+    Expect(message.lParam, 4);
+    message = TakeStep();
+    Expect(message.message, kLastStep);
+    Expect(message.hwnd, nullptr);
+    Expect(DispatchMessageA(&message), 0);
+    Expect(TakeStep().message, 0);
+  });
+}
+
+CONTRACT(Messages, EndInsideANestedHandlerWaitsForTheOuterOne) {
+  bool isOuterDone = false;
+  const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
+    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
+    if (message == kStep) {
+      PostMessageA(dialog, kNextStep, 0, 0);
+      PostMessageA(dialog, kLastStep, 0, 0);
+      const MSG next = TakeStep();
+      Expect(next.message, kNextStep);
+      DispatchMessageA(&next);
+      Expect(IsWindow(dialog), TRUE);
+      Expect(GetDlgItem(dialog, 10) != nullptr, true);
+      isOuterDone = true;
+    }
+    if (message == kNextStep) EndDialog(dialog, 7);
+    Expect(message == kLastStep, false);
+    return FALSE;
+  });
+  Expect(isOuterDone, true);
+  Expect(result, 7);
+}
+
+CONTRACT(Messages, ClickGivesTheIdOfThatMoment) {
+  std::vector<int> commands;
+  RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
+    if (message == kStep) {
+      // Only the last can be clicked on: a text without SS_NOTIFY, disabled, hidden, renumbered.
+      SetWindowLongA(GetDlgItem(dialog, 11), GWL_ID, 21);
+      const HWND notified = GetDlgItem(dialog, 9);
+      SetWindowLongA(notified, GWL_ID, 20);
+      PostClick(GetDlgItem(dialog, 9));
+      PostClick(GetDlgItem(dialog, 21));
+      PostClick(notified);
+      PostMessageA(dialog, kLastStep, 0, 0);
+    }
+    if (message == WM_COMMAND && HIWORD(wParam) == 0) {
+      commands.push_back(LOWORD(wParam));
+      Expect(reinterpret_cast<HWND>(lParam), GetDlgItem(dialog, LOWORD(wParam)));
+      const HWND button = GetDlgItem(dialog, 21);
+      if (LOWORD(wParam) == 21) Expect(SetFocus(button), button, "the click has moved it there");
+    }
+    if (message == kLastStep) EndDialog(dialog, 1);
+    return FALSE;
+  });
+  Expect(commands == std::vector<int>{21, 20}, true);
+}
+
+CONTRACT(Messages, EditFieldTellsOfEveryChange) {
+  std::vector<int> notices;
+  RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
+    const bool isNotice = message == WM_COMMAND && LOWORD(wParam) == 10;
+    if (isNotice && HIWORD(wParam) >= kEditChange) notices.push_back(HIWORD(wParam));
+    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
+    if (message == kStep) {
+      SetWindowTextA(GetDlgItem(dialog, 10), "by program");
+      SetWindowTextA(GetDlgItem(dialog, 11), "a button");
+      SendMessageA(GetDlgItem(dialog, 10), EM_SETSEL, 0, -1);
+      EndDialog(dialog, 1);
+    }
+    return FALSE;
+  });
+  Expect(notices == std::vector<int>{kEditUpdate, kEditChange}, true);
+}
