@@ -94,6 +94,7 @@ inline constexpr std::string_view kSeamFunctions[] = {
     "SHBrowseForFolderA",
     "SHGetPathFromIDListA",
     "SHGetMalloc",
+    "SetDefaultDllDirectories",
     "GetDiskFreeSpaceExA",
     "GetFileVersionInfoSizeA",
     "GetFileVersionInfoA",

@@ -67,6 +67,7 @@ FARPROC FindFunction(const Library* library, std::string_view name) {
   if (library == &kernel) {
     const bool present = machine::CurrentSettings().hasGetDiskFreeSpaceEx;
     if (name == "GetDiskFreeSpaceExA" && present) return Address(GetDiskFreeSpaceExA);
+    if (name == "SetDefaultDllDirectories") return Address(SetDefaultDllDirectories);
   }
   if (library == &version) {
     if (name == "GetFileVersionInfoSizeA") return Address(GetFileVersionInfoSizeA);
@@ -119,6 +120,13 @@ BOOL FreeLibrary(HMODULE module) {
   --library->references;
   ObjectClosed(machine::ObjectKind::kModule);
   return !fails;
+}
+
+// Takes the one choice that changes nothing here, where libraries come from the system directory
+// alone. Windows takes other sets of directories too.
+BOOL SetDefaultDllDirectories(DWORD flags) {
+  if (machine::CallFails("SetDefaultDllDirectories")) return FALSE;
+  return flags == LOAD_LIBRARY_SEARCH_SYSTEM32 ? TRUE : FALSE;
 }
 
 // Functions by name alone: a name below 0x10000 is an ordinal.

@@ -154,6 +154,8 @@ struct OSVERSIONINFOA {
 };
 typedef OSVERSIONINFOA* LPOSVERSIONINFOA;
 
+#define LOAD_LIBRARY_SEARCH_SYSTEM32 0x800u
+
 struct SYSTEMTIME {
   WORD wYear;
   WORD wMonth;
@@ -466,8 +468,9 @@ LPITEMIDLIST SHBrowseForFolderA(BROWSEINFOA* info);
 BOOL SHGetPathFromIDListA(LPCITEMIDLIST list, LPSTR path);
 HRESULT SHGetMalloc(IMalloc** allocator);
 
-// Reached through GetProcAddress alone, never imported: a system can lack the first one, and a
+// Reached through GetProcAddress alone, never imported: a system can lack the first two, and a
 // version.dll that lies beside the program must not be loaded in the system's place.
+BOOL SetDefaultDllDirectories(DWORD flags);
 BOOL GetDiskFreeSpaceExA(LPCSTR root, PULARGE_INTEGER freeToCaller, PULARGE_INTEGER total,
                          PULARGE_INTEGER freeBytes);
 DWORD GetFileVersionInfoSizeA(LPCSTR name, LPDWORD handle);
