@@ -37,9 +37,7 @@ def main():
     reason = world.missing() or (real_input.missing() if options.real_input else '')
     if reason:
         tell(options, world, f'{world.name}: left out: {reason}')
-        # Only what the host can't do and what was asked for is left out without a failure.
-        asked_for = os.environ.get('MORIV_WINE') == 'none'
-        return LEFT_OUT if asked_for or options.world == 'wine32' else 1
+        return status_without_world(options)
     tools, images = make_tools(options, world)
     try:
         require(tools.image_tool)
@@ -50,6 +48,12 @@ def main():
         print(error, file=sys.stderr)
         return 2
     return 1 if failures else 0
+
+
+def status_without_world(options):
+    """Only what the host can't do and what was asked for is left out without a failure."""
+    asked_for = os.environ.get('MORIV_WINE') == 'none'
+    return LEFT_OUT if asked_for or options.world == 'wine32' else 1
 
 
 def tell(options, world, line):

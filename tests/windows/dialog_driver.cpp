@@ -25,6 +25,7 @@
 
 #include "tests/windows/dialog_view.h"
 #include "tests/windows/driven_program.h"
+#include "tests/windows/foreign_process.h"
 #include "tests/windows/modal_answers.h"
 #include "tests/windows/user_input.h"
 
@@ -109,6 +110,8 @@ void Act(HWND dialog, const Line& line) {
     const std::wstring text = Wide(line.rest.substr(std::min(blank + 1, line.rest.size())));
     const HWND edit = Clickable(dialog, line.rest.substr(0, blank));
     Ask(edit, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(text.c_str()));
+  } else if (line.verb == "load") {
+    LoadLibraryIn(DrivenProcess().hProcess, line.rest);
   } else if (line.verb == "escape" || line.verb == "escape-during") {
     PressKey(VK_ESCAPE);
   } else if (line.verb == "close" || line.verb == "close-during") {

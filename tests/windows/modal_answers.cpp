@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "tests/windows/driven_program.h"
+#include "tests/windows/foreign_process.h"
 
 namespace {
 
@@ -44,12 +45,10 @@ BOOL CALLBACK FindTree(HWND window, LPARAM data) {
 // The picker takes the path from its own memory.
 void SelectFolder(HWND picker, const std::string& path) {
   const std::wstring text = Wide(path);
-  const size_t size = (text.size() + 1) * sizeof(wchar_t);
-  void* const place = VirtualAllocEx(DrivenProcess().hProcess, nullptr, size,
-                                     MEM_COMMIT | MEM_RESERVE, PAGE_READWRITE);
-  WriteProcessMemory(DrivenProcess().hProcess, place, text.c_str(), size, nullptr);
-  Ask(picker, BFFM_SETSELECTIONW, TRUE, reinterpret_cast<LPARAM>(place));
-  VirtualFreeEx(DrivenProcess().hProcess, place, 0, MEM_RELEASE);
+  WithCopyIn(DrivenProcess().hProcess, text.c_str(), (text.size() + 1) * sizeof(wchar_t),
+             [picker](void* place) {
+               Ask(picker, BFFM_SETSELECTIONW, TRUE, reinterpret_cast<LPARAM>(place));
+             });
 }
 
 void AnswerPicker(HWND picker, std::deque<Line>* picks) {
