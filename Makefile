@@ -4,7 +4,8 @@ PRESETS := native win32 win64
 BENCH_PRESETS := bench bench-win32 bench-win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check bench screenshots win32-emulated clean bootstrap $(PRESETS)
+.PHONY: all demo demo-dialog test check bench screenshots win32-emulated dist clean bootstrap \
+  $(PRESETS)
 
 all: $(PRESETS)
 
@@ -45,6 +46,10 @@ screenshots: all
 # The 32-bit program in scenarios, in an emulator where the kernel runs no 32-bit code.
 win32-emulated: all
 	@tools/win32-emulated
+
+# The release folder, build/dist/: programs without a package, tools, documents, SHA-256 sums.
+dist: all
+	@tools/dist
 
 clean:
 	rm -rf build

@@ -83,7 +83,7 @@ void WriteHeading(DataFile* file) {
 }
 
 void WriteEvent(DataFile* file, int number, const EventEntry& entry) {
-  const char* text = entry.code < kEventTextCount ? kEventTexts[entry.code] : "";
+  const char* const text = EventText(entry.code);
   char line[kLineSize] = {};
   switch (entry.severity) {
     case SeverityInformation:
@@ -108,6 +108,10 @@ bool OpenLog(DataFile* file, LogMode mode) {
 }
 
 }  // namespace
+
+const char* EventText(uint32_t code) {
+  return code < kEventTextCount ? kEventTexts[code] : "";
+}
 
 bool FindLogPath(char (&path)[kLogPathSize]) {
   char directory[kPathSize] = {};

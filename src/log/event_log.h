@@ -9,6 +9,9 @@ enum class LogMode { kAppend = 0, kNew = 1 };
 // Room for the standard log's full path: a directory and a name.
 inline constexpr size_t kLogPathSize = 2 * kPathSize;
 
+// The log's text for an event code; empty for a code that has none.
+const char* EventText(uint32_t code);
+
 // Full path of the standard log, MorivLog.txt in the Windows directory. False when there is none.
 bool FindLogPath(char (&path)[kLogPathSize]);
 

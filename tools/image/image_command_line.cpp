@@ -12,6 +12,8 @@
 #include "tools/image/image_verifier.h"
 #include "tools/image/language_names.h"
 #include "tools/image/removal_image.h"
+#include "tools/image/run_explainer.h"
+#include "tools/image/run_outcomes.h"
 
 namespace image {
 namespace {
@@ -34,6 +36,7 @@ class ImageTool {
     AddVerify();
     AddExtract();
     AddRemoval();
+    AddExplain();
   }
 
   int Run(int argc, const char* const* argv, std::ostream& err) {
@@ -112,6 +115,16 @@ class ImageTool {
     command->callback([this] { WriteRemoval(); });
   }
 
+  void AddExplain() {
+    CLI::App* command = app_.add_subcommand("explain", "Say how a run ended, and what to do");
+    command->add_option("CODE|LOG", ended_, "Exit code, signed, unsigned or 0x..., or a log file")
+        ->required();
+    command->callback([this] {
+      const std::optional<StatusCode> code = ParseExitCode(ended_);
+      out_ << (code ? ExplainExitCode(*code) : ExplainLog(ended_));
+    });
+  }
+
   void Verify() {
     for (const Finding& finding : VerifyImage(verified_)) {
       out_ << (finding.isGood ? "ok     " : "wrong  ") << finding.text << '\n';
@@ -131,12 +144,14 @@ class ImageTool {
   }
 
   std::ostream& out_;
-  CLI::App app_{"Makes, shows, checks and unpacks setup images.", "moriv-image"};
+  CLI::App app_{"Makes, shows, checks and unpacks setup images, and explains how runs ended.",
+                "moriv-image"};
   PackOrder pack_;
   std::string listed_;
   std::string verified_;
   ExtractOrder extract_;
   RemovalOrder removal_;
+  std::string ended_;
   int status_ = 0;
 };
 

@@ -1,0 +1,80 @@
+// What moriv-image explain says: every exit code has its words, in every form that tools show, and
+// a log is judged by its last run. Which event goes with which code is held against the scenarios
+// (tests/scenarios/explained_logs.py).
+
+#include "tools/image/run_explainer.h"
+
+#include <fstream>
+#include <regex>
+
+#include "tests/tools/tool_bench.h"
+#include "tools/image/run_outcomes.h"
+
+namespace {
+
+using RunExplainer = ToolBench;
+
+TEST_F(RunExplainer, HasWordsForEveryStatus) {
+  std::ifstream header(MORIV_SOURCE_DIR "/src/core/status.h");
+  const std::regex declaration("inline constexpr StatusCode (Status\\w+) = (-?\\d+);");
+  size_t declared = 0;
+  std::smatch match;
+  for (std::string line; std::getline(header, line);) {
+    if (!std::regex_match(line, match, declaration)) continue;
+    ++declared;
+    const image::RunOutcome* outcome = image::FindRunOutcome(std::stoi(match[2]));
+    ASSERT_NE(outcome, nullptr) << line;
+    EXPECT_EQ(outcome->name, match[1].str());
+    EXPECT_STRNE(outcome->meaning, "");
+    EXPECT_STRNE(outcome->remedy, "");
+  }
+  // 0, after the help, is no status.
+  EXPECT_EQ(image::RunOutcomes().size(), declared + 1);
+}
+
+TEST_F(RunExplainer, TakesACodeInEveryForm) {
+  for (const char* code : {"-1000020", "4293967276", "0xFFF0BDAC", "0xfff0bdac"}) {
+    const ToolRun run = RunImage({"explain", code});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_TRUE(
+        run.out.starts_with("exit code   -1000020 = 4293967276 = 0xFFF0BDAC, StatusNoDiskSpace\n"
+                            "meaning     The package needs more bytes than are free."))
+        << code << run.out;
+  }
+  for (const char* code :
+       {"100003", "2", "-1000022", "4294967296", "-2147483649", "0x", "0x-1", "1x", ""}) {
+    const ToolRun run = RunImage({"explain", code});
+    EXPECT_EQ(run.status, 2) << code;
+    EXPECT_EQ(run.out, "") << code;
+  }
+}
+
+TEST_F(RunExplainer, JudgesTheLastRunOfALog) {
+  const std::string failed =
+      "\r\n\r\nInstalling Moriv : Monday, 01 June 2026 at : 01h 02m 03s \r\n\r\n"
+      "1- Fatal Error : Error copying destination file :  C:\\\xE9. \r\n\r\n"
+      " (Application will exit)\r\n";
+  const std::string removed =
+      "\r\n\r\nInstalling Moriv : Tuesday, 02 June 2026 at : 01h 02m 03s \r\n\r\n"
+      "1- Unistalling Moriv from the system \r\n"
+      "2- Moriv registration removed from the registry \r\n";
+  Write("removed", failed + removed);
+  EXPECT_EQ(RunImage({"explain", "@removed"}).out,
+            "run         Tuesday, 02 June 2026 at : 01h 02m 03s\n"
+            "event       2- Moriv registration removed from the registry\n"
+            "exit code   1 = 0x00000001, StatusOk\n"
+            "meaning     Success: all is done.\n"
+            "to do       Nothing.\n");
+  Write("failed", removed + failed);
+  const std::string out = RunImage({"explain", "@failed"}).out;
+  EXPECT_NE(out.find("event       1- Fatal Error : Error copying destination file :  C:\\é.\n"
+                     "exit code   -1000021 "),
+            std::string::npos)
+      << out;
+  Write("other", "1- Fatal Error : Cannot allocate memory . \r\n");
+  const ToolRun other = RunImage({"explain", "@other"});
+  EXPECT_EQ(other.status, 2);
+  EXPECT_NE(other.err.find("no log of the setup program"), std::string::npos) << other.err;
+}
+
+}  // namespace
