@@ -150,7 +150,7 @@ std::string PlausibleStream(Random& random) {
   CodeStream codes;
   size_t free = 258;  // the next free code, once the first code has been put
   const size_t widening = 1 + Below(random, 8);
-  for (size_t count = Below(random, 3000); count > 0; --count) {
+  for (size_t count = Below(random, 3000); count > 0 && codes.width() <= 32; --count) {
     const size_t limit = std::min<size_t>(free + 1, size_t{1} << codes.width());
     const size_t kind = Below(random, 200);
     const bool isFirst = free == 258;
