@@ -85,14 +85,6 @@ TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
   EXPECT_TRUE(exists("C:\\OLD\\FIVE"));
 }
 
-TEST(Drives, LengthIsThatOfTheFullPath) {
-  TestMachine pc;
-  EXPECT_TRUE(Locate("C:\\" + std::string(256, 'a')).has_value());
-  EXPECT_FALSE(Locate("C:\\" + std::string(257, 'a')).has_value());
-  EXPECT_FALSE(Locate(std::string(257, 'a')).has_value());
-  EXPECT_TRUE(Locate("C:\\x\\..\\" + std::string(256, 'a')).has_value());
-}
-
 TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
   TestMachine pc;
   pc.Write("drive_c/dir/file", "x");

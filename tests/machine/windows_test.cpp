@@ -81,14 +81,6 @@ class Commands : public DialogTest {
   }
 };
 
-TEST_F(Commands, ClickGivesTheIdOfThatMoment) {
-  const auto renumber = [](HWND dialog) { SetWindowLongA(GetDlgItem(dialog, 10), GWL_ID, 20); };
-  EXPECT_EQ(Play({Control("Button", 10), Control("Static", 11, kShownControl | kNotify),
-                  Control("Static", 12)},
-                 "press 20\npress 11\npress 12\nescape\n", renumber),
-            (std::vector<CommandSeen>{{20, 0}, {11, STN_CLICKED}, {IDCANCEL, 0}}));
-}
-
 TEST_F(Commands, EscapeAndCloseBoxNeedNoControl) {
   for (const char* const key : {"escape\n", "close\n"}) {
     EXPECT_EQ(Play({}, key), (std::vector<CommandSeen>{{IDCANCEL, 0}}));
