@@ -122,9 +122,11 @@ int FreeLanguageList(HWND dialog, LanguageListArt* art) {
   for (LRESULT index = 0; index < count; ++index) {
     LanguageItem* const item = LanguageItemAt(dialog, static_cast<WPARAM>(index));
     if (item == nullptr) continue;
-    // First out of the list's reach, so that its notice of the deleted entry finds nothing.
-    SendMessageA(list, CB_SETITEMDATA, static_cast<WPARAM>(index), 0);
-    ReleaseItem(item);
+    // First out of the list's reach, so that its notice of the deleted entry finds nothing. An item
+    // that stays in reach is released by that notice.
+    if (SendMessageA(list, CB_SETITEMDATA, static_cast<WPARAM>(index), 0) != CB_ERR) {
+      ReleaseItem(item);
+    }
   }
   DeleteBrush(&art->selectedBrush);
   DeleteBrush(&art->normalBrush);
