@@ -120,13 +120,13 @@ void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
 // ---- The machine
 
 constexpr char kScript[] = "drive_c/windows/Moriv.INF";
-constexpr char kRunOnce[] =
-    "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce] "
-    "\"MorivCommand\"";
+constexpr char kServices[] = "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Zeb\\Moriv\\Services]";
 constexpr char kDisplayName[] =
     "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\Moriv] "
     "\"DisplayName\"";
-constexpr char kServices[] = "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Zeb\\Moriv\\Services]";
+constexpr char kRunOnce[] =
+    "registry [HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\RunOnce] "
+    "\"MorivCommand\"";
 
 bool Holds(const MachineState& state, const std::string& name, const std::string& content) {
   const auto item = state.items.find(name);
@@ -134,8 +134,8 @@ bool Holds(const MachineState& state, const std::string& name, const std::string
 }
 
 // Without power nobody cleans up. A script that could not be written whole stays, without the
-// command that would use it. A system that doesn't tell its family gets the 9x family's command. A
-// text that can't be had is empty.
+// command that would use it. A system that doesn't tell its family gets the 9x family's command,
+// and a name that the catalog doesn't give is an empty one.
 bool MayDiffer(const FaultyRun& run, const std::string& name) {
   return run.report.end == RunEnd::kStopped || name == kScript ||
          (name == kRunOnce && run.injection.function == "GetVersionExA") ||
@@ -217,8 +217,8 @@ std::vector<std::string> JudgeSecondRun(const FaultyRun& first, const RunReport&
     complaints.push_back("a second run gives " + std::to_string(second.code));
   }
   for (const auto& [name, content] : first.whole.items) {
-    // A product tree is made when there is none; one whose root stands is left as it is.
-    if (name == kServices && !first.after.items.contains(name)) continue;
+    // The tree is made only where its root is missing, and does without this key.
+    if (name == kServices && first.injection.function == "RegCreateKeyExA") continue;
     if (!Holds(after, name, content)) complaints.push_back("a second run doesn't make " + name);
   }
   for (const auto& [name, content] : after.items) {
