@@ -1,0 +1,32 @@
+// moriv-image pack on hostile descriptions: a failure leaves nothing behind, and what is packed is
+// an image that verifies.
+//
+// The input is the TOML text. Of the files that it can name there are stub.exe, a.exe, b.dll and
+// empty.txt.
+#include "tests/fuzz/tool_runs.h"
+
+namespace {
+
+const ToolRuns& ToolWithSample() {
+  static const ToolRuns tool;
+  static const bool isPacked = (tool.PackSample(), true);
+  EXPECT_TRUE(isPacked);
+  return tool;
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  const ToolRuns& tool = ToolWithSample();
+  tool.Write("fuzz.toml", std::string(data, data + size));
+  const std::vector<std::string> before = tool.NamesIn("");
+  const bool isPacked =
+      tool.Run({"pack", "@fuzz.toml", "--stub", "@stub.exe", "-o", "@packed.exe"}) == 0;
+  if (isPacked) {
+    EXPECT_EQ(tool.Run({"verify", "@packed.exe"}), 0);
+    EXPECT_EQ(tool.Run({"list", "@packed.exe"}), 0);
+    tool.Remove({"packed.exe"});
+  }
+  EXPECT_EQ(tool.NamesIn(""), before);
+  return 0;
+}

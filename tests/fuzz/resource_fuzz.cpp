@@ -1,0 +1,62 @@
+// Hostile resources of the stand-in: a .res file as such, and as the one that the program carries;
+// the rest of the input after its first two bytes is also a dialog by itself.
+#include <cstring>
+#include <vector>
+
+#include "machine/dialog_template.h"
+#include "machine/executable_resources.h"
+#include "machine/resource_file.h"
+#include "platform/win32.h"
+#include "tests/fuzz/fuzz_target.h"
+
+// The section that a program's resources are embedded in, here one to be written to.
+asm(R"(
+    .data
+    .globl moriv_resources_begin
+moriv_resources_begin:
+    .space 8192
+    .globl moriv_resources_end
+moriv_resources_end:
+    .text
+)");
+
+extern "C" uint8_t moriv_resources_begin[];
+extern "C" uint8_t moriv_resources_end[];
+
+namespace {
+
+constexpr int kDialogType = 5;
+
+void AskForOwnResources(std::string_view bytes) {
+  const auto room = static_cast<size_t>(moriv_resources_end - moriv_resources_begin);
+  std::memset(moriv_resources_begin, 0, room);
+  bytes.copy(reinterpret_cast<char*>(moriv_resources_begin), room);
+  for (const UINT id : {0u, 15u, 100u, 118u, 10104u, 65535u}) {
+    char text[32];
+    const int length = LoadStringA(nullptr, id, text, sizeof(text));
+    EXPECT_TRUE(length >= 0 && length < int{sizeof(text)} && text[length] == '\0');
+  }
+  const HBITMAP bitmap = LoadBitmapA(nullptr, MAKEINTRESOURCEA(118));
+  if (bitmap != nullptr) EXPECT_NE(DeleteObject(bitmap), FALSE);
+  const auto dialog = machine::OwnResource(kDialogType, 116);
+  if (dialog) (void)machine::ReadDialogTemplate(*dialog);
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  FuzzInput input(data, size);
+  const int type = input.TakeByte();
+  const int id = input.TakeByte();
+  // A block of its own, so that a read behind its end is seen.
+  const std::vector<uint8_t> file(data + (size - input.rest().size()), data + size);
+  const auto found = machine::FindInResourceFile(file, type, id);
+  if (found && !found->empty()) {
+    EXPECT_TRUE(found->data() >= file.data());
+    EXPECT_TRUE(found->data() + found->size() <= file.data() + file.size());
+  }
+  const auto dialog = machine::ReadDialogTemplate(file);
+  if (dialog) EXPECT_LE(dialog->controls.size() * 18, file.size());
+  AskForOwnResources(input.rest());
+  return 0;
+}

@@ -1,0 +1,55 @@
+// Silent runs in the fuzzer's own process, and what holds after each of them.
+#pragma once
+
+#include <filesystem>
+#include <map>
+#include <set>
+#include <string>
+
+#include "core/command_line.h"
+#include "core/driver.h"
+#include "machine/open_objects.h"
+#include "tests/fuzz/fuzz_target.h"
+#include "tests/support/test_machine.h"
+
+// The codes that docs/exit-codes.md gives for a silent install or removal, but for a lack of
+// memory.
+inline const std::set<StatusCode> kSilentCodes = {StatusOk,
+                                                  StatusBufferTooSmall,
+                                                  StatusDeleteFailed,
+                                                  StatusCreateFileFailed,
+                                                  StatusInternal,
+                                                  StatusCreateDirFailed,
+                                                  StatusBadRecord,
+                                                  StatusBadPackage,
+                                                  StatusReadFailed,
+                                                  StatusExpandFailed,
+                                                  StatusSeekFailed,
+                                                  StatusServicesRemain,
+                                                  StatusNoDiskSpace,
+                                                  StatusCopyFailed,
+                                                  StatusRemovalProgramFailed,
+                                                  StatusNotRegistered};
+
+// Runs the program from `image`, a file in the machine's folder, as its entry does.
+inline StatusCode RunSilently(TestMachine& pc, const std::string& image, const char* commandLine) {
+  pc.Restart(image);
+  SetupRequest request = {};
+  request.language = kLanguageNone;
+  EXPECT_EQ(ParseCommandLine(commandLine, &request), 1);
+  const StatusCode code = RunSetup(request);
+  EXPECT_TRUE(kSilentCodes.contains(code)) << code;
+  EXPECT_EQ(machine::OpenObjects(), "");
+  return code;
+}
+
+// The bytes of every file on the machine's drives, by its host path.
+inline std::map<std::filesystem::path, std::string> FilesOf(const TestMachine& pc) {
+  std::map<std::filesystem::path, std::string> files;
+  const std::filesystem::path drive = pc.Host("drive_c");
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(drive)) {
+    if (!entry.is_regular_file()) continue;
+    files[entry] = pc.Read(std::filesystem::relative(entry, pc.Host("")).string());
+  }
+  return files;
+}
