@@ -4,7 +4,7 @@ PRESETS := native win32 win64
 BENCH_PRESETS := bench bench-win32 bench-win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check bench screenshots win32-emulated dist clean bootstrap \
+.PHONY: all demo demo-dialog test check bench fuzz screenshots win32-emulated dist clean bootstrap \
   $(PRESETS)
 
 all: $(PRESETS)
@@ -38,6 +38,11 @@ bench:
 	  cmake --preset $$preset $(CMAKE_QUIET) >/dev/null && cmake --build --preset $$preset || exit 1; \
 	done
 	@bench/run_bench.py $(BENCH)
+
+# Goes on from the corpus of the fuzz targets, or of one: make fuzz MINUTES=10 TARGET=image
+MINUTES := 5
+fuzz: bootstrap
+	@tools/fuzz $(MINUTES) $(TARGET)
 
 # Every page in five languages, from the real program under Wine, into docs/screenshots/.
 screenshots: all

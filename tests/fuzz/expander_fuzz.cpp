@@ -3,6 +3,7 @@
 //
 //   0     bit 0: the rest holds codes of 16 bits, which are put at the width then in force, so that
 //         the engine need not find the widths; else it is the code sequence itself
+//         bit 1: literals come first that nearly fill the table
 //   1     number of block sizes, 0 to 15: the low half
 //   2...  block sizes, used in turn; then the rest
 #include <memory>
@@ -20,6 +21,7 @@ namespace {
 
 constexpr size_t kOutputLimit = 1 << 20;
 constexpr uint32_t kBufferSize = 1024;
+constexpr int kLiterals = 34704;  // whole bytes of 9-bit codes; 60 entries stay free
 
 class CollectingExpander : public PkzExpander {
  public:
@@ -55,11 +57,13 @@ uint32_t FullWrites(size_t bytes) {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const TestMachine pc;
   FuzzInput input(data, size);
-  const bool holdsUnits = (input.TakeByte() & 1) != 0;
+  const uint8_t how = input.TakeByte();
   std::vector<uint8_t> blockSizes(input.TakeByte() & 15);
   for (uint8_t& blockSize : blockSizes) blockSize = input.TakeByte();
   if (blockSizes.empty()) blockSizes = {255};
-  const std::string codes = holdsUnits ? CodesOf(input.rest()) : std::string(input.rest());
+  static const std::string literals = CodeStream().PutTimes('a', kLiterals).Codes();
+  const std::string codes = ((how & 2) != 0 ? literals : "") +
+                            ((how & 1) != 0 ? CodesOf(input.rest()) : std::string(input.rest()));
   const PlainExpansion expected = PlainExpander::Expand(codes, kOutputLimit);
   if (expected.bytes.size() > kOutputLimit) return 0;
 

@@ -37,7 +37,7 @@ void AskForOwnResources(std::string_view bytes) {
     EXPECT_TRUE(length >= 0 && length < int{sizeof(text)} && text[length] == '\0');
   }
   const HBITMAP bitmap = LoadBitmapA(nullptr, MAKEINTRESOURCEA(118));
-  if (bitmap != nullptr) EXPECT_NE(DeleteObject(bitmap), FALSE);
+  EXPECT_TRUE(bitmap == nullptr || DeleteObject(bitmap) != FALSE);
   const auto dialog = machine::OwnResource(kDialogType, 116);
   if (dialog) (void)machine::ReadDialogTemplate(*dialog);
 }
@@ -56,7 +56,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     EXPECT_TRUE(found->data() + found->size() <= file.data() + file.size());
   }
   const auto dialog = machine::ReadDialogTemplate(file);
-  if (dialog) EXPECT_LE(dialog->controls.size() * 18, file.size());
+  EXPECT_TRUE(!dialog || dialog->controls.size() * 18 <= file.size());
   AskForOwnResources(input.rest());
   return 0;
 }
