@@ -10,14 +10,21 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <cstdlib>
 #include <string>
 #include <string_view>
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size);
 
-// Thrown where nothing catches it.
+// GoogleTest's own flag for this can't be set here: it may be initialised after these lines.
+class FailureEndsTheProcess : public testing::EmptyTestEventListener {
+  void OnTestPartResult(const testing::TestPartResult& result) override {
+    if (result.failed()) std::abort();
+  }
+};
+
 inline const bool kFailureEndsTheProcess = [] {
-  GTEST_FLAG_SET(throw_on_failure, true);
+  testing::UnitTest::GetInstance()->listeners().Append(new FailureEndsTheProcess);  // owned there
   return true;
 }();
 
