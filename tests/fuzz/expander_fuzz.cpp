@@ -52,18 +52,32 @@ uint32_t FullWrites(size_t bytes) {
   return bytes == 0 ? 0 : static_cast<uint32_t>((bytes - 1) / kBufferSize);
 }
 
+// Of the sizes in turn; an empty block is one too.
+std::vector<std::string> Split(std::string_view codes, std::vector<uint8_t> sizes) {
+  if (std::count(sizes.begin(), sizes.end(), 0) == std::ssize(sizes)) sizes = {255};
+  std::vector<std::string> blocks;
+  for (size_t turn = 0; !codes.empty(); ++turn) {
+    blocks.emplace_back(codes.substr(0, sizes[turn % sizes.size()]));
+    codes.remove_prefix(blocks.back().size());
+  }
+  return blocks;
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const TestMachine pc;
+  static const std::string literals = CodeStream().PutTimes('a', kLiterals).Codes();
   FuzzInput input(data, size);
   const uint8_t how = input.TakeByte();
   std::vector<uint8_t> blockSizes(input.TakeByte() & 15);
   for (uint8_t& blockSize : blockSizes) blockSize = input.TakeByte();
-  if (blockSizes.empty()) blockSizes = {255};
-  static const std::string literals = CodeStream().PutTimes('a', kLiterals).Codes();
-  const std::string codes = ((how & 2) != 0 ? literals : "") +
-                            ((how & 1) != 0 ? CodesOf(input.rest()) : std::string(input.rest()));
+  std::string codes = (how & 1) != 0 ? CodesOf(input.rest()) : std::string(input.rest());
+  std::vector<std::string> blocks = Split(codes, blockSizes);
+  if ((how & 2) != 0) {
+    codes = literals + codes;
+    blocks.insert(blocks.begin(), literals);
+  }
   const PlainExpansion expected = PlainExpander::Expand(codes, kOutputLimit);
   if (expected.bytes.size() > kOutputLimit) return 0;
 
@@ -72,25 +86,22 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   EXPECT_EQ(file.Create(), 1);
   machine::SetFaults({});  // counts calls from 0
   const auto writing = std::make_unique<PkzFileExpander>(&file);
-  std::string block = kStreamMagic;  // goes out with the first byte of the sequence
-  for (size_t used = 0, turn = 0; used < codes.size(); ++turn) {
-    const std::string part = codes.substr(used, blockSizes[turn % blockSizes.size()]);
-    used += part.size();
-    if (part.empty() && turn >= blockSizes.size() && used == 0) return 0;  // every size is 0
-    collecting->Expand(BytesOf(part), static_cast<uint32_t>(part.size()));
-    block += part;
-    if (used == 0) continue;
-    writing->ExpandBlock(BytesOf(block), static_cast<uint32_t>(block.size()));
-    block.clear();
+  std::string magic = kStreamMagic;  // stands in the first block, with one byte more at least
+  for (const std::string& block : blocks) {
+    collecting->Expand(BytesOf(block), static_cast<uint32_t>(block.size()));
+    if (!magic.empty() && block.empty()) continue;
+    const std::string stored = magic + block;
+    magic.clear();
+    writing->ExpandBlock(BytesOf(stored), static_cast<uint32_t>(stored.size()));
 
     const size_t done = collecting->output.size();
     EXPECT_EQ(writing->failed(), collecting->failed());
     EXPECT_EQ(machine::CallCount("WriteFile"), static_cast<int>(FullWrites(done)));
-    EXPECT_EQ(file.GetSize(), FullWrites(done) * kBufferSize);
     EXPECT_EQ(writing->bufferFill(), done - FullWrites(done) * kBufferSize);
   }
   EXPECT_EQ(collecting->failed() != 0, expected.failed);
   EXPECT_TRUE(collecting->output == expected.bytes);
+  EXPECT_EQ(file.GetSize(), FullWrites(expected.bytes.size()) * kBufferSize);
   if (writing->bufferFill() > 0) writing->Flush();
   EXPECT_EQ(file.Close(), 1);
   EXPECT_TRUE(pc.Read("drive_c/out.bin") == expected.bytes);
