@@ -35,26 +35,6 @@ TEST_F(InstallPass, AStopBeforeTheFirstRecordTouchesNothing) {
   EXPECT_EQ(std::count(bytes, bytes + 2 * sizeof(FileRecord), '\0'), 2 * 696);
 }
 
-TEST_F(InstallPass, AStopInAStreamLeavesNoFileOfIt) {
-  TargetList list = {};
-  ASSERT_EQ(AddTarget(&list, "C:\\Moriv\\a.dll", nullptr), 1);
-  ASSERT_EQ(AddTarget(&list, "C:\\Moriv\\b.dll", nullptr), 1);
-  wizardState.cancelRequested = 1;
-  EXPECT_EQ(InstallTargets(&context, &list, 8), StatusCancelled);
-  EXPECT_EQ(Events(), Strings{"29/2 C:\\Moriv\\a.dll"});
-  EXPECT_TRUE(HasFiles()) << "its directory stays";
-  EXPECT_FALSE(pc.Has("drive_c/Moriv/a.dll"));
-  FreeTargets(&list);
-}
-
-TEST_F(InstallPass, ATargetThatFailsLeavesThoseBeforeIt) {
-  pc.Write("drive_c/windows/system32/sub", "a file where a directory should be");
-  EXPECT_EQ(InstallFiles(&context), StatusCreateDirFailed);
-  EXPECT_EQ(Events(), (Strings{"34/0 C:\\Moriv\\a.dll", "28/2 C:\\windows\\system32\\sub\\a.dll"}));
-  EXPECT_EQ(pc.Read("drive_c/Moriv/a.dll"), "aaaa");
-  EXPECT_FALSE(pc.Has("drive_c/Moriv/b.dll"));
-}
-
 TEST_F(InstallPass, WithoutMemoryForTheRecordsThePackageIsClosed) {
   FailAllocation(1);
   EXPECT_EQ(InstallFiles(&context), StatusNoMemory);
