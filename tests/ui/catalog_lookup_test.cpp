@@ -18,24 +18,6 @@ class CatalogLookup : public ProductTest {
   }
 };
 
-TEST_F(CatalogLookup, TheLanguageIsTheRunsElseTheSystems) {
-  EXPECT_EQ(LoadIn(kLanguageFrench, CatalogCancel), "Annuler");
-  EXPECT_EQ(LoadIn(kLanguageGerman, CatalogCancel), "_GER_ Annuler");
-  EXPECT_EQ(LoadIn(kLanguageEnglish, CatalogCancel), "Cancel");
-  machine::CurrentSettings().language = 0x0410;
-  EXPECT_EQ(LoadIn(kLanguageNone, CatalogCancel), "_ITA_ Annuler");
-  // The language that was asked for plays no part.
-  context.language = kLanguageFrench;
-  EXPECT_EQ(LoadIn(kLanguageSpanish, CatalogCancel), "_SPA_ Annuler");
-}
-
-TEST_F(CatalogLookup, FixedNamesStandAtNumber0Alone) {
-  EXPECT_EQ(Load(nullptr, CatalogLogName), "MorivLog.txt");
-  EXPECT_EQ(Load(nullptr, CatalogRemovalProgram), "MorivRmv.exe");
-  EXPECT_EQ(LoadIn(kLanguageEnglish, CatalogLogName), "MorivLog.txt");
-  EXPECT_EQ(LoadIn(kLanguageFrench, CatalogLogName), "");
-}
-
 TEST_F(CatalogLookup, ARowThatDoesNotExistIsEmpty) {
   EXPECT_EQ(LoadIn(kLanguageFrench, 0), "");
   EXPECT_EQ(LoadIn(kLanguageFrench, 112), "");
@@ -58,8 +40,7 @@ TEST_F(CatalogLookup, ALongerTextIsCutAndNoBufferIsFine) {
 
 TEST_F(CatalogLookup, TheSystemsPrimaryLanguageCounts) {
   const std::pair<LANGID, int32_t> rows[] = {
-      {0x0407, kLanguageGerman},  {0x0C07, kLanguageGerman},  {0x0409, kLanguageEnglish},
-      {0x0809, kLanguageEnglish}, {0x040A, kLanguageSpanish}, {0x0C0A, kLanguageSpanish},
+      {0x0C07, kLanguageGerman},  {0x0809, kLanguageEnglish}, {0x0C0A, kLanguageSpanish},
       {0x0410, kLanguageItalian}, {0x040C, kLanguageFrench},  {0x0413, kLanguageFrench},
       {0x0000, kLanguageFrench},  {0xFC07, kLanguageGerman},  {0x0207, kLanguageFrench}};
   for (const auto& [system, language] : rows) {
