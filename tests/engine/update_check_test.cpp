@@ -30,8 +30,8 @@ TEST_F(UpdateCheck, AMissingOrOlderFileSettlesIt) {
       .Add("b.exe", "%INSTALL_DIR%", "b")
       .Write(&pc);
   Put("a.exe", "9.0.0");  // a newer file doesn't end the walk
-  const std::pair<const char*, int32_t> rows[] = {{"4.1.7", 0}, {"5.0.0", 0}, {"4.1.6", 1},
-                                                  {"3.9.9", 1}, {"none", 1},  {"", 1}};
+  const std::pair<const char*, int32_t> rows[] = {
+      {"4.1.7", 0}, {"5.0.0", 0}, {"4.1.6", 1}, {"4.0.9", 1}, {"3.9.9", 1}, {"none", 1}, {"", 1}};
   for (const auto& [version, result] : rows) {
     Put("b.exe", version);
     EXPECT_EQ(DetectInImage(), result) << version;

@@ -1,3 +1,4 @@
+// The dialog's resources, and a dialog that lacks some of the system's.
 #include "ui/wizard.h"
 
 #include <tuple>
@@ -9,7 +10,6 @@
 #include "machine/scripted_user.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
-#include "ui/language_list.h"
 #include "ui/side_commands.h"
 
 namespace {
