@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "engine/browsers.h"
 #include "registration/registered_product.h"
 #include "tests/support/product_test.h"
 
@@ -48,6 +49,10 @@ TEST_F(ProductRegistry, EveryRangeOfItemsHasItsKey) {
   EXPECT_EQ(Get(76, "Sky"), "service");
   EXPECT_EQ(Get(135, "Sky", "home"), "profile");
   EXPECT_EQ(Get(203, "Sky", "mail"), "application");
+  char text[32];
+  DWORD size = sizeof(text);
+  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, kRoot.c_str(), "Version", text, &size), 1);
+  EXPECT_EQ(size, 4u) << "a text is stored without its NUL";
 }
 
 TEST_F(ProductRegistry, RefusedItemsAndAbsentOnesAreToldApart) {
