@@ -51,17 +51,16 @@ inline std::string VersionBlock(std::string_view key, bool isText, size_t valueL
   return block.U16(body.bytes().size()).Append(std::string_view(body.bytes()).substr(2)).bytes();
 }
 
-inline std::string VersionString(std::string_view key, std::string_view text) {
-  return VersionBlock(key, true, text.size() + 1, ByteBuilder().Wide(text).U16(0).bytes(), {});
-}
-
 // A version resource with one string table, named by language and code page, and with a translation
 // unless `translation` is false.
 inline std::string VersionResource(const std::vector<std::pair<std::string, std::string>>& strings,
                                    uint16_t language = 0x040C, uint16_t codePage = 0x04B0,
                                    bool translation = true) {
   std::vector<std::string> blocks;
-  for (const auto& [key, text] : strings) blocks.push_back(VersionString(key, text));
+  for (const auto& [key, text] : strings) {
+    const std::string wide = ByteBuilder().Wide(text).U16(0).bytes();
+    blocks.push_back(VersionBlock(key, true, text.size() + 1, wide, {}));
+  }
   constexpr char kDigits[] = "0123456789abcdef";
   std::string name;
   for (const uint16_t part : {language, codePage}) {

@@ -13,7 +13,6 @@
 #include "tests/support/test_machine.h"
 
 inline constexpr uint32_t kShownControl = 0x50010000;  // WS_CHILD | WS_VISIBLE | WS_TABSTOP
-inline constexpr uint32_t kNotify = 0x100;             // SS_NOTIFY
 inline constexpr uint32_t kOwnerDrawnList = 0x13;      // CBS_DROPDOWNLIST | CBS_OWNERDRAWFIXED
 
 inline machine::TemplateItem Control(const char* className, uint16_t id,

@@ -6,6 +6,7 @@
 #include <random>
 #include <sstream>
 
+#include "machine/host_file.h"
 #include "tests/support/executable_builder.h"
 #include "tools/image/image_command_line.h"
 #include "tools/machine/machine_command_line.h"
@@ -32,10 +33,16 @@ ToolRun RunTool(Tool tool, std::vector<std::string> arguments, const fs::path& f
 }
 
 template <class Record>
+Record RecordAt(const std::vector<uint8_t>& image, size_t offset) {
+  Record record;
+  std::memcpy(&record, image.data() + offset, sizeof record);
+  return record;
+}
+
+template <class Record>
 void Change(std::vector<uint8_t>* image, size_t offset,
             const std::function<void(Record*)>& change) {
-  Record record;
-  std::memcpy(&record, image->data() + offset, sizeof record);
+  Record record = RecordAt<Record>(*image, offset);
   change(&record);
   std::memcpy(image->data() + offset, &record, sizeof record);
 }
@@ -43,26 +50,20 @@ void Change(std::vector<uint8_t>* image, size_t offset,
 }  // namespace
 
 void ToolBench::Write(const std::string& name, std::span<const uint8_t> bytes) const {
-  std::ofstream file(Path(name), std::ios::binary);
-  for (const uint8_t byte : bytes) file.put(static_cast<char>(byte));
-  ASSERT_TRUE(file.flush()) << name;
+  Write(name, std::string(bytes.begin(), bytes.end()));
 }
 
 void ToolBench::Write(const std::string& name, const std::string& text) const {
-  Write(name, std::span(reinterpret_cast<const uint8_t*>(text.data()), text.size()));
+  ASSERT_TRUE(std::ofstream(Path(name), std::ios::binary) << text << std::flush) << name;
 }
 
 std::vector<uint8_t> ToolBench::Read(const std::string& name) const {
-  const std::string text = ReadText(name);
-  return {text.begin(), text.end()};
+  return machine::ReadHostFile(Path(name)).value();
 }
 
 std::string ToolBench::ReadText(const std::string& name) const {
-  std::ifstream file(Path(name), std::ios::binary);
-  EXPECT_TRUE(file) << name;
-  std::ostringstream text;
-  text << file.rdbuf();
-  return text.str();
+  const std::vector<uint8_t> bytes = Read(name);
+  return {bytes.begin(), bytes.end()};
 }
 
 std::vector<std::string> ToolBench::NamesIn(const std::string& folder) const {
@@ -130,25 +131,18 @@ void ToolBench::ChangeRecord(size_t number, const std::function<void(FileRecord*
 
 PackageHeader ToolBench::HeaderOf(const std::string& image) const {
   const std::vector<uint8_t> bytes = Read(image);
-  PackageHeader header;
-  std::memcpy(&header, bytes.data() + bytes.size() - sizeof header, sizeof header);
-  return header;
+  return RecordAt<PackageHeader>(bytes, bytes.size() - sizeof(PackageHeader));
 }
 
 FileRecord ToolBench::RecordOf(const std::string& image, size_t number) const {
-  const std::vector<uint8_t> bytes = Read(image);
-  FileRecord record;
-  std::memcpy(&record, bytes.data() + RecordOffset(image, number), sizeof record);
-  return record;
+  return RecordAt<FileRecord>(Read(image), RecordOffset(image, number));
 }
 
 size_t ToolBench::RecordOffset(const std::string& image, size_t number) const {
   const std::vector<uint8_t> bytes = Read(image);
   size_t offset = HeaderOf(image).dataOffset;
-  for (size_t i = 0; i < number; ++i) {
-    FileRecord record;
-    std::memcpy(&record, bytes.data() + offset, sizeof record);
-    offset += sizeof record + record.storedSize;
+  while (number-- > 0) {
+    offset += sizeof(FileRecord) + RecordAt<FileRecord>(bytes, offset).storedSize;
   }
   return offset;
 }
