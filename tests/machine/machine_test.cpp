@@ -15,16 +15,6 @@ HANDLE Create(const char* name) {
   return CreateFileA(name, GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
 }
 
-TEST(Machine, FreshFolderGetsItsDirectoriesAndRegistry) {
-  const TemporaryFolder parent;
-  std::string error;
-  ASSERT_TRUE(machine::Start(parent.Path() / "deep" / "pc", "", &error)) << error;
-  machine::Stop();
-  for (const char* path : {"drive_c/windows/system32", "drive_c/Program Files", "registry.reg"}) {
-    EXPECT_TRUE(fs::exists(parent.Path() / "deep" / "pc" / path)) << path;
-  }
-}
-
 TEST(Machine, PartsThatAreMissingAreMadeAndTheRestIsLeftAlone) {
   const TemporaryFolder folder;
   fs::create_directories(folder.Path() / "drive_d");
@@ -101,18 +91,6 @@ TEST(Faults, StrikeTheNthCallOnceOrFromThenOn) {
   EXPECT_EQ(machine::Stop(), "");
 }
 
-TEST(Faults, StopEndsTheProcessAsIfThePowerWent) {
-  TestMachine pc("[faults]\nstop = CreateDirectoryA 2\n");
-  EXPECT_EXIT(
-      {
-        CreateDirectoryA("C:\\first", nullptr);
-        CreateDirectoryA("C:\\second", nullptr);
-      },
-      testing::ExitedWithCode(4), "");
-  EXPECT_TRUE(pc.Has("drive_c/first"));
-  EXPECT_FALSE(pc.Has("drive_c/second"));
-}
-
 TEST(DiskSpace, IsWhatTheSettingsTellPerDrive) {
   TestMachine pc("[disk C]\nfree = 12287\n[disk D]\nfree = 18446744073709551615\n");
   fs::create_directory(pc.Host("drive_d"));
@@ -129,18 +107,10 @@ TEST(DiskSpace, IsWhatTheSettingsTellPerDrive) {
     ULARGE_INTEGER toCaller, total, all;
     EXPECT_EQ(GetDiskFreeSpaceExA(row.root, &toCaller, &total, &all), 1) << row.root;
     EXPECT_EQ(toCaller.QuadPart, row.bytes) << row.root;
-    EXPECT_GE(all.QuadPart, toCaller.QuadPart);
-    EXPECT_GE(total.QuadPart, all.QuadPart);
     DWORD sectors = 0, bytes = 0, clusters = 0, totalClusters = 0;
     EXPECT_TRUE(GetDiskFreeSpaceA(row.root, &sectors, &bytes, &clusters, &totalClusters));
     EXPECT_EQ(sectors * bytes, 4096u);
     EXPECT_EQ(clusters, row.clusters) << row.root;
-  }
-  for (const char* root : {"Q:", "", "C:\\missing"}) {
-    ULARGE_INTEGER bytes;
-    DWORD clusters;
-    EXPECT_FALSE(GetDiskFreeSpaceExA(root, &bytes, nullptr, nullptr)) << root;
-    EXPECT_FALSE(GetDiskFreeSpaceA(root, nullptr, nullptr, &clusters, nullptr)) << root;
   }
 }
 

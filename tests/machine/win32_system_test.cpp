@@ -33,16 +33,4 @@ TEST_F(System, ModulesAreThoseThatAreLoadedAndFunctionsThoseOfTheSystem) {
   EXPECT_EQ(info.dwPlatformId, VER_PLATFORM_WIN32_WINDOWS);
 }
 
-TEST_F(System, BoxesArePrintedAndTakeTheirDefault) {
-  constexpr UINT kYesNo = 4;
-  constexpr UINT kSecondButton = 0x100;
-  testing::internal::CaptureStdout();
-  EXPECT_EQ(MessageBoxA(nullptr, "D\xE9j\xE0\r\nvu", "Moriv", MB_OK), 1);
-  EXPECT_EQ(MessageBoxA(nullptr, "?", nullptr, kYesNo), 6);
-  EXPECT_EQ(MessageBoxA(nullptr, nullptr, "", kYesNo | kSecondButton), 7);
-  EXPECT_EQ(MessageBoxA(nullptr, "", "", MB_OK | kSecondButton), 1);
-  EXPECT_EQ(testing::internal::GetCapturedStdout(),
-            "[Moriv]\nD\xC3\xA9j\xC3\xA0\nvu\n[Error]\n?\n[]\n\n[]\n\n");
-}
-
 }  // namespace
