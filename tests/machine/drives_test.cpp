@@ -91,27 +91,4 @@ TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
   }
 }
 
-TEST(Drives, ImageOutsideTheDrivesIsTheOneFileOfDriveZ) {
-  TestMachine pc;
-  pc.Write("Setup.exe", "MZ");
-  pc.Write("other.exe", "MZ");
-  pc.Restart("Setup.exe");
-  EXPECT_EQ(machine::ImagePath(), "Z:\\Setup.exe");
-  EXPECT_TRUE(Locate("z:\\SETUP.EXE")->isImage);
-  EXPECT_TRUE(Locate("Z:\\")->isRoot);
-  EXPECT_FALSE(Locate("Z:\\other.exe")->exists);
-  EXPECT_FALSE(Locate("Z:\\Setup.exe\\").has_value());
-  EXPECT_EQ(machine::LocateFile("Z:\\setup.exe"), pc.Host("Setup.exe"));
-  EXPECT_FALSE(machine::LocateFile("Z:\\").has_value());
-}
-
-TEST(Drives, ImageOnADriveHasItsPathThere) {
-  TestMachine pc;
-  pc.Write("drive_z/My Dir/Setup.exe", "MZ");
-  pc.Restart("drive_z/My Dir/Setup.exe");
-  EXPECT_EQ(machine::ImagePath(), "Z:\\My Dir\\Setup.exe");
-  EXPECT_TRUE(Locate("Z:\\my dir\\setup.exe")->isImage);
-  EXPECT_FALSE(Locate("Z:\\my dir")->isImage);
-}
-
 }  // namespace

@@ -2,6 +2,7 @@
 // is in tests/contract/.
 #include <gtest/gtest.h>
 
+#include "machine/drives.h"
 #include "platform/win32.h"
 #include "tests/support/test_machine.h"
 
@@ -87,7 +88,9 @@ TEST(Files, RunningImageCanBeReadOnly) {
       TestMachine pc(ntFamily ? "" : "[system]\nplatform = 9x\n");
       pc.Write(where, "MZ");
       pc.Restart(where);
-      const char* const image = where == "setup.exe" ? "Z:\\SETUP.exe" : "C:\\SETUP.exe";
+      const bool isOutside = where == "setup.exe";  // of the drives: the one file of a drive
+      const char* const image = isOutside ? "Z:\\SETUP.exe" : "C:\\SETUP.exe";
+      EXPECT_EQ(machine::ImagePath(), isOutside ? "Z:\\setup.exe" : "C:\\setup.exe");
       EXPECT_EQ(Opens(OpenExisting(image)), ntFamily);
       const int descriptor = _sopen(image, _O_RDONLY | _O_BINARY, _SH_DENYNO);
       EXPECT_GE(descriptor, 0);
@@ -99,8 +102,10 @@ TEST(Files, RunningImageCanBeReadOnly) {
       EXPECT_TRUE(CopyFileA(image, "C:\\copy", FALSE));
       EXPECT_FALSE(CopyFileA("C:\\copy", image, FALSE));
       EXPECT_EQ(pc.Read(where), "MZ");
-      if (where != "setup.exe") continue;
-      // Its drive takes nothing else.
+      if (!isOutside) continue;
+      pc.Write("other.exe", "MZ");
+      EXPECT_EQ(GetFileAttributesA("Z:\\other.exe"), INVALID_FILE_ATTRIBUTES);
+      EXPECT_EQ(GetFileAttributesA("Z:\\setup.exe\\"), INVALID_FILE_ATTRIBUTES);
       EXPECT_EQ(GetFileAttributesA("Z:\\"), FILE_ATTRIBUTE_DIRECTORY);
       for (const char* name : {"Z:\\", "Z:\\new"}) {
         EXPECT_EQ(Create(name), INVALID_HANDLE_VALUE);

@@ -43,6 +43,23 @@ TEST_F(Windows, TypedTextIsToldOfAsAChange) {
   EXPECT_EQ(shown, "10 Edit shown enabled \"by \xC3\xA9 user \"\n");
 }
 
+TEST_F(Windows, BoxAnsweredAtOnceDispatchesNothing) {
+  constexpr UINT kStep = 1100;
+  bool isAnswered = false;
+  Run({}, "answer no\n", [&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
+    if (message == WM_INITDIALOG) {
+      PostMessageA(dialog, kStep, 0, 0);
+      EXPECT_EQ(MessageBoxA(dialog, "?", "Q", MB_YESNO), IDNO);
+      isAnswered = true;
+    }
+    if (message == kStep) {
+      EXPECT_TRUE(isAnswered);
+      EndDialog(dialog, 1);
+    }
+    return FALSE;
+  });
+}
+
 TEST_F(Windows, OneDialogAtATimeOfKnownControls) {
   Play({}, "escape\n",
        [](HWND) { EXPECT_EQ(machine::RunDialog(machine::DialogTemplate(), nullptr, 0), -1); });

@@ -49,24 +49,15 @@ class PlainExpander {
   static constexpr uint32_t kTableSize = 35023;
   static constexpr uint32_t kBufferSize = 1024;
 
-  enum class State { kFirstCode, kNextCode, kFirstCodeAfterReset, kEmit };
-
   struct Entry {
     uint32_t prefix;
     uint8_t suffix;
   };
 
   bool Step() {
-    switch (state_) {
-      case State::kFirstCode:
-        return ReadFirstCode();
-      case State::kNextCode:
-        return ReadNextCode();
-      case State::kFirstCodeAfterReset:
-        return ReadFirstCode() && Emit();
-      default:
-        return Emit();
-    }
+    uint32_t code = 0;
+    if (!ReadCode(&code)) return false;
+    return isAtStart_ ? TakeFirstCode(code) : TakeNextCode(code);
   }
 
   bool ReadCode(uint32_t* code) {
@@ -99,24 +90,19 @@ class PlainExpander {
     return false;
   }
 
-  bool ReadFirstCode() {
-    uint32_t code = 0;
-    if (!ReadCode(&code)) return false;
+  bool TakeFirstCode(uint32_t code) {
     if (code > 255) return Refuse();
-    Push(static_cast<uint8_t>(code));
-    previousCode_ = code;
+    isAtStart_ = false;
     firstByte_ = static_cast<uint8_t>(code);
-    state_ = State::kEmit;
-    return true;
+    Push(firstByte_);
+    return Emit(code);
   }
 
-  bool ReadNextCode() {
-    uint32_t code = 0;
-    if (!ReadCode(&code)) return false;
+  bool TakeNextCode(uint32_t code) {
     if (code == 258) {
       nextCode_ = 259;
       codeWidth_ = 9;
-      state_ = State::kFirstCodeAfterReset;
+      isAtStart_ = true;
       return true;
     }
     if (code == 257) return ++codeWidth_ <= 32 || Refuse();
@@ -126,15 +112,13 @@ class PlainExpander {
     firstByte_ = stringStack_[kTableSize - stringLength_];
     if (nextCode_ >= kTableSize) return Refuse();
     table_[nextCode_++] = {previousCode_, firstByte_};
-    previousCode_ = code;
-    state_ = State::kEmit;
-    return true;
+    return Emit(code);
   }
 
-  bool Emit() {
+  bool Emit(uint32_t code) {
     WriteOutput(stringStack_ + kTableSize - stringLength_, stringLength_);
     stringLength_ = 0;
-    state_ = State::kNextCode;
+    previousCode_ = code;
     return true;
   }
 
@@ -164,7 +148,7 @@ class PlainExpander {
   uint32_t currentByte_ = 0;
   const uint8_t* input_ = nullptr;
   uint32_t inputLeft_ = 0;
-  State state_ = State::kFirstCode;
+  bool isAtStart_ = true;  // or behind a reset
   int32_t codeWidth_ = 9;
   std::unique_ptr<Entry[]> table_ = std::make_unique<Entry[]>(kTableSize);
   uint8_t stringStack_[kTableSize];

@@ -124,6 +124,9 @@ TEST_F(ImageVerifier, ComparesStreamsWithTheirSizes) {
   ChangeRecord(1, [](FileRecord* record) { record->fileSize = 0x80000000; });
   ChangeHeader([](PackageHeader* header) { header->spaceNeeded += 0x80000000 - 3000; });
   ExpectWrong("2 GiB or more");
+  PackSample();
+  ChangeRecord(2, [](FileRecord* record) { ++record->storedSize; });
+  ExpectWrong("reaches into the header");
 }
 
 TEST_F(ImageVerifier, FindsBadStreamsGapsAndMissingPrograms) {
