@@ -54,4 +54,11 @@ TEST_F(Resolver, AMissingBrowserSkipsItsElement) {
   EXPECT_EQ(Events(), Strings{}) << "single macros and unlogged walks tell nothing";
 }
 
+TEST_F(Resolver, PathsOfAFanOutEndAt259Characters) {
+  InstallBrowser("Opera.exe", "Opera");  // "C:\Opera\Plugins\" and "\a.dll" have 17 and 6
+  EXPECT_EQ(Resolve("%PLUGIN_ALL_DIR%" + std::string(236, 'd')).front().find(".dll "), 255u);
+  EXPECT_EQ(Resolve("%PLUGIN_ALL_DIR%" + std::string(237, 'd')),
+            Strings{std::to_string(StatusBufferTooSmall)});
+}
+
 }  // namespace

@@ -73,12 +73,18 @@ TEST_F(PackageReader, WithoutMemoryThereIsNoPackageAndNoEvent) {
   EXPECT_EQ(CloseSetup(nullptr), StatusBadArgument);
 }
 
-TEST_F(PackageReader, ARecordNeedsAnOpenFile) {
+TEST_F(PackageReader, ARecordIsReadWholeOrNotAtAll) {
   FileRecord record = {};
-  DataFile closed("C:\\record.bin");
+  record.recordSize = sizeof(record);
+  const std::string bytes(reinterpret_cast<const char*>(&record), sizeof(record));
+  pc.Write("drive_c/record.bin", bytes + bytes.substr(0, 695));
+  DataFile file("C:\\record.bin");
+  EXPECT_EQ(ReadFileRecord(&file, &record), 0) << "it is closed";
+  ASSERT_EQ(file.OpenForRead(), 1);
+  EXPECT_EQ(ReadFileRecord(&file, &record), 696);
+  EXPECT_EQ(ReadFileRecord(&file, &record), 0) << "695 bytes are left";
   EXPECT_EQ(ReadFileRecord(nullptr, &record), StatusBadArgument);
-  EXPECT_EQ(ReadFileRecord(&closed, nullptr), StatusBadArgument);
-  EXPECT_EQ(ReadFileRecord(&closed, &record), 0);
+  EXPECT_EQ(ReadFileRecord(&file, nullptr), StatusBadArgument);
 }
 
 TEST_F(PackageReader, TheImagesPathHasToFitWithItsNul) {
