@@ -117,6 +117,17 @@ TEST_F(ScriptedUser, EscapeHasNoEffectOnAStepThatPolls) {
   EXPECT_EQ(order, "10 poll poll 2 end 2 ");
 }
 
+TEST_F(ScriptedUser, RefusedPickerGivesNoList) {
+  pc.Write("script", "pick none\n");
+  std::string error;
+  ASSERT_TRUE(machine::LoadUser(pc.Host("script"), &error)) << error;
+  BROWSEINFOA browse = {};
+  browse.lpszTitle = "Where?";
+  testing::internal::CaptureStdout();
+  EXPECT_EQ(SHBrowseForFolderA(&browse), nullptr);
+  EXPECT_EQ(testing::internal::GetCapturedStdout(), "picker \"Where?\" none\n");
+}
+
 TEST_F(ScriptedUser, StartedProcessLeavesTwoHandlesToClose) {
   char command[] = "browser.exe \"x\"";
   STARTUPINFOA startup = {};
