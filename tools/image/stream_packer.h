@@ -21,7 +21,7 @@ struct PackMethod {
 // Always the longest string that the table has: what the format's plainest packer does.
 inline constexpr PackMethod kPackGreedily = {false, false};
 inline constexpr PackMethod kPackFast = {true, false};
-// The shortest, and about 16 times as slow.
+// The shortest, and about 20 times as slow.
 inline constexpr PackMethod kPackBest = {true, true};
 
 // The whole stream, its magic included; an empty file gives the magic and one zero byte, the
