@@ -117,6 +117,12 @@ void MakeRegistryKey(const std::string& path) {
   SaveRegistry();
 }
 
+// What is done at once, whatever the dialog is at.
+void ActBesideTheDialog(const UserLine& line) {
+  if (line.verb == UserVerb::kShow) ShowDialog(line.control);
+  if (line.verb == UserVerb::kKey) MakeRegistryKey(line.detail);
+}
+
 // What a user does to an idle dialog.
 void Act(const UserLine& line) {
   switch (line.verb) {
@@ -138,13 +144,8 @@ void Act(const UserLine& line) {
     case UserVerb::kUntilDuring:
       if (!IsRead(FromUtf8(line.detail))) Fail(line.place + ": the step never said that");
       break;
-    case UserVerb::kShow:
-      ShowDialog(line.control);
-      break;
-    case UserVerb::kKey:
-      MakeRegistryKey(line.detail);
-      break;
     default:  // kWait: the dialog waits already
+      ActBesideTheDialog(line);
       break;
   }
 }
@@ -163,15 +164,10 @@ void ActDuringStep(const UserLine& line) {
     case UserVerb::kCloseDuring:
       PostCancel();
       break;
-    case UserVerb::kShow:
-      ShowDialog(line.control);
-      break;
-    case UserVerb::kKey:
-      MakeRegistryKey(line.detail);
-      break;
     case UserVerb::kType:
       Fail(line.place + ": nothing that a user does during a step");
     default:
+      ActBesideTheDialog(line);
       break;
   }
 }
