@@ -26,10 +26,7 @@ uint64_t AddSaturated(uint64_t a, uint64_t b) {
 // The drive that a directory lies on; a null text is the current drive. nullopt when there is none.
 std::optional<machine::Location> LocateDirectory(LPCSTR directory) {
   const auto location = machine::Locate(directory == nullptr ? "\\" : directory);
-  std::error_code error;
-  const bool exists =
-      location && (location->isRoot || std::filesystem::is_directory(location->host, error));
-  return exists ? location : std::nullopt;
+  return location && location->isDirectory ? location : std::nullopt;
 }
 
 uint64_t FreeToCaller(char drive) {

@@ -2,6 +2,8 @@
 // and plain files is seen, and no link that leads out of the machine's folder.
 #include "machine/drives.h"
 
+#include <sys/stat.h>
+
 #include <algorithm>
 
 #include "machine/code_page.h"
@@ -19,6 +21,7 @@ constexpr size_t kPathLimit = MAX_PATH;  // a full path with its NUL
 
 fs::path machineFolder;  // canonical; empty when no machine runs
 fs::path imageFile;      // canonical; empty without a program
+FileIdentity imageIdentity;
 std::string imageDosPath;
 
 fs::path DriveFolder(char drive) {
@@ -40,63 +43,95 @@ bool IsImageDrive(char drive) {
          !PathBelow(DriveFolder(kImageDrive), imageFile);
 }
 
-// What stands there: a regular file or a directory, also through a link that stays inside the
-// machine; not_found for nothing; none for what the program can't reach.
-fs::file_type TypeOf(const fs::path& path) {
+// What stands at a place on the host, also through a link that stays inside the machine.
+struct HostEntry {
+  enum Kind { kNothing, kFile, kDirectory, kOutOfReach };
+  Kind kind = kNothing;
+  struct stat status = {};
+};
+
+bool LeadsOut(const fs::path& link) {
   std::error_code error;
-  fs::file_type type = fs::symlink_status(path, error).type();
-  if (type == fs::file_type::none) return fs::file_type::not_found;  // too long for the host
-  if (type == fs::file_type::symlink) {
-    const fs::path target = fs::canonical(path, error);
-    if (error || !PathBelow(machineFolder, target)) return fs::file_type::none;
-    type = fs::status(path, error).type();
+  const fs::path target = fs::canonical(link, error);
+  return error || !PathBelow(machineFolder, target);
+}
+
+HostEntry LookAt(const fs::path& path) {
+  HostEntry entry;
+  if (lstat(path.c_str(), &entry.status) != 0) return entry;
+  const bool isLink = S_ISLNK(entry.status.st_mode);
+  if (isLink && (LeadsOut(path) || stat(path.c_str(), &entry.status) != 0)) {
+    entry.kind = HostEntry::kOutOfReach;
+  } else if (S_ISDIR(entry.status.st_mode)) {
+    entry.kind = HostEntry::kDirectory;
+  } else {
+    entry.kind = S_ISREG(entry.status.st_mode) ? HostEntry::kFile : HostEntry::kOutOfReach;
   }
-  const bool isKnown = type == fs::file_type::regular || type == fs::file_type::directory ||
-                       type == fs::file_type::not_found;
-  return isKnown ? type : fs::file_type::none;
+  return entry;
 }
 
 bool DriveExists(char drive) {
-  return TypeOf(DriveFolder(drive)) == fs::file_type::directory;
+  return LookAt(DriveFolder(drive)).kind == HostEntry::kDirectory;
 }
 
+FileIdentity IdentityOf(const struct stat& status) {
+  return {.device = status.st_dev, .inode = status.st_ino};
+}
+
+void Describe(Location& location, const HostEntry& entry) {
+  location.exists = entry.kind != HostEntry::kNothing;
+  if (!location.exists) return;
+  location.isDirectory = entry.kind == HostEntry::kDirectory;
+  location.isReadOnly = (entry.status.st_mode & S_IWUSR) == 0;
+  location.size = static_cast<uint64_t>(entry.status.st_size);
+  location.identity = IdentityOf(entry.status);
+  location.isImage = !imageFile.empty() && location.identity == imageIdentity;
+}
+
+// The drive holds the image and nothing else.
 std::optional<Location> LocateOnImageDrive(const DosPath& path, Location location) {
   location.isRoot = path.names.empty();
   location.parentExists = path.names.size() <= 1;
-  location.isImage =
+  location.exists = location.isDirectory = location.isRoot;
+  const bool isImage =
       path.names.size() == 1 && EqualNoCase(path.names[0], FromUtf8(imageFile.filename().string()));
-  location.exists = location.isRoot || location.isImage;
-  if (location.isImage) location.host = imageFile;
-  if (location.isImage && location.endsInSeparator) return std::nullopt;
+  if (!isImage) return location;
+  if (location.endsInSeparator) return std::nullopt;
+  location.host = imageFile;
+  Describe(location, LookAt(imageFile));
   return location;
 }
 
+// The entry of that name in any case; its path goes into `host`, as it is spelled there.
+HostEntry Find(const fs::path& folder, const std::string& name, fs::path& host) {
+  host = folder / ToUtf8(name);
+  const HostEntry entry = LookAt(host);
+  if (entry.kind != HostEntry::kNothing) return entry;
+  const std::string spelling = FindSpelling(folder, name);
+  if (spelling.empty()) return entry;
+  host = folder / spelling;
+  return LookAt(host);
+}
+
 std::optional<Location> LocateInFolder(const DosPath& path, Location location) {
-  if (!DriveExists(path.drive)) return std::nullopt;
   location.host = DriveFolder(path.drive);
+  HostEntry entry = LookAt(location.host);
+  if (entry.kind != HostEntry::kDirectory) return std::nullopt;
   location.isRoot = path.names.empty();
   location.parentExists = true;
-  fs::file_type type = fs::file_type::directory;
   for (const std::string& name : path.names) {
-    location.parentExists = type == fs::file_type::directory;
+    location.parentExists = entry.kind == HostEntry::kDirectory;
     const fs::path folder = location.host;
-    location.host /= ToUtf8(name);
-    type = location.parentExists ? TypeOf(location.host) : fs::file_type::not_found;
-    if (type == fs::file_type::not_found && location.parentExists) {
-      const std::string spelling = FindSpelling(folder, name);
-      if (!spelling.empty()) {
-        location.host = folder / spelling;
-        type = TypeOf(location.host);
-      }
+    if (location.parentExists) {
+      entry = Find(folder, name, location.host);
+    } else {
+      entry = {};
+      location.host /= ToUtf8(name);
     }
-    if (type == fs::file_type::none) return std::nullopt;
+    if (entry.kind == HostEntry::kOutOfReach) return std::nullopt;
   }
-  location.exists = type != fs::file_type::not_found;
-  const bool isFile = type == fs::file_type::regular;
-  if (isFile && location.endsInSeparator) return std::nullopt;
-  std::error_code error;
-  location.isImage =
-      isFile && !imageFile.empty() && fs::equivalent(location.host, imageFile, error);
+  if (entry.kind == HostEntry::kFile && location.endsInSeparator) return std::nullopt;
+  Describe(location, entry);
   return location;
 }
 
@@ -128,10 +163,7 @@ std::optional<Location> Locate(std::string_view dosPath) {
 
 std::optional<fs::path> LocateFile(std::string_view dosPath) {
   const std::optional<Location> location = Locate(dosPath);
-  std::error_code error;
-  if (!location || !location->exists || !fs::is_regular_file(location->host, error)) {
-    return std::nullopt;
-  }
+  if (!location || !location->exists || location->isDirectory) return std::nullopt;
   return location->host;
 }
 
@@ -149,6 +181,7 @@ void OpenDrives(const fs::path& folder, const fs::path& image) {
   std::error_code error;
   machineFolder = fs::canonical(folder, error);
   imageFile = image.empty() ? fs::path() : fs::weakly_canonical(image, error);
+  imageIdentity = IdentityOf(LookAt(imageFile).status);
   imageDosPath = imageFile.empty() ? "" : FindImagePath();
 }
 
@@ -156,6 +189,7 @@ void CloseDrives() {
   ForgetFolders();
   machineFolder.clear();
   imageFile.clear();
+  imageIdentity = {};
   imageDosPath.clear();
 }
 

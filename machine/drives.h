@@ -1,6 +1,9 @@
 // Drives and paths: where C:\a\b lies on the host.
 #pragma once
 
+#include <sys/types.h>
+
+#include <cstdint>
 #include <filesystem>
 #include <optional>
 #include <string>
@@ -8,16 +11,29 @@
 
 namespace machine {
 
+// Which file of the host, whatever its path.
+struct FileIdentity {
+  dev_t device = 0;
+  ino_t inode = 0;
+  bool operator==(const FileIdentity&) const = default;
+};
+
 struct Location {
   char drive = 0;                // upper-case letter
   std::filesystem::path host;    // host path; its last element keeps the case on disk, or the
                                  // case given when there is none
   bool isRoot = false;           // the drive itself
-  bool isImage = false;          // the running program's file
-  bool exists = false;           // something stands there
   bool parentExists = false;     // and is a directory
   bool endsInSeparator = false;  // only a directory can stand there
   size_t dosLength = 0;          // characters of the full DOS path, for the length limits
+
+  // What stands there, as it was when it was looked up.
+  bool exists = false;
+  bool isDirectory = false;
+  bool isImage = false;     // the running program's file
+  bool isReadOnly = false;  // the attribute, which is the owner's write permission on the host
+  uint64_t size = 0;        // bytes
+  FileIdentity identity;
 };
 
 // Where a path of the program leads. nullopt for a path that exists nowhere and can't be made: a

@@ -170,8 +170,11 @@ std::vector<uint8_t> Copy(Bytes bytes) {
 }  // namespace
 
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& path) {
-  const MappedHostFile file(path);
-  const std::optional<Bytes> resource = FindResource(file.bytes(), kVersionType, kVersionId);
+  return FindVersionResource(MappedHostFile(path).bytes());
+}
+
+std::optional<std::vector<uint8_t>> FindVersionResource(Bytes file) {
+  const std::optional<Bytes> resource = FindResource(file, kVersionType, kVersionId);
   if (!resource || !IsVersionBlock(*resource)) return std::nullopt;
   return Copy(*resource);
 }

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -15,6 +16,9 @@ inline constexpr char kNativeResourceSection[] = ".moriv_res";
 // Bytes of the file's version resource (RT_VERSION), whichever kind of executable it is. nullopt
 // for a file that is none, has none, or is damaged: every offset is checked before it is followed.
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& file);
+
+// The same, of a file's bytes.
+std::optional<std::vector<uint8_t>> FindVersionResource(std::span<const uint8_t> file);
 
 // A value of a version resource, as VerQueryValueA knows it: path "\\VarFileInfo\\Translation" (raw
 // bytes), "\\StringFileInfo\\040c04b0\\FileVersion" (8-bit text of the code page, without its NUL),

@@ -6,11 +6,6 @@ namespace fs = std::filesystem;
 
 namespace machine {
 
-bool IsReadOnly(const fs::path& file) {
-  std::error_code error;
-  return (fs::status(file, error).permissions() & fs::perms::owner_write) == fs::perms::none;
-}
-
 bool SetReadOnly(const fs::path& file, bool readOnly) {
   constexpr fs::perms kAllWrite =
       fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write;

@@ -1,12 +1,11 @@
-// The read-only attribute, which is the owner's write permission on the host. It is looked at here
-// and never left to the host to refuse, since the host refuses its superuser nothing.
+// What the host's permissions say of a file. The read-only attribute is the owner's write
+// permission: Locate reads it, and it is never left to the host to refuse, since the host refuses
+// its superuser nothing.
 #pragma once
 
 #include <filesystem>
 
 namespace machine {
-
-bool IsReadOnly(const std::filesystem::path& file);
 
 // False when the host refuses.
 bool SetReadOnly(const std::filesystem::path& file, bool readOnly);

@@ -34,11 +34,8 @@ OpenMode ImageHold() {
 
 bool IsRefusedByHolders(const Location& location, const OpenMode& mode) {
   if (location.isImage && Conflict(mode, ImageHold())) return true;
-  struct stat status;
-  if (stat(location.host.c_str(), &status) != 0) return false;
   return std::ranges::any_of(openFiles, [&](const auto& entry) {
-    const OpenFile& file = entry.second;
-    return file.device == status.st_dev && file.inode == status.st_ino && Conflict(mode, file.mode);
+    return entry.second.identity == location.identity && Conflict(mode, entry.second.mode);
   });
 }
 
@@ -46,9 +43,7 @@ bool CanOpen(const Location& location, const OpenMode& mode) {
   const bool writes = mode.create || (mode.access & kWrite) != 0;
   if (location.isRoot || (writes && IsReadOnlyDrive(location.drive))) return false;
   if (!location.exists) return mode.create && location.parentExists && !location.endsInSeparator;
-  std::error_code error;
-  if (!std::filesystem::is_regular_file(location.host, error)) return false;
-  if (writes && IsReadOnly(location.host)) return false;
+  if (location.isDirectory || (writes && location.isReadOnly)) return false;
   // To cut a file is to write it, whatever the access asked for.
   OpenMode asked = mode;
   if (writes) asked.access |= kWrite;
@@ -69,11 +64,9 @@ int HostFlags(DWORD access) {
 // A host descriptor on the file, cut or made if the mode says so; -1 when the host refuses.
 int OpenOnHost(const Location& location, const OpenMode& mode) {
   if (!mode.create) return open(location.host.c_str(), HostFlags(mode.access));
-  std::error_code error;
-  const uint64_t oldSize = location.exists ? std::filesystem::file_size(location.host, error) : 0;
   const int host = open(location.host.c_str(), HostFlags(mode.access) | O_CREAT | O_TRUNC, 0666);
   if (host < 0) return -1;
-  GiveRoomBack(location.drive, oldSize);
+  GiveRoomBack(location.drive, location.size);
   MarkProgram(location.host);
   if (mode.readOnly) SetReadOnly(location.host, true);
   return host;
@@ -111,8 +104,7 @@ int Enter(ObjectKind kind, const OpenMode& mode, char drive, int host) {
   openFiles.emplace(number, OpenFile{.kind = kind,
                                      .mode = mode,
                                      .drive = drive,
-                                     .device = status.st_dev,
-                                     .inode = status.st_ino,
+                                     .identity = {status.st_dev, status.st_ino},
                                      .host = host,
                                      .size = static_cast<uint64_t>(status.st_size)});
   ObjectOpened(kind);

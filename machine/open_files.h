@@ -2,8 +2,6 @@
 // sharing between them.
 #pragma once
 
-#include <sys/types.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -32,8 +30,7 @@ struct OpenFile {
   ObjectKind kind;  // kFile for a handle, kDescriptor for a descriptor
   OpenMode mode;
   char drive;
-  dev_t device;  // with the inode: which file it is, whatever its path
-  ino_t inode;
+  FileIdentity identity;
   int host;              // the host's descriptor, owned
   int64_t position = 0;  // the program's; the host's own is not used
   uint64_t size = 0;     // as last seen; the file's own while nobody else may write it

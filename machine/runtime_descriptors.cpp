@@ -8,7 +8,6 @@
 #include "machine/open_files.h"
 #include "platform/win32.h"
 
-namespace fs = std::filesystem;
 using machine::CallFails;
 using machine::ObjectKind;
 using machine::OpenFile;
@@ -161,16 +160,14 @@ int _stat(const char* name, struct _stat* status) {
   const auto location = machine::Locate(name);
   if (!location || !location->exists) return -1;
   if (location->endsInSeparator && !location->isRoot) return -1;
-  std::error_code error;
-  if (location->isRoot || fs::is_directory(location->host, error)) {
+  if (location->isDirectory) {
     *status = {.st_mode = kDirectoryBit | _S_IREAD | _S_IWRITE, .st_size = 0};
     return 0;
   }
-  const uintmax_t size = fs::file_size(location->host, error);
-  if (error || size > INT32_MAX) return -1;
-  const int permission = machine::IsReadOnly(location->host) ? _S_IREAD : _S_IREAD | _S_IWRITE;
+  if (location->size > INT32_MAX) return -1;
+  const int permission = location->isReadOnly ? _S_IREAD : _S_IREAD | _S_IWRITE;
   *status = {.st_mode = static_cast<uint16_t>(kFileBit | permission),
-             .st_size = static_cast<int32_t>(size)};
+             .st_size = static_cast<int32_t>(location->size)};
   return 0;
 }
 

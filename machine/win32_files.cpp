@@ -45,19 +45,13 @@ OpenFile* FileOf(HANDLE handle) {
   return machine::FindOpenFile(NumberOf(handle), ObjectKind::kFile);
 }
 
-bool IsDirectory(const Location& location) {
-  std::error_code error;
-  return location.isRoot || (location.exists && fs::is_directory(location.host, error));
-}
-
 std::string_view TextOf(LPCSTR text) {
   return text == nullptr ? "" : text;
 }
 
-bool DeleteLocated(const Location& location) {
+bool DeleteLocated(const Location& location, uint64_t size) {
   std::error_code error;
-  const uint64_t size = fs::file_size(location.host, error);
-  if (error || !fs::remove(location.host, error)) return false;
+  if (!fs::remove(location.host, error)) return false;
   machine::GiveRoomBack(location.drive, size);
   return true;
 }
@@ -83,11 +77,11 @@ bool FillTarget(int source, int target, const Location& from, const Location& to
   OpenFile* const input = machine::FindOpenFile(source, ObjectKind::kFile);
   OpenFile* const output = machine::FindOpenFile(target, ObjectKind::kFile);
   if (!CopyBytes(*input, *output)) {
-    DeleteLocated(to);
+    DeleteLocated(to, machine::FileSize(*output));
     return false;
   }
   CopyTime(*input, *output);
-  return machine::SetReadOnly(to.host, machine::IsReadOnly(from.host));
+  return machine::SetReadOnly(to.host, from.isReadOnly);
 }
 
 }  // namespace
@@ -169,10 +163,10 @@ BOOL CloseHandle(HANDLE handle) {
 BOOL DeleteFileA(LPCSTR name) {
   if (CallFails("DeleteFileA")) return FALSE;
   const auto location = Locate(TextOf(name));
-  if (!location || !location->exists || IsDirectory(*location)) return FALSE;
-  if (IsReadOnlyDrive(location->drive) || machine::IsReadOnly(location->host)) return FALSE;
+  if (!location || !location->exists || location->isDirectory) return FALSE;
+  if (IsReadOnlyDrive(location->drive) || location->isReadOnly) return FALSE;
   if (machine::IsHeldOpen(*location)) return FALSE;
-  return DeleteLocated(*location);
+  return DeleteLocated(*location, location->size);
 }
 
 BOOL CopyFileA(LPCSTR from, LPCSTR to, BOOL failIfExists) {
@@ -206,8 +200,8 @@ BOOL CreateDirectoryA(LPCSTR name, LPSECURITY_ATTRIBUTES) {
 BOOL RemoveDirectoryA(LPCSTR name) {
   if (CallFails("RemoveDirectoryA")) return FALSE;
   const auto location = Locate(TextOf(name));
-  if (!location || location->isRoot || !IsDirectory(*location)) return FALSE;
-  if (IsReadOnlyDrive(location->drive) || machine::IsReadOnly(location->host)) return FALSE;
+  if (!location || location->isRoot || !location->isDirectory) return FALSE;
+  if (IsReadOnlyDrive(location->drive) || location->isReadOnly) return FALSE;
   // The host refuses a directory with anything in it.
   std::error_code error;
   return fs::remove(location->host, error);
@@ -219,8 +213,8 @@ DWORD GetFileAttributesA(LPCSTR name) {
   const auto location = Locate(TextOf(name));
   if (!location || !location->exists) return INVALID_FILE_ATTRIBUTES;
   if (location->isRoot) return FILE_ATTRIBUTE_DIRECTORY;
-  const DWORD kind = IsDirectory(*location) ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_ARCHIVE;
-  return machine::IsReadOnly(location->host) ? kind | FILE_ATTRIBUTE_READONLY : kind;
+  const DWORD kind = location->isDirectory ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_ARCHIVE;
+  return location->isReadOnly ? kind | FILE_ATTRIBUTE_READONLY : kind;
 }
 
 }  // extern "C"

@@ -19,20 +19,11 @@ std::span<const uint8_t> Bytes(const std::string& text) {
   return {reinterpret_cast<const uint8_t*>(text.data()), text.size()};
 }
 
-class ExecutableResources : public testing::Test {
- protected:
-  // The version resource of a file of these bytes, "" for none.
-  std::string Read(const std::string& file) const {
-    std::ofstream(Path(), std::ios::binary) << file;
-    const auto resource = machine::ReadVersionResource(Path());
-    return resource ? std::string(resource->begin(), resource->end()) : "";
-  }
-
-  std::filesystem::path Path() const { return folder_.Path() / "file.exe"; }
-
- private:
-  TemporaryFolder folder_;
-};
+// The version resource of a file of these bytes, "" for none.
+std::string Read(const std::string& file) {
+  const auto resource = machine::FindVersionResource(Bytes(file));
+  return resource ? std::string(resource->begin(), resource->end()) : "";
+}
 
 std::string Query(const std::string& resource, const std::string& path) {
   const auto value =
@@ -40,7 +31,7 @@ std::string Query(const std::string& resource, const std::string& path) {
   return value ? std::string(value->begin(), value->end()) : "none";
 }
 
-TEST_F(ExecutableResources, AreFoundInEveryKindOfProgram) {
+TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
   const std::string other = VersionResource({{"FileVersion", "9"}});
   for (const bool is64 : {false, true}) {
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, kVersion}})), kVersion);
@@ -52,13 +43,14 @@ TEST_F(ExecutableResources, AreFoundInEveryKindOfProgram) {
   const std::string resources = ResourceFile({{6, 7, 0, "odd"}, {16, 1, 0, kVersion}});
   EXPECT_EQ(Read(NativeExecutable(".moriv_res", resources) + "a package behind it"), kVersion);
   EXPECT_EQ(Read(NativeExecutable(".other_res", resources)), "");
-  EXPECT_FALSE(machine::ReadVersionResource(Path().parent_path()));
-  EXPECT_FALSE(machine::ReadVersionResource(Path().parent_path() / "absent.exe"));
+  const TemporaryFolder folder;
+  EXPECT_FALSE(machine::ReadVersionResource(folder.Path()));
+  EXPECT_FALSE(machine::ReadVersionResource(folder.Path() / "absent.exe"));
 }
 
 // What comes out of a file that is cut short, or has an extreme byte anywhere, lies within it. Run
 // under a sanitizer this is the proof that no offset is followed unchecked.
-TEST_F(ExecutableResources, OfADamagedFileStayWithinIt) {
+TEST(ExecutableResources, OfADamagedFileStayWithinIt) {
   for (const std::string& sound :
        {PortableExecutable(false, 16, 1, {{0, kVersion}}),
         PortableExecutable(true, 16, 1, {{0, kVersion}}),
@@ -82,7 +74,7 @@ TEST_F(ExecutableResources, OfADamagedFileStayWithinIt) {
   }
 }
 
-TEST_F(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
+TEST(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
   ByteBuilder named;  // passed over
   named.U32(3).U32(40).Wide("PIC").U16(0).Wide("A").U16(0).Align().PadTo(40).Append("abc").Align();
   const std::string file = named.bytes() + ResourceFile({{6, 1, 0x40C, "french"},
