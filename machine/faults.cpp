@@ -15,6 +15,7 @@ constexpr int kStopStatus = 4;
 std::vector<Fault> faults;
 std::function<void(const Fault&)> strikeObserver;
 std::map<std::string, int, std::less<>> callCounts;
+bool endsAtNextCall = false;
 
 bool Strikes(const Fault& fault, std::string_view function, int call) {
   return fault.function == function &&
@@ -23,11 +24,13 @@ bool Strikes(const Fault& fault, std::string_view function, int call) {
 
 // Counts the call. Returns the fault that strikes it, or null.
 const Fault* CountCall(const char* function) {
+  if (endsAtNextCall) _exit(kStopStatus);
   const int call = ++callCounts[function];
   for (const Fault& fault : faults) {
     if (!Strikes(fault, function, call)) continue;
     if (strikeObserver) strikeObserver(fault);
-    if (fault.stop) _exit(kStopStatus);
+    if (fault.stop && !fault.isShort) _exit(kStopStatus);
+    endsAtNextCall = fault.stop;
     return &fault;
   }
   return nullptr;
@@ -39,6 +42,7 @@ void SetFaults(const std::vector<Fault>& newFaults, std::function<void(const Fau
   faults = newFaults;
   strikeObserver = std::move(observer);
   callCounts.clear();
+  endsAtNextCall = false;
 }
 
 bool CallFails(const char* function, DWORD* error) {

@@ -1,7 +1,7 @@
 // Every fault in every kind of run: the n-th call of each function of the seam fails, falls short,
-// or is where the power goes, and the n-th allocation fails, for n = 1, 2, 3 ... until a run ends
-// without having met the fault. After each the machine is looked at, and the program run once more
-// without a fault.
+// or is where the power goes, the n-th allocation fails, and the user cancels at the n-th poll, for
+// n = 1, 2, 3 ... until a run ends without having met the fault. After each the machine is looked
+// at, and the program run once more without a fault.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -97,6 +97,7 @@ class FaultLoop : public testing::Test {
     }
     TryCalls({.function = kAllocation});
     TryCalls({.function = kAllocation, .fromThenOn = true});
+    if (!kind.workButtons.empty()) TryCalls({.function = kCancel});
     Tell();
   }
 
@@ -132,8 +133,10 @@ class FaultLoop : public testing::Test {
       TryCalls({.function = function, .isShort = true});
       TryCalls({.function = function, .fromThenOn = true, .isShort = true});
     }
-    if (std::ranges::count(kChangingFunctions, function) != 0)
-      TryCalls({.function = function, .stop = true});
+    if (std::ranges::count(kChangingFunctions, function) == 0) return;
+    TryCalls({.function = function, .stop = true});
+    if (machine::MovesBytes(function))
+      TryCalls({.function = function, .isShort = true, .stop = true});
   }
 
   // The fault at every call, until a run ends without having met it.

@@ -71,10 +71,16 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
   };
   const auto functionObserver = [observer, name = injection.function](const machine::Fault& fault) {
     if (fault.function == name) observer();
+    if (name == kCancel) {
+      observer();
+      machine::PostCancel();  // the next poll meets it
+    }
   };
   std::vector<machine::Fault> faults = kind.always;
   if (injection.function == kAllocation) {
     FailAllocation(injection.call, injection.fromThenOn, observer);
+  } else if (injection.function == kCancel) {
+    faults.push_back({.function = "PeekMessageA", .call = injection.call});
   } else if (!injection.function.empty()) {
     faults.push_back(injection);
   }

@@ -23,8 +23,10 @@ struct RunKind {
 };
 
 inline constexpr char kAllocation[] = "allocation";
+inline constexpr char kCancel[] = "cancel";
 
-// A fault of a function of the seam, or of kAllocation. An empty name: none.
+// A fault of a function of the seam or of kAllocation, or kCancel: the user of a dialog cancels
+// while the n-th poll of a pass looks for messages. An empty name: none.
 using Injection = machine::Fault;
 
 // "WriteFile 3 on".
