@@ -37,7 +37,7 @@ struct SetupRequest {
   char reportFile[kPathSize];  // second copy of the log; empty when none
 };
 
-// A run. The request is its head.
+// A run. The request is its head. CloseSetup (package/package_reader.h) ends it.
 struct SetupContext : SetupRequest {
   DataFile* packageFile;    // the image, open for reading; owned; null while the package is closed
   PackageHeader header;     // copy of the header at the tail of the image

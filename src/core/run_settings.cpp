@@ -3,6 +3,7 @@
 #include "package/package_reader.h"
 #include "package/paths.h"
 #include "platform/procedure.h"
+#include "platform/text.h"
 #include "registration/registered_product.h"
 #include "ui/catalog.h"
 

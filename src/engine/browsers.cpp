@@ -4,6 +4,7 @@
 
 #include "package/paths.h"
 #include "platform/registry_key.h"
+#include "platform/text.h"
 
 namespace {
 
@@ -32,6 +33,7 @@ int FindByAppPath(const char* executable, char* buffer, int32_t size) {
       !ReadText(key, "Path", directory) || CleanAppPath(directory) != 1) {
     return 0;
   }
+  // AppendBackslash has no room behind a directory of 259 characters.
   const char* separator = directory[strlen(directory) - 1] == '\\' ? "" : "\\";
   (void)FormatText(plugins, sizeof(plugins), "%s%sPlugins", directory, separator);
   return CopyResult(buffer, size, plugins);

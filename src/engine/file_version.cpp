@@ -1,6 +1,5 @@
 #include "engine/file_version.h"
 
-#include <algorithm>
 #include <cstring>
 #include <memory>
 #include <new>
@@ -22,8 +21,8 @@ class VersionData {
     block_ = GlobalAlloc(GMEM_MOVEABLE, size);
     if (block_ == nullptr) return;
     data_ = GlobalLock(block_);
-    // A read that fails ends in queries that fail, on a block that is at least cleared.
     if (data_ == nullptr) return;
+    // A read that fails ends in queries that fail, on a block that is at least cleared.
     memset(data_, 0, size);
     (void)library.getInfo(path, handle, size, data_);
   }
@@ -48,6 +47,42 @@ class VersionData {
   void* data_ = nullptr;
 };
 
+constexpr char kSeparators[] = ".,- ";
+constexpr size_t kTokenSize = 16;
+
+// Decimal digits as far as they go, after white space and a sign; the low 16 bits of the number.
+// 15 digits fit 64 bits.
+int16_t TokenValue(const char* token) {
+  token += strspn(token, "\t\n\v\f\r");
+  if (*token == '+') ++token;  // a '-' has closed the token
+  int64_t value = 0;
+  for (; *token >= '0' && *token <= '9'; ++token) value = value * 10 + (*token - '0');
+  return static_cast<int16_t>(value);
+}
+
+// As ParseVersionText, for a text that ends at its NUL or after `size` bytes.
+StatusCode ParseVersion(const char* text, size_t size, int16_t* fields) {
+  for (int i = 0; i < 3; ++i) fields[i] = kVersionNotSet;
+  if (size == 0 || *text == '\0') return StatusNoVersion;
+
+  int16_t numbers[3] = {kVersionNotSet, kVersionNotSet, kVersionNotSet};
+  char token[kTokenSize] = {};
+  size_t length = 0;
+  for (const char* const end = text + size; text != end && *text != '\0'; ++text) {
+    if (strchr(kSeparators, *text) == nullptr) {
+      if (length < kTokenSize - 1) token[length++] = *text;
+      continue;
+    }
+    const int free = numbers[0] == kVersionNotSet ? 0 : numbers[1] == kVersionNotSet ? 1 : 2;
+    numbers[free] = TokenValue(token);
+    memset(token, 0, sizeof(token));
+    length = 0;
+  }
+  if (numbers[2] == kVersionNotSet) numbers[2] = TokenValue(token);
+  for (int i = 0; i < 3; ++i) fields[i] = numbers[i] == kVersionNotSet ? int16_t{0} : numbers[i];
+  return StatusOk;
+}
+
 void ReadVersion(const VersionData& data, FileRecord* record) {
   constexpr char kUsualBlock[] = "040C04B0";  // of a file that has no translation table
   char block[64] = {};
@@ -66,27 +101,12 @@ void ReadVersion(const VersionData& data, FileRecord* record) {
 
   const void* version = data.Query(block, &length);
   if (version == nullptr) return;
-  char text[kPathSize] = {};
-  memcpy(text, version, std::min<size_t>(length, sizeof(text) - 1));
   int16_t fields[3];
-  (void)ParseVersionText(text, fields);  // an empty text leaves the fields not set, as they are
+  // An empty text leaves the fields not set, as they are.
+  (void)ParseVersion(static_cast<const char*>(version), length, fields);
   record->versionFirst = fields[0];
   record->versionSecond = fields[1];
   record->versionThird = fields[2];
-}
-
-constexpr char kSeparators[] = ".,- ";
-constexpr size_t kTokenSize = 16;
-
-// Decimal digits as far as they go, after white space and a sign; the low 16 bits of the number.
-// 15 digits fit 64 bits.
-int16_t TokenValue(const char* token) {
-  token += strspn(token, "\t\n\v\f\r");
-  const bool isNegative = *token == '-';
-  if (*token == '-' || *token == '+') ++token;
-  int64_t value = 0;
-  for (; *token >= '0' && *token <= '9'; ++token) value = value * 10 + (*token - '0');
-  return static_cast<int16_t>(isNegative ? -value : value);
 }
 
 }  // namespace
@@ -115,25 +135,7 @@ int32_t ReadOwnFileRecord(FileRecord* record) {
 
 StatusCode ParseVersionText(const char* text, int16_t* fields) {
   if (text == nullptr || fields == nullptr) return StatusBadArgument;
-  for (int i = 0; i < 3; ++i) fields[i] = kVersionNotSet;
-  if (*text == '\0') return StatusNoVersion;
-
-  int16_t numbers[3] = {kVersionNotSet, kVersionNotSet, kVersionNotSet};
-  char token[kTokenSize] = {};
-  size_t length = 0;
-  for (; *text != '\0'; ++text) {
-    if (strchr(kSeparators, *text) == nullptr) {
-      if (length < kTokenSize - 1) token[length++] = *text;
-      continue;
-    }
-    const int free = numbers[0] == kVersionNotSet ? 0 : numbers[1] == kVersionNotSet ? 1 : 2;
-    numbers[free] = TokenValue(token);
-    memset(token, 0, sizeof(token));
-    length = 0;
-  }
-  if (numbers[2] == kVersionNotSet) numbers[2] = TokenValue(token);
-  for (int i = 0; i < 3; ++i) fields[i] = numbers[i] == kVersionNotSet ? int16_t{0} : numbers[i];
-  return StatusOk;
+  return ParseVersion(text, strlen(text), fields);
 }
 
 RecordComparison CompareFileRecords(const FileRecord* a, const FileRecord* b) {

@@ -5,6 +5,7 @@
 #include "engine/package_walk.h"
 #include "package/expand_stream.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "ui/catalog.h"
 
 namespace {
@@ -15,6 +16,14 @@ class InstallPass {
   static constexpr bool kTakesStreams = true;
 
   explicit InstallPass(SetupContext* context) : context_(context) {}
+
+  StatusCode Begin() {
+    context_->records = new (std::nothrow) FileRecord[context_->header.recordCount]();
+    if (context_->records != nullptr) return StatusOk;
+    (void)AddEvent(&context_->events, EventNoMemory, SeverityFatal, nullptr);
+    ClosePackageFile(context_);
+    return StatusNoMemory;
+  }
 
   FileRecord* RecordAt(int index) { return &context_->records[index]; }
 
@@ -46,12 +55,6 @@ StatusCode PrepareTarget(SetupContext* context, const char* path) {
 
 StatusCode InstallFiles(SetupContext* context) {
   if (context == nullptr || context->packageFile == nullptr) return StatusInternal;
-  context->records = new (std::nothrow) FileRecord[context->header.recordCount]();
-  if (context->records == nullptr) {
-    (void)AddEvent(&context->events, EventNoMemory, SeverityFatal, nullptr);
-    ClosePackageFile(context);
-    return StatusNoMemory;
-  }
   InstallPass pass(context);
   return WalkPackage(context, pass);
 }

@@ -9,13 +9,15 @@
 
 // The pass. Needs an open package, a settled installDir and null records; called once a run. Leaves
 // all records in context->records, which the removal program is written from.
-// Returns 1 when all is done. The operation that gives up adds a fatal event; a stop by the user
-// before a record adds none.
+// Returns 1 when all is done. The operation that gives up adds a fatal event; a missing argument, a
+// stop by the user before a record and a stored size of 0 add none. StatusSeekFailed, and
+// StatusNoMemory for the records, leave the package closed.
 StatusCode InstallFiles(SetupContext* context);
 
 // Writes all targets of one record. The package file's position is on the first byte of the stream,
-// and after success behind it. Returns 1, StatusInternal for a missing argument or a size of 0, or
-// the failure of the target at which it stopped; those before it stay.
+// and after success behind it. Adds event 34 for each target. Returns 1, StatusInternal for a
+// missing argument or a size of 0, or the failure of the target at which it stopped, with fatal
+// event 28, 29, 33 or 37; those before it stay.
 StatusCode InstallTargets(SetupContext* context, const TargetList* list, uint32_t storedSize);
 
 // Copies over what is there. Returns 1, StatusCopyFailed, or StatusInternal for a missing or empty

@@ -4,6 +4,7 @@
 // A pass is a type with
 //   static constexpr bool kReports         add the walk's fatal events and the browser events
 //   static constexpr bool kTakesStreams    Work consumes the stream of a record that has targets
+//   StatusCode Begin()                     once, at the first record; not 1 ends the walk
 //   FileRecord* RecordAt(int index)        where the record goes, cleared
 //   StatusCode Work(const FileRecord&, const TargetList&)
 //                                          1 to go on; anything else ends the walk with that result
@@ -67,8 +68,8 @@ StatusCode WalkRecord(SetupContext* context, Pass& pass, int index) {
 
 // Walks all records. The context must have an open packageFile. Returns 1 when every record was
 // walked, StatusSeekFailed with the package file closed and null, StatusCancelled, StatusBadRecord,
-// StatusReadFailed, a negative result of ResolveTargets, or what Work gave. Browsers that are
-// missing are no failure: every file that has a place on this machine is there.
+// StatusReadFailed, a negative result of ResolveTargets, or what Begin or Work gave. Browsers that
+// are missing are no failure: every file that has a place on this machine is there.
 template <typename Pass>
 StatusCode WalkPackage(SetupContext* context, Pass& pass) {
   if (!package_walk::SeekTo(context->packageFile, context->header.dataOffset)) {
@@ -77,9 +78,9 @@ StatusCode WalkPackage(SetupContext* context, Pass& pass) {
     ClosePackageFile(context);
     return status;
   }
-  for (int index = 0; index < context->header.recordCount; ++index) {
-    const StatusCode status = package_walk::WalkRecord(context, pass, index);
-    if (status != StatusOk) return status;
+  StatusCode status = pass.Begin();
+  for (int index = 0; status == StatusOk && index < context->header.recordCount; ++index) {
+    status = package_walk::WalkRecord(context, pass, index);
   }
-  return StatusOk;
+  return status;
 }

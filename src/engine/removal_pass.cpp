@@ -13,6 +13,8 @@ class RemovalPass {
 
   explicit RemovalPass(SetupContext* context) : context_(context) {}
 
+  StatusCode Begin() { return StatusOk; }
+
   FileRecord* RecordAt(int) {
     record_ = {};
     return &record_;

@@ -4,6 +4,7 @@
 
 #include "engine/browsers.h"
 #include "package/paths.h"
+#include "platform/text.h"
 
 namespace {
 
@@ -26,8 +27,9 @@ constexpr MacroRow kMacros[] = {
     {"%PLUGIN_ALL_DIR%", MacroAllBrowsers},
 };
 
-// Room for a path in the making: two directories or a directory and a subpath of at most 260
-// characters each, two backslashes and a file name of at most 32 always fit.
+// Room for a path in the making: a browser's directory of at most 267 characters, a subpath of at
+// most 260, two backslashes and a file name of at most 32 always fit. A longer base directory is
+// refused.
 constexpr size_t kWorkSize = 780;
 using WorkText = char[kWorkSize];
 
@@ -90,7 +92,8 @@ StatusCode ComposePath(WorkText& work, const char* subpath, const FileRecord& re
   return AppendText(work, TextField(record.fileName).text) ? StatusOk : StatusBufferTooSmall;
 }
 
-// Adds a target for each browser that there is. Returns 1 if it added one, else `result`.
+// Adds a target for each browser that there is. Returns 1 if it added one, else `result`;
+// StatusBufferTooSmall or StatusNoMemory at the first target that can't be added.
 StatusCode FanOut(SetupContext* context, TargetList* list, const char* behindMacro,
                   const FileRecord& record, bool logBrowsers, StatusCode result) {
   const char* const tail = SkipBackslash(behindMacro);
@@ -141,7 +144,8 @@ StatusCode ResolveTargets(SetupContext* context, TargetList* list, const char* b
     if (ClassifyMacro(text, &macroLength) == MacroAllBrowsers) {
       result = FanOut(context, list, text + macroLength, *record, logBrowsers, result);
     } else {
-      // Fits: it is a part of a text of the same width. One that fills it ends there.
+      // Fits: it is a part of a field of the same width. One that fills it has no NUL, and is read
+      // as far as the field goes.
       memset(element.destination, 0, sizeof(element.destination));
       memcpy(element.destination, text, strlen(text));
       result = AddElement(list, baseDirectory, element);

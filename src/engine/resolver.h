@@ -30,18 +30,23 @@ enum MacroCode {
   MacroAllBrowsers = 14,
 };
 
-// Fills the list for one record, which is not changed. The list is set to empty first, without
-// freeing; the caller frees it afterwards, whatever the result.
-//   logBrowsers  add an event for each browser that a fan-out finds or misses
-// Returns 1, or the soft status of a missing browser when the last element was skipped for it: the
-// list stands and may be empty. A negative result ends the walk over the elements at once:
-// StatusBadArgument, StatusNoSystemDir, StatusBufferTooSmall (a path above 259 characters),
-// StatusNoMemory. Adds no event for a failure: the caller does.
+// Fills the list for one record, which is not changed. A missing context, list or record gives
+// StatusBadArgument and leaves the list alone; else it is set to empty first, without freeing, and
+// the caller frees it afterwards, whatever the result.
+//   baseDirectory  may be null when no element stands below it
+//   logBrowsers    add an event for each browser that a fan-out finds or misses
+// Returns 1, or the soft status of a missing browser when no element behind the one that was
+// skipped for it added a target: the list stands and may be empty. A negative result ends the walk
+// over the elements at once: StatusBadArgument, StatusNoSystemDir, StatusBufferTooSmall (a path
+// above 259 characters), StatusNoMemory. Adds no event for a failure: the caller does.
 StatusCode ResolveTargets(SetupContext* context, TargetList* list, const char* baseDirectory,
                           const FileRecord* record, bool logBrowsers);
 
-// Resolves the one element that stands in the record's destination and is no fan-out. `directory`
-// may be null. Returns 1 with the path filled, or as ResolveTargets.
+// Resolves the one element that stands in the record's destination and is no fan-out.
+//   directory  may be null; filled only for an element with a subpath, and only when its size is
+//              above the length plus 1
+// Returns 1 with the path filled; the soft status of a missing browser, without a path; or one of
+// the negative results above.
 StatusCode ResolveElement(char* path, size_t pathSize, char* directory, size_t directorySize,
                           const char* baseDirectory, const FileRecord* record);
 

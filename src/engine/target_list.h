@@ -20,7 +20,7 @@ struct TargetList {
 };
 
 // Appends one entry; `directory` may be null. Returns 1, StatusBadArgument for a null list or path,
-// StatusBufferTooSmall for a text that is no path, StatusNoMemory; the list is unchanged then.
+// StatusBufferTooSmall for a text above 259 characters, StatusNoMemory; the list is unchanged then.
 StatusCode AddTarget(TargetList* list, const char* path, const char* directory);
 
 // Frees the entries and leaves the list empty.

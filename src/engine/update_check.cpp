@@ -11,29 +11,32 @@ class UpdateCheck {
   static constexpr bool kReports = false;
   static constexpr bool kTakesStreams = false;
 
+  StatusCode Begin() { return StatusOk; }
+
   FileRecord* RecordAt(int) {
     packaged_ = {};
     return &packaged_;
   }
 
-  // 0, which ends the walk, at the first target that is missing or older.
+  // Ends the walk at the first target that is missing or older.
   StatusCode Work(const FileRecord& record, const TargetList& targets) {
     for (int32_t i = 0; i < targets.count && !foundOlder_; ++i) {
       foundOlder_ = IsMissingOrOlder(targets.entries[i].path, record);
     }
-    return foundOlder_ ? 0 : StatusOk;
+    return foundOlder_ ? kFound : StatusOk;
   }
 
   bool foundOlder() const { return foundOlder_; }
 
  private:
+  static constexpr StatusCode kFound = 0;  // no status of the program's: ends the walk
+
   static bool IsMissingOrOlder(const char* path, const FileRecord& packaged) {
     if (FileExists(path) != 1) return true;
     FileRecord installed = {};
     // Unread: a file without a version leaves fields that compare as older than any version.
     (void)ReadFileRecordFromDisk(path, &installed);
     memcpy(installed.fileName, packaged.fileName, sizeof(installed.fileName));
-    memcpy(installed.destination, packaged.destination, sizeof(installed.destination));
     const RecordComparison comparison = CompareFileRecords(&packaged, &installed);
     return comparison == ComparisonFirstGreater || comparison == ComparisonSecondGreater ||
            comparison == ComparisonThirdGreater;

@@ -29,6 +29,7 @@ int DataFile::OpenForRead() {
 int DataFile::OpenForWrite() {
   return Open(GENERIC_WRITE, OPEN_EXISTING);
 }
+
 int DataFile::Create() {
   return Open(GENERIC_READ | GENERIC_WRITE, CREATE_ALWAYS);
 }
@@ -42,8 +43,9 @@ int DataFile::Open(DWORD access, DWORD disposition) {
 
 int DataFile::OpenDescriptor(DWORD access, DWORD disposition) {
   if (disposition == CREATE_ALWAYS) {
-    // The mask takes the write permission away from what creat asks for; chmod gives it back, so
-    // that the file ends writable whatever mask the process had.
+    // Under this mask creat makes a read-only file, which its own descriptor can still write, and
+    // chmod makes it writable: so it ends the same whatever mask the process had. The mask stays:
+    // nothing else makes files by it.
     _umask(kOwnerMayReadAndWrite);
     descriptor_ = _creat(name_, kOwnerMayReadAndWrite);
     if (descriptor_ == -1) return 0;

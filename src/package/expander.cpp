@@ -26,12 +26,8 @@ uint32_t WindowAt(const uint8_t* bytes) {
 
 PkzExpander::PkzExpander() : table_(new (std::nothrow) StringTable::Entry[StringTable::kSize + 1]) {
   if (table_ == nullptr) return;
-  strings_.entries = table_;
+  strings_.entries = table_.get();
   strings_.SetLiterals();
-}
-
-PkzExpander::~PkzExpander() {
-  delete[] table_;
 }
 
 void PkzExpander::Expand(const uint8_t* bytes, uint32_t count) {

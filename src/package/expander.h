@@ -11,8 +11,8 @@
 // middle of a code. It serves one stream. Its memory is fixed and allocated once.
 #pragma once
 
-#include <cstddef>
 #include <cstdint>
+#include <memory>
 
 #include "package/string_table.h"
 
@@ -24,7 +24,7 @@ inline constexpr uint32_t kStreamMagicSize = 3;
 class PkzExpander {
  public:
   PkzExpander();
-  virtual ~PkzExpander();
+  virtual ~PkzExpander() = default;
   PkzExpander(const PkzExpander&) = delete;
   PkzExpander& operator=(const PkzExpander&) = delete;
 
@@ -40,7 +40,7 @@ class PkzExpander {
  protected:
   // Takes `count` bytes of output, which stay valid during the call alone: several whole strings of
   // at most 1024 bytes together, or one string. All strings of a block come before Expand returns;
-  // none comes after a call that failed.
+  // once it has called Fail it is not called again.
   virtual void WriteOutput(const uint8_t* bytes, uint32_t count) = 0;
 
   void Fail() { failed_ = 1; }
@@ -76,7 +76,7 @@ class PkzExpander {
   uint32_t inputLeft_ = 0;
   State state_ = State::kFirstCode;
   int32_t codeWidth_ = kFirstWidth;
-  StringTable::Entry* table_;  // owned
+  const std::unique_ptr<StringTable::Entry[]> table_;  // what strings_ works on
   StringTable strings_;
   // Strings not yet given out. All but the last together have at most kBatchSize bytes, so that
   // there always is room for one more.

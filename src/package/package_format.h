@@ -6,7 +6,7 @@
 // as is every machine that the program runs on, so a record is read straight into its struct.
 //
 // Texts are 8-bit, NUL-terminated and filled with zeros. A damaged package can fill a field to its
-// width: read them through ReadTextField (platform/text.h) or on a copy that has room for a NUL.
+// width: read them through TextField (platform/text.h).
 #pragma once
 
 #include <cstddef>

@@ -4,11 +4,13 @@
 #include <new>
 
 #include "package/paths.h"
+#include "platform/text.h"
 
 namespace {
 
-StatusCode RefusePackage(SetupContext* context, uint32_t event, StatusCode status) {
-  (void)AddEvent(&context->events, event, SeverityFatal, context->packageFile->GetName());
+StatusCode RefusePackage(SetupContext* context, const char* path, uint32_t event,
+                         StatusCode status) {
+  (void)AddEvent(&context->events, event, SeverityFatal, path);
   ClosePackageFile(context);
   return status;
 }
@@ -37,19 +39,19 @@ StatusCode ReadPackageHeader(SetupContext* context) {
   if (file == nullptr) return StatusNoMemory;
   context->packageFile = file;
   if (file->OpenForRead() != 1) {
-    return RefusePackage(context, EventOpenFailed, StatusOpenFailed);
+    return RefusePackage(context, path, EventOpenFailed, StatusOpenFailed);
   }
 
   // A file shorter than a header gives a negative position, and one of 2 GiB or more gives one that
   // has no 32-bit form: both are seeks that fail.
   const int64_t position = static_cast<int64_t>(file->GetSize()) - int64_t{sizeof(PackageHeader)};
   if (position > INT32_MAX || file->SeekTo(static_cast<int32_t>(position)) != 1) {
-    return RefusePackage(context, EventSeekFailed, StatusBadPackage);
+    return RefusePackage(context, path, EventSeekFailed, StatusBadPackage);
   }
   context->header = {};
   if (file->Read(&context->header, sizeof(PackageHeader)) != sizeof(PackageHeader) ||
       !IsGoodHeader(context->header)) {
-    return RefusePackage(context, EventBadPackage, StatusBadPackage);
+    return RefusePackage(context, path, EventBadPackage, StatusBadPackage);
   }
   return StatusOk;
 }
@@ -62,10 +64,9 @@ int32_t ReadFileRecord(DataFile* file, FileRecord* record) {
 
 StatusCode GetImagePath(char* buffer, uint32_t size) {
   if (buffer == nullptr || size == 0) return StatusBadArgument;
-  // A result equal to the size is a path that was cut.
-  const DWORD length = GetModuleFileNameA(ModuleHandle(), buffer, size);
-  if (length == 0 || length >= size || buffer[0] == '\0') return StatusNoModulePath;
-  return StatusOk;
+  const auto length = static_cast<int32_t>(GetModuleFileNameA(ModuleHandle(), buffer, size));
+  buffer[size - 1] = '\0';  // systems before Windows Vista leave a path that they cut without one
+  return length > 0 && buffer[0] != '\0' ? StatusOk : StatusNoModulePath;
 }
 
 void ClosePackageFile(SetupContext* context) {

@@ -22,16 +22,17 @@ StatusCode ReadPackageHeader(SetupContext* context);
 int32_t ReadFileRecord(DataFile* file, FileRecord* record);
 
 // Full path of the running image. Returns 1, StatusBadArgument for a null buffer or a size of 0,
-// StatusNoModulePath when the system gives none or none that fits.
+// StatusNoModulePath when the system gives none. A path that doesn't fit is cut.
 StatusCode GetImagePath(char* buffer, uint32_t size);
 
 // Closes and destroys packageFile, frees records, sets both to null. Returns 1, or
 // StatusBadArgument for a null context.
 StatusCode ReleasePackage(SetupContext* context);
 
-// Closes and destroys packageFile alone, as a pass does that can't even reach the first record.
+// Closes and destroys packageFile, if it is set, and sets it to null; records stay.
 void ClosePackageFile(SetupContext* context);
 
 // Ends a run's record: frees the events and releases the package, which may never have been open.
+// It stands here and not beside the record since it destroys the DataFile.
 // Returns 1, or StatusBadArgument for a null context.
 StatusCode CloseSetup(SetupContext* context);

@@ -1,4 +1,5 @@
 #include "package/paths.h"
+#include "platform/text.h"
 
 int FileExists(const char* path) {
   if (IsMissingOrEmpty(path)) return 0;

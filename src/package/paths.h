@@ -2,8 +2,9 @@
 // values are 1 and 0. A path may be null or empty: then the answer is 0 unless told.
 #pragma once
 
+#include <cstddef>
+
 #include "core/status.h"
-#include "platform/text.h"
 #include "platform/win32.h"
 
 // Something stands at the path, and it is no directory / a directory.

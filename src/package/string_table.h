@@ -21,7 +21,7 @@ struct StringTable {
 
   struct Entry {
     uint8_t suffix[kSuffixSize];  // the last (length - 1) % 8 + 1 bytes of the string
-    uint32_t prefix;              // code of the string in front of them; of no meaning without one
+    uint32_t prefix;              // code of the string in front of them, when there is one
     uint32_t length;              // of the whole string
   };
 

@@ -5,6 +5,7 @@
 
 #include "package/data_file.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "ui/catalog.h"
 
 namespace {

@@ -7,11 +7,13 @@
 #include "engine/file_version.h"
 #include "package/package_reader.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "ui/catalog.h"
 
 namespace {
 
 constexpr uint32_t kBlockSize = 1024;
+
 bool CopyExecutable(DataFile* image, uint32_t length, DataFile* copy) {
   uint8_t block[kBlockSize];
   while (length > 0) {
@@ -52,7 +54,7 @@ StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) 
   // Opening it again below puts its position at byte 0, where the copy starts.
   (void)image->Close();
 
-  FileRecord own = {};
+  FileRecord own = {};  // unread: an image without a version makes no removal program
   if (ReadOwnFileRecord(&own) != 1) return StatusBadRecord;
   char target[kRemovalProgramPathSize] = {};
   if (!FindRemovalProgramPath(target)) return StatusWriteRemovalFailed;

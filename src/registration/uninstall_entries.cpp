@@ -2,6 +2,7 @@
 
 #include "package/paths.h"
 #include "platform/registry_key.h"
+#include "platform/text.h"
 #include "registration/cleanup_script.h"
 #include "registration/removal_program.h"
 #include "ui/catalog.h"

@@ -2,6 +2,7 @@
 
 #include "core/run_settings.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "ui/catalog.h"
 #include "ui/control_ids.h"
 

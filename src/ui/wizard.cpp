@@ -16,6 +16,7 @@
 #include "log/event_log.h"
 #include "package/package_reader.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "registration/registered_product.h"
 #include "registration/removal_program.h"
 #include "registration/uninstall_entries.h"

@@ -12,6 +12,7 @@
 #include "machine/drives.h"
 #include "machine/open_objects.h"
 #include "package/paths.h"
+#include "platform/text.h"
 #include "tests/fuzz/fuzz_target.h"
 #include "tests/support/product_test.h"
 

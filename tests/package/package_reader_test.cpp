@@ -87,13 +87,14 @@ TEST_F(PackageReader, ARecordIsReadWholeOrNotAtAll) {
   EXPECT_EQ(ReadFileRecord(&file, nullptr), StatusBadArgument);
 }
 
-TEST_F(PackageReader, TheImagesPathHasToFitWithItsNul) {
+TEST_F(PackageReader, TheImagesPathIsCutToItsBuffer) {
   ImageBuilder().Write(&pc);
   constexpr uint32_t kNeeded = sizeof("C:\\setup.exe");
   char path[kNeeded] = {};
   EXPECT_EQ(GetImagePath(path, kNeeded), StatusOk);
   EXPECT_STREQ(path, "C:\\setup.exe");
-  EXPECT_EQ(GetImagePath(path, kNeeded - 1), StatusNoModulePath);
+  EXPECT_EQ(GetImagePath(path, kNeeded - 1), StatusOk);
+  EXPECT_STREQ(path, "C:\\setup.ex");
   EXPECT_EQ(GetImagePath(path, 0), StatusBadArgument);
   EXPECT_EQ(GetImagePath(nullptr, kNeeded), StatusBadArgument);
 }

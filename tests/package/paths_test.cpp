@@ -1,5 +1,6 @@
 // The small operations on paths, and the bounded work on texts under them.
 #include "package/paths.h"
+#include "platform/text.h"
 
 #include "tests/support/product_test.h"
 
