@@ -43,7 +43,7 @@ bool TakeChoice(std::string_view text, std::string_view yes, std::string_view no
 }
 
 bool TakeDirectory(std::string_view text, std::string* result) {
-  const bool isAbsolute = text.size() > 3 && text.size() < MAX_PATH && text.substr(1, 2) == ":\\";
+  const bool isAbsolute = text.size() >= 3 && text.size() < MAX_PATH && text.substr(1, 2) == ":\\";
   if (!isAbsolute) return false;
   *result = text;
   return true;

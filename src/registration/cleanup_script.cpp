@@ -13,21 +13,18 @@ namespace {
 constexpr char kFileName[] = "Moriv.INF";
 constexpr char kDeleteSection[] = "RemoveFiles";
 constexpr char kWindowsDirNumber[] = "10";  // the INF format's number of the Windows directory
-constexpr size_t kTextSize = 2 * kCatalogTextSize;
+constexpr size_t kTextSize = 2 * kCatalogTextSize;  // one catalog text and what stands around it
 
-// One write for each format, whole or not at all.
-bool WriteText(DataFile* file, const char* text) {
-  const uint32_t length = static_cast<uint32_t>(strlen(text));
-  return file->Write(text, length) == length;
-}
-
+// One write for each format.
 template <typename... Texts>
 bool WriteFormat(DataFile* file, const char* format, Texts... texts) {
   char text[kTextSize];
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
-  return FormatText(text, sizeof(text), format, texts...) && WriteText(file, text);
+  if (!FormatText(text, sizeof(text), format, texts...)) return false;
 #pragma GCC diagnostic pop
+  const uint32_t length = static_cast<uint32_t>(strlen(text));
+  return file->Write(text, length) == length;
 }
 
 bool WriteLines(DataFile* file) {

@@ -2,6 +2,7 @@
 #include <cstring>
 #include <new>
 
+#include "platform/registry_key.h"
 #include "platform/text.h"
 #include "registration/product_keys.h"
 #include "registration/product_registry.h"
@@ -111,9 +112,13 @@ int32_t ReadItem(const char* path, const char* name, char* buffer, int32_t size)
   if (buffer == nullptr || size < 0 || !key.Open(HKEY_LOCAL_MACHINE, path, KEY_READ)) return 0;
   DWORD type = 0;
   DWORD count = static_cast<DWORD>(size);
-  return RegQueryValueExA(key.get(), name, nullptr, &type, reinterpret_cast<BYTE*>(buffer),
-                          &count) == ERROR_SUCCESS &&
-         type == REG_SZ;
+  if (RegQueryValueExA(key.get(), name, nullptr, &type, reinterpret_cast<BYTE*>(buffer), &count) !=
+          ERROR_SUCCESS ||
+      type != REG_SZ) {
+    return 0;
+  }
+  if (count < static_cast<DWORD>(size)) buffer[count] = '\0';
+  return 1;
 }
 
 int32_t WriteItem(const char* path, const char* name, const char* buffer, int32_t size) {
@@ -187,10 +192,10 @@ int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const
 
 char* ProductGetItem(int32_t item, const char* service, const char* subKey, char* buffer,
                      int32_t size) {
-  constexpr int32_t kReadSize = 511;  // of 512: the last byte stays 0 and ends the text
+  constexpr int32_t kReadSize = 511;
   ItemPlace place;
   if (!PlaceItem(item, service, subKey, &place)) return nullptr;
-  char value[kReadSize + 1] = {};
+  char value[kReadSize] = {};
   const bool isRead = ProductAccessItem(item, place.service, place.kind, place.subKey, value,
                                         kReadSize, kOperationRead) == 1;
   // A value of 511 bytes without a NUL is cut to the 510 characters that a text can have.
@@ -206,7 +211,7 @@ char* ProductGetItem(int32_t item, const char* service, const char* subKey, char
     buffer[0] = '\0';
     return nullptr;
   }
-  value[size <= kReadSize ? size - 1 : kReadSize] = '\0';
+  if (size <= kReadSize) value[size - 1] = '\0';  // what the caller has room for
   (void)CopyText(buffer, static_cast<size_t>(size), value);
   return buffer;
 }

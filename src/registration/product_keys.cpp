@@ -4,21 +4,62 @@
 #include <cstring>
 #include <new>
 
+#include "platform/registry_key.h"
 #include "platform/text.h"
 #include "registration/product_registry.h"
 
 namespace {
+
+constexpr char kSoftwareKey[] = "SOFTWARE";
+constexpr char kMakerKey[] = "SOFTWARE\\Zeb";
+constexpr char kRootKey[] = "SOFTWARE\\Zeb\\Moriv";
+constexpr char kServicesKey[] = "SOFTWARE\\Zeb\\Moriv\\Services";
 
 constexpr char kServicesName[] = "Services";
 constexpr char kProductName[] = "Moriv";
 constexpr char kApplicationsName[] = "Applications";
 constexpr char kNetProfilesName[] = "NetProfiles";
 
+bool IsServiceName(const char* service) {
+  if (service == nullptr) return false;
+  const size_t length = strlen(service);
+  return length >= 3 && length <= 63;
+}
+
+bool IsSubKeyKind(int32_t kind) {
+  return kind == kKindApplication || kind == kKindNetProfile;
+}
+
+// The name of a kind's key under a service. The kind must be one.
+const char* SubKeyFolder(int32_t kind) {
+  return kind == kKindApplication ? kApplicationsName : kNetProfilesName;
+}
+
 // The key that holds the entries of a kind, or the services for a null service.
 bool BuildFolderPath(const char* service, int32_t kind, ProductPath& path) {
   if (service == nullptr) return CopyText(path, kServicesKey);
   return IsSubKeyKind(kind) && BuildProductPath(service, 0, nullptr, path) &&
          AppendText(path, "\\") && AppendText(path, SubKeyFolder(kind));
+}
+
+int32_t CreateRoot() {
+  RegistryKey software;
+  RegistryKey root;
+  RegistryKey services;
+  return software.Open(HKEY_LOCAL_MACHINE, kSoftwareKey, KEY_WRITE) &&
+         root.Create(software.get(), "Zeb\\Moriv") && services.Create(root.get(), kServicesName);
+}
+
+int32_t CreateService(const char* name) {
+  if (!IsServiceName(name)) return -1;
+  RegistryKey services;
+  RegistryKey service;
+  RegistryKey netProfiles;
+  RegistryKey applications;
+  return services.Open(HKEY_LOCAL_MACHINE, kServicesKey, KEY_WRITE) &&
+         service.Create(services.get(), name) &&
+         netProfiles.Create(service.get(), kNetProfilesName) &&
+         applications.Create(service.get(), kApplicationsName);
 }
 
 // Deletes `folder`\`name` below an open key. One that an earlier deletion took is no refusal.
@@ -64,20 +105,6 @@ int32_t DeleteService(const char* service) {
 
 }  // namespace
 
-bool IsServiceName(const char* service) {
-  if (service == nullptr) return false;
-  const size_t length = strlen(service);
-  return length >= 3 && length <= 63;
-}
-
-bool IsSubKeyKind(int32_t kind) {
-  return kind == kKindApplication || kind == kKindNetProfile;
-}
-
-const char* SubKeyFolder(int32_t kind) {
-  return kind == kKindApplication ? kApplicationsName : kNetProfilesName;
-}
-
 bool BuildProductPath(const char* service, int32_t kind, const char* subKey, ProductPath& path) {
   if (service == nullptr) return CopyText(path, kRootKey);
   if (!IsServiceName(service)) return false;
@@ -98,18 +125,7 @@ int32_t ProductRootExists(const char* service) {
 }
 
 int32_t ProductCreateTree(const char* service) {
-  RegistryKey parent;
-  RegistryKey key;
-  RegistryKey first;
-  RegistryKey second;
-  if (service == nullptr) {
-    return parent.Open(HKEY_LOCAL_MACHINE, kSoftwareKey, KEY_WRITE) &&
-           key.Create(parent.get(), "Zeb\\Moriv") && first.Create(key.get(), kServicesName);
-  }
-  if (!IsServiceName(service)) return -1;
-  return parent.Open(HKEY_LOCAL_MACHINE, kServicesKey, KEY_WRITE) &&
-         key.Create(parent.get(), service) && first.Create(key.get(), kNetProfilesName) &&
-         second.Create(key.get(), kApplicationsName);
+  return service != nullptr ? CreateService(service) : CreateRoot();
 }
 
 int32_t ProductDeleteTree(const char* service) {

@@ -10,9 +10,11 @@
 // are REG_SZ, written without their NUL. The setup program uses the root alone, with a null
 // service; the rest serves the programs that live in the tree.
 //
-// A service name has 3 to 63 characters, a profile or application name 1 to 63; a key path has at
-// most 127 and a value read at most 510. Results: 1 success; 0 the registry refused, or the key or
-// value isn't there; -1 an invalid argument (a refused item, a bad name or kind, a path too long).
+// A service name has 3 to 63 characters; a key path has at most 127 and a value read at most 510.
+// Deletions alone want 1 to 63 characters of a profile or application name: elsewhere the path is
+// its limit, and an empty name is the key that all of its kind lie in. Results: 1 success; 0 the
+// registry refused, or the key or value isn't there; -1 an invalid argument (a refused item, a bad
+// name or kind, a path too long).
 // Each call opens and closes its keys; nothing is kept between calls.
 #pragma once
 
@@ -51,9 +53,9 @@ struct KeyNameNode {
 // Items
 
 // The core of all item operations. A null service selects the root, a null subKey the service's own
-// key. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; the
-// text need not end in a NUL. 2 writes `size` bytes from the buffer; the key must exist. 3 deletes
-// the value; -1 when the registry refuses.
+// key. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; a
+// text that fills it has no NUL. 2 writes `size` bytes from the buffer; the key must exist. 3
+// deletes the value; -1 when the registry refuses.
 int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const char* subKey,
                           char* buffer, int32_t size, int32_t operation);
 
@@ -64,11 +66,13 @@ int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const
 char* ProductGetItem(int32_t item, const char* service, const char* subKey, char* buffer,
                      int32_t size);
 
+// Writes the text without its NUL. Makes no key. -1 also for a null text.
 int32_t ProductSetItem(int32_t item, const char* service, const char* subKey, const char* text);
 
 // Keys
 
-// 1 if the key opens for reading, else 0. A null service tests the root, a null subKey the service.
+// 1 if the key opens for reading, 0 if not. A null service tests the root, a null subKey the
+// service.
 int32_t ProductKeyExists(const char* service, int32_t kind, const char* subKey);
 int32_t ProductRootExists(const char* service);
 
@@ -77,7 +81,8 @@ int32_t ProductRootExists(const char* service);
 int32_t ProductCreateTree(const char* service);
 
 // Deletes the root, unless a service exists (-1), or one service with all below it. 0 when the
-// parent doesn't open, -1 when a deletion is refused. SOFTWARE\Zeb itself stays.
+// parent doesn't open, -1 when a deletion is refused; a key below that has gone already is no
+// refusal. SOFTWARE\Zeb itself stays.
 int32_t ProductDeleteTree(const char* service);
 
 // Deletes one entry of NetProfiles or Applications. 0 when the registry refuses.

@@ -26,6 +26,7 @@ bool LoadEntryName(char (&name)[kCatalogTextSize]) {
   return name[0] != '\0';
 }
 
+// That of the 9x family ends in a blank.
 bool FormatRunOnceCommand(const char* infPath, char* command, size_t size) {
   OSVERSIONINFOA version = {};
   version.dwOSVersionInfoSize = sizeof(version);

@@ -12,13 +12,15 @@
 // an earlier removal, so that the removal program just written stays.
 int WriteUninstallEntry(const SetupContext* context);
 
+// 0 also when there is no entry.
 int DeleteUninstallEntry();
 
 // Writes the INF file and registers the command.
 int ScheduleFinalCleanup();
 
-// Stores the command that processes the INF file at `infPath`; 0 also for a null or empty path.
+// Stores the command that processes the INF file at `infPath`. 0 also for a null or empty path, a
+// system that doesn't tell its directory, and a command above 519 characters.
 int WriteRunOnceCommand(const char* infPath);
 
-// 0 also when there was no command.
+// 0 also when there was no command. Makes the key of such commands where it is missing.
 int CancelRunOnceCommand();

@@ -69,7 +69,7 @@ void OpenWebAddress(HWND, const SetupContext* context) {
   if (AppendText(command, address)) StartCommand(command);
 }
 
-void OpenLogFile(HWND dialog) {
+void OpenLogFile(HWND dialog, const SetupContext*) {
   char path[kLogPathSize] = {};
   if (FindLogPath(path)) ShellExecuteA(dialog, "Open", path, nullptr, nullptr, SW_SHOW);
 }

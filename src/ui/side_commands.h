@@ -12,7 +12,7 @@ void BrowseForDirectory(HWND dialog, SetupContext* context);
 void OpenWebAddress(HWND dialog, const SetupContext* context);
 
 // Opens the log with the program that the system has for it.
-void OpenLogFile(HWND dialog);
+void OpenLogFile(HWND dialog, const SetupContext* context);
 
 // The command line that the system registers for web addresses. Returns 1, or 0 when there is none
 // or it doesn't fit.

@@ -459,7 +459,7 @@ void CarryOut(int id, SetupContext* context) {
       SelectListedLanguage();
       break;
     case IDC_DETAILS:
-      OpenLogFile(wizardState.window);
+      OpenLogFile(wizardState.window, context);
       break;
     default:
       break;
