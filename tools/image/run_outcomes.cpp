@@ -12,8 +12,7 @@ constexpr char kNothing[] = "Nothing.";
 constexpr char kReport[] = "This is a fault of the setup program: report it, with the log.";
 constexpr char kGetAnew[] =
     "Get the setup program anew: this one is damaged or was made wrong. \"moriv-image verify\" "
-    "says "
-    "where.";
+    "says where.";
 constexpr char kFreeMemory[] = "Close programs, and run it again.";
 
 constexpr RunOutcome kOutcomes[] = {
@@ -30,8 +29,7 @@ constexpr RunOutcome kOutcomes[] = {
      "and run it again."},
     {StatusCreateFileFailed, "StatusCreateFileFailed", "A target file can't be made.",
      "See to it that the directory of the file which the log names can be written, that nothing "
-     "else "
-     "bears its name and that the disk isn't full; run it again."},
+     "else bears its name and that the disk isn't full; run it again."},
     {StatusWriteRemovalFailed, "StatusWriteRemovalFailed", "The removal program can't be written.",
      "See to it that the Windows directory can be written, and run it again."},
     {StatusInternal, "StatusInternal",
@@ -39,8 +37,7 @@ constexpr RunOutcome kOutcomes[] = {
      kGetAnew},
     {StatusCreateDirFailed, "StatusCreateDirFailed", "A directory of a target path can't be made.",
      "See to it that the drive can be written and that no file bears the name of a directory in "
-     "the "
-     "path which the log names; run it again."},
+     "the path which the log names; run it again."},
     {StatusBadDirectory, "StatusBadDirectory", "No valid installation directory.",
      "Give one with /d:, in full and without quotes."},
     {StatusNoSystemDir, "StatusNoSystemDir",
@@ -65,8 +62,7 @@ constexpr RunOutcome kOutcomes[] = {
     {StatusExpandFailed, "StatusExpandFailed",
      "A stream is bad, or the disk is full while a file is written.",
      "Free space on the disk of the file which the log names, and run it again. If there was "
-     "enough, "
-     "get the setup program anew."},
+     "enough, get the setup program anew."},
     {StatusSeekFailed, "StatusSeekFailed",
      "The first record lies where no position reaches, or the system refused to go there.",
      kGetAnew},
@@ -74,15 +70,14 @@ constexpr RunOutcome kOutcomes[] = {
      "Services that use the product are still registered. Nothing was touched.",
      "Remove the services that the log names first, then run the removal again."},
     {StatusNoModulePath, "StatusNoModulePath", "The system doesn't tell the program its own path.",
-     "Put the setup program into a folder with a shorter path, and run it there."},
+     "Copy the setup program to a local disk, and run it there."},
     {StatusNoDiskSpace, "StatusNoDiskSpace",
      "The package needs more bytes than are free. Nothing was touched.",
      "Free space on the drive of the installation directory, or choose another one with /d:; run "
-     "it "
-     "again."},
+     "it again."},
     {StatusCopyFailed, "StatusCopyFailed", "A file can't be copied to its second or a later place.",
-     "Free space on the drive of the file which the log names, see to it that its directory can be "
-     "written, and run it again."},
+     "Free space on the drive of the file which the log names, see to it that its directory can "
+     "be written, and run it again."},
     {StatusNoVersion, "StatusNoVersion", "A version text is empty.", kReport},
     {StatusRemovalProgramFailed, "StatusRemovalProgramFailed",
      "The files stand, the removal program and the uninstall entry are missing.",
