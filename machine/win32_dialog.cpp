@@ -52,6 +52,11 @@ LRESULT SendToList(Window* list, UINT message, WPARAM wParam, LPARAM lParam) {
       return static_cast<LRESULT>(list->items.size());
     case CB_GETCURSEL:
       return list->selection;
+    case CB_RESETCONTENT:
+      machine::DeleteItems(*list);
+      list->items.clear();
+      list->selection = -1;
+      return TRUE;
     case CB_SETCURSEL:
       list->selection = HasItem(*list, wParam) ? static_cast<int>(wParam) : -1;
       list->needsDrawing = true;

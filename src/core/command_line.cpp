@@ -59,8 +59,8 @@ void ApplyOption(const char* text, SetupRequest* request) {
     request->language = row.language;
     return;
   }
-  (void)TakePath(text,
-                 "rf:", request->reportFile);  // the last test: what matches nothing is dropped
+  // The last test: what matches nothing is dropped.
+  (void)TakePath(text, "rf:", request->reportFile);
 }
 
 int ParseCommandLine(const char* line, SetupRequest* request) {

@@ -15,7 +15,7 @@ class DataFile;
 inline constexpr uint32_t OptionSilent = 1;       // no dialog
 inline constexpr uint32_t OptionRemove = 2;       // remove instead of install
 inline constexpr uint32_t OptionInteractive = 4;  // a dialog was asked for; nobody reads this bit
-inline constexpr uint32_t OptionRegister = 8;     // keep the entry in the system's uninstall list
+inline constexpr uint32_t OptionRegister = 8;     // make, or take back, the uninstall list's entry
 inline constexpr uint32_t OptionHelp = 16;        // show the help and stop
 inline constexpr uint32_t kDefaultOptions = OptionInteractive | OptionRegister;
 
@@ -39,8 +39,10 @@ struct SetupRequest {
 
 // A run. The request is its head. CloseSetup (package/package_reader.h) ends it.
 struct SetupContext : SetupRequest {
-  DataFile* packageFile;    // the image, open for reading; owned; null while the package is closed
-  PackageHeader header;     // copy of the header at the tail of the image
+  DataFile* packageFile;  // the image, open for reading; owned; null while the package is closed
+  // Read from the tail of the image. defaultLanguage then becomes the run's, and writing the
+  // removal program gives it that program's flag and length.
+  PackageHeader header;
   FileRecord* records;      // header.recordCount elements after an install pass; owned
   int32_t currentLanguage;  // language in force
   uint32_t messageId;       // catalog id of the text in the dialog's message area

@@ -13,14 +13,6 @@
 
 namespace {
 
-void Inform(SetupContext* context, uint32_t event, const char* text = nullptr) {
-  (void)AddEvent(&context->events, event, SeverityInformation, text);
-}
-
-void Warn(SetupContext* context, uint32_t event, const char* text = nullptr) {
-  (void)AddEvent(&context->events, event, SeverityWarning, text);
-}
-
 StatusCode GiveUp(SetupContext* context, uint32_t event, const char* text, StatusCode status) {
   (void)AddEvent(&context->events, event, SeverityFatal, text);
   return status;
@@ -48,17 +40,17 @@ StatusCode InstallSilently(SetupContext* context) {
   // The files stand. What fails from here on is told by the code and stops nothing.
   StatusCode code = RegisterProduct(context);
   if (code == StatusOk) {
-    Inform(context, EventRegistered);
+    Inform(&context->events, EventRegistered);
   } else {
-    Warn(context, EventNotRegistered);
+    Warn(&context->events, EventNotRegistered);
   }
   char removalProgram[kPathSize] = {};
   if (WriteRemovalProgram(context, removalProgram, sizeof(removalProgram)) != StatusOk) {
-    Warn(context, EventRemovalProgramFailed, removalProgram);
+    Warn(&context->events, EventRemovalProgramFailed, removalProgram);
     return StatusRemovalProgramFailed;
   }
   if ((context->options & OptionRegister) != 0) (void)WriteUninstallEntry(context);
-  Inform(context, EventRemovalProgramWritten, removalProgram);
+  Inform(&context->events, EventRemovalProgramWritten, removalProgram);
   return code;
 }
 
@@ -67,12 +59,12 @@ StatusCode RemoveSilently(SetupContext* context) {
   if (CheckDependingServices(services, sizeof(services)) == 0) {
     return GiveUp(context, EventServicesRemain, services, StatusServicesRemain);
   }
-  Inform(context, EventRemoving);
+  Inform(&context->events, EventRemoving);
   if (context->productFound == 1) {
     const StatusCode removed = RemoveProductFiles(context);
     if (removed != StatusOk) return removed;
   }
-  Inform(context, EventUnregistered);
+  Inform(&context->events, EventUnregistered);
   // Whatever the system refuses from here on is left to stand.
   (void)UnregisterProduct();
   if ((context->options & OptionRegister) != 0) (void)DeleteUninstallEntry();

@@ -38,10 +38,18 @@ StatusCode AddEvent(EventList* list, uint32_t code, uint32_t severity, const cha
   memset(added->text, 0, sizeof(added->text));
   if (text != nullptr) SetEventText(added, text);
 
-  delete[] list->entries;
+  if (oldCount != 0) delete[] list->entries;
   list->entries = entries;
   list->count = oldCount + 1;
   return StatusOk;
+}
+
+void Inform(EventList* list, uint32_t code, const char* text) {
+  (void)AddEvent(list, code, SeverityInformation, text);
+}
+
+void Warn(EventList* list, uint32_t code, const char* text) {
+  (void)AddEvent(list, code, SeverityWarning, text);
 }
 
 StatusCode FreeEventList(EventList* list) {

@@ -6,7 +6,7 @@
 
 #include "core/status.h"
 
-// Index into the log's table of texts (log/event_log.cpp).
+// Index into the log's table of texts (log/event_log.cpp). Code 0 has a text, and nobody adds it.
 enum EventCode : uint32_t {
   EventFoundRegistered = 1,
   EventFoundDirectory = 2,
@@ -75,6 +75,10 @@ StatusCode InitEventList(EventList* list);
 // StatusBadArgument for a null list, or StatusNoMemory with the list unchanged. Callers don't look
 // at the result: a failure to record never stops a sequence.
 StatusCode AddEvent(EventList* list, uint32_t code, uint32_t severity, const char* text);
+
+// Add an information, or a warning.
+void Inform(EventList* list, uint32_t code, const char* text = nullptr);
+void Warn(EventList* list, uint32_t code, const char* text = nullptr);
 
 // Frees the entries and leaves the list empty. An empty list is left alone. Returns 1, or
 // StatusBadArgument for a null list.

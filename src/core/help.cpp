@@ -15,12 +15,12 @@ void ReportNeededSpace(SetupContext* context, const char* sizeText, uint32_t nee
                    static_cast<unsigned long>(needed));
   (void)AddEvent(&context->events, EventSpaceNeeded, SeverityInformation, text);
   WriteReportFile(&context->events, context->reportFile);
-  (void)FreeEventList(&context->events);
 }
 
 }  // namespace
 
 void ShowHelp(SetupContext* context) {
+  if (context == nullptr) return;
   char help[kCatalogTextSize + 2 * kSizeTextSize + 1] = {};
   char caption[kCatalogTextSize] = {};
   LoadCatalogText(context, CatalogHelp, help, kCatalogTextSize);
@@ -40,4 +40,5 @@ void ShowHelp(SetupContext* context) {
   } else if (context->reportFile[0] != '\0') {
     ReportNeededSpace(context, sizeText, needed);
   }
+  (void)FreeEventList(&context->events);
 }

@@ -14,15 +14,16 @@ inline constexpr int IDC_MESSAGE = 901;  // the dialog's message area
 struct WizardState {
   HWND window;               // null while no dialog exists
   uint32_t cancelRequested;  // 1: the user has confirmed a stop
-  uint32_t busy;             // phase of the dialog's run
+  uint32_t busy;             // phase of the dialog's run, a Busy value of ui/wizard.cpp
   SetupContext* context;     // not owned
 };
 extern WizardState wizardState;
 
 // Shows the catalog text, with the file name under it if there is one, and keeps the id in
-// context->messageId. Context and file name may be null.
+// context->messageId. Context and file name may be null. Does nothing without a window.
 void ShowMessage(SetupContext* context, uint32_t id, const char* fileName);
 
-// Dispatches one waiting message of the dialog, if any, and answers the cancel flag. This is the
-// only re-entry of the program: the dialog's handlers can run inside it.
+// Dispatches one waiting message of the thread, for whatever window, if the dialog exists, and
+// answers the cancel flag. This is the only re-entry of the program: the dialog's handlers can run
+// inside it.
 uint32_t PollCancel();

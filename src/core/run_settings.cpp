@@ -36,7 +36,8 @@ bool AskFreeClusters(const char* root, uint64_t* bytes) {
   return true;
 }
 
-// The language to take when the command line gave none. The package's own is in the header.
+// The language to take when the command line gave none: the registered product's, else the
+// package's, else the system's.
 int32_t FindLanguage(const SetupContext& context) {
   SetupRequest registered = {};
   if (ReadRegisteredProduct(&registered) == 1 && registered.language != kLanguageNone) {

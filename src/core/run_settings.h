@@ -31,8 +31,9 @@ StatusCode CheckDiskSpace(const SetupContext* context);
 // a path without a backslash.
 bool GetFreeDiskSpace(const char* path, uint64_t* bytes);
 
-// Bytes that the package needs; 0 when it can't be opened. A package that is closed is opened for
-// the look and closed again.
+// Bytes that the package needs; 0 when it can't be opened, and for a null context. A package that
+// is closed is opened for the look and ended with CloseSetup, also when it could not be opened:
+// events and records that the context held are gone then.
 uint32_t GetNeededSpace(SetupContext* context);
 
 // Whether the text can be an installation directory: 1 or 0. Cuts trailing blanks in place. Only

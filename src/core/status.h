@@ -32,7 +32,7 @@ inline constexpr StatusCode StatusNoDiskSpace = -1000020;
 inline constexpr StatusCode StatusCopyFailed = -1000021;
 inline constexpr StatusCode StatusNoVersion = 100001;
 inline constexpr StatusCode StatusRemovalProgramFailed = 100002;
-// 100003 is retired.
+// 100003 is not in use.
 inline constexpr StatusCode StatusNotRegistered = 100004;
 inline constexpr StatusCode StatusNoNetscape = 100005;
 inline constexpr StatusCode StatusNoExplorer = 100006;

@@ -4,7 +4,8 @@
 #include "core/event_list.h"
 #include "platform/text.h"
 
-enum class LogMode { kAppend = 0, kNew = 1 };
+// kNew makes the file anew; kAppend adds at its end, and makes it when it isn't there.
+enum class LogMode { kAppend, kNew };
 
 // Room for the standard log's full path: a directory and a name.
 inline constexpr size_t kLogPathSize = 2 * kPathSize;
@@ -16,9 +17,9 @@ const char* EventText(uint32_t code);
 bool FindLogPath(char (&path)[kLogPathSize]);
 
 // Writes one block, a heading with the local time and a line for each event, to the file at `path`,
-// or to the standard log for a null or empty path. A list
-// without events leaves the file as it was. A log that can't be written is left out without a word:
-// the work of the run is done by then.
+// or to the standard log for a null or empty path. A list that is null or has no events leaves the
+// file as it was. A log that can't be written is left out without a word: the work of the run is
+// done by then.
 void WriteEventLog(const EventList* list, const char* path, LogMode mode);
 
 // Appends the block to the report file; does nothing for a null or empty path.

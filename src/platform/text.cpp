@@ -3,6 +3,14 @@
 #include <cstdarg>
 #include <cstdio>
 
+namespace {
+
+char LowerCase(char c) {
+  return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+}  // namespace
+
 bool CopyText(char* destination, size_t size, const char* text) {
   const size_t length = strlen(text);
   if (length >= size) return false;
@@ -36,14 +44,6 @@ void CutTrailingBlanks(char* text) {
   size_t length = strlen(text);
   while (length > 1 && text[length - 1] == ' ') text[--length] = '\0';
 }
-
-namespace {
-
-char LowerCase(char c) {
-  return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
-}  // namespace
 
 bool EqualIgnoringCase(const char* a, const char* b) {
   while (*a != '\0' && LowerCase(*a) == LowerCase(*b)) ++a, ++b;

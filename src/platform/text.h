@@ -1,4 +1,5 @@
 // Bounded work on 8-bit, NUL-terminated texts in fixed buffers. Sizes are bytes, the NUL included.
+// No text may be null, but for IsMissingOrEmpty.
 #pragma once
 
 #include <cstddef>

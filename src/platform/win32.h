@@ -3,7 +3,9 @@
 // This is the one file that includes <windows.h>. The native build has no Windows: there the same
 // subset of types, constants and functions is declared below, and the stand-in machine implements
 // it. Product code calls the Win32 names themselves in both builds; which implementation answers is
-// decided by the linker. The functions declared here are also all that the program may import.
+// decided by the linker. Of the system's functions the program may import those declared here and
+// no others, except the last group, which it looks up; tools/imports/ has the list, with the
+// runtime's.
 #pragma once
 
 #ifdef _WIN32
@@ -52,7 +54,6 @@ typedef void* HANDLE;
 typedef void* HGLOBAL;
 typedef void* HGDIOBJ;
 typedef DWORD* LPDWORD;
-typedef DWORD* PDWORD;
 typedef UINT* PUINT;
 typedef DWORD REGSAM;
 typedef intptr_t (*FARPROC)();
@@ -127,15 +128,9 @@ typedef ULARGE_INTEGER* PULARGE_INTEGER;
 
 #define ERROR_SUCCESS              0
 #define ERROR_FILE_NOT_FOUND       2
-#define ERROR_PATH_NOT_FOUND       3
 #define ERROR_ACCESS_DENIED        5
 #define ERROR_INVALID_HANDLE       6
-#define ERROR_SHARING_VIOLATION    32
 #define ERROR_INVALID_PARAMETER    87
-#define ERROR_DISK_FULL            112
-#define ERROR_NEGATIVE_SEEK        131
-#define ERROR_DIR_NOT_EMPTY        145
-#define ERROR_ALREADY_EXISTS       183
 #define ERROR_MORE_DATA            234
 #define ERROR_NO_MORE_ITEMS        259
 
@@ -182,6 +177,7 @@ typedef SYSTEMTIME* LPSYSTEMTIME;
 #define CB_ADDSTRING               0x0143u
 #define CB_GETCOUNT                0x0146u
 #define CB_GETCURSEL               0x0147u
+#define CB_RESETCONTENT            0x014Bu
 #define CB_SETCURSEL               0x014Eu
 #define CB_SETITEMDATA             0x0151u
 #define CB_GETITEMDATA             0x0150u

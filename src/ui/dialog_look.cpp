@@ -10,7 +10,6 @@ namespace {
 
 constexpr COLORREF kBlue = 0xFF0000;
 constexpr COLORREF kWhite = 0xFFFFFF;
-constexpr COLORREF kDarkGreen = 0x6400;
 
 struct DialogFont {
   DWORD italic;
@@ -84,7 +83,7 @@ void DeleteFonts() {
   }
 }
 
-void AssignFonts(HWND dialog) {
+void DressControls(HWND dialog) {
   SetFont(dialog, IDC_BANNER, kBannerFont);
   SetFont(dialog, IDC_LINK, kLinkFont);
   MakeOwnerDrawn(GetDlgItem(dialog, IDC_LINK));

@@ -19,9 +19,12 @@ StatusCode ShowSpaceLine(HWND dialog, const SetupContext* context);
 void CreateFonts();
 void DeleteFonts();
 
-// Gives the controls their fonts, and the web address and the label their owner drawing.
-void AssignFonts(HWND dialog);
+inline constexpr COLORREF kDarkGreen = 0x6400;  // of the language label and its list
 
-// Draw the two. The web address is read from the catalog at its first drawing and kept.
+// Gives the controls their fonts, and the web address and the label their owner drawing.
+void DressControls(HWND dialog);
+
+// Draw the web address and the language label. The address is read from the catalog at its first
+// drawing and kept.
 void DrawWebAddress(const SetupContext* context, const DRAWITEMSTRUCT& item);
 void DrawLanguageLabel(const SetupContext* context, const DRAWITEMSTRUCT& item);

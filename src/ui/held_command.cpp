@@ -5,8 +5,8 @@
 namespace {
 
 struct HeldCommand {
-  bool isHolding;
-  bool isHeld;
+  bool isOpen;
+  bool hasCommand;
   WPARAM command;
   HWND control;  // null for Escape and the close box
 };
@@ -24,13 +24,13 @@ bool IsStillOffered() {
 
 void HoldCommands() {
   held = {};
-  held.isHolding = true;
+  held.isOpen = true;
 }
 
 bool HoldCommand(WPARAM command, HWND control) {
-  if (!held.isHolding) return false;
-  if (!held.isHeld) {
-    held.isHeld = true;
+  if (!held.isOpen) return false;
+  if (!held.hasCommand) {
+    held.hasCommand = true;
     held.command = command;
     held.control = control;
   }
@@ -38,8 +38,8 @@ bool HoldCommand(WPARAM command, HWND control) {
 }
 
 void ReleaseCommands() {
-  held.isHolding = false;
-  if (held.isHeld && IsStillOffered()) {
+  held.isOpen = false;
+  if (held.hasCommand && IsStillOffered()) {
     PostMessageA(wizardState.window, WM_COMMAND, held.command,
                  reinterpret_cast<LPARAM>(held.control));
   }

@@ -7,13 +7,13 @@
 #include "package/paths.h"
 #include "ui/catalog.h"
 #include "ui/control_ids.h"
+#include "ui/dialog_look.h"
 
 namespace {
 
 constexpr WORD kFirstFlag = 120;
 constexpr int kUsualCount = 5;
 constexpr int kMostLanguages = 10;
-constexpr COLORREF kDarkGreen = 0x6400;
 
 HWND List(HWND dialog) {
   return GetDlgItem(dialog, IDC_LANGUAGE);
@@ -97,19 +97,22 @@ int BuildLanguageList(HWND dialog, LanguageListArt* art) {
   const HWND list = List(dialog);
   if (list == nullptr) return 0;  // nobody would own the items
   const int count = CountLanguages();
-  LanguageItem* last = nullptr;
+  HBITMAP flag = nullptr;
   for (int entry = 0; entry < count; ++entry) {
-    last = AddItem(list, entry);
-    if (last != nullptr) continue;
-    FreeLanguageList(dialog, art);
-    ShowWindow(list, SW_HIDE);
-    return 0;
+    const LanguageItem* const item = AddItem(list, entry);
+    if (item == nullptr) {
+      FreeLanguageList(dialog, art);
+      SendMessageA(list, CB_RESETCONTENT, 0, 0);  // the entries, which hold no items any more
+      ShowWindow(list, SW_HIDE);
+      return 0;
+    }
+    flag = item->bitmap;
   }
   const HDC dc = GetDC(dialog);
   art->selectedBrush = CreateSolidBrush(GetSysColor(COLOR_HIGHLIGHT));
   art->normalBrush = CreateSolidBrush(GetSysColor(COLOR_WINDOW));
   art->memoryDC = CreateCompatibleDC(dc);
-  if (last != nullptr) GetObjectA(last->bitmap, sizeof(art->bitmapInfo), &art->bitmapInfo);
+  GetObjectA(flag, sizeof(art->bitmapInfo), &art->bitmapInfo);
   ReleaseDC(dialog, dc);
   return 1;
 }

@@ -4,7 +4,8 @@
 // hides, relabels and renumbers. The work moves forward through private messages that the dialog
 // posts to itself: each step does one thing, posts the next and returns to the message loop, so
 // that the window paints between steps. A pass runs inside its step and dispatches waiting messages
-// one at a time (PollCancel), so any handler here can run in the middle of one.
+// one at a time (PollCancel), so a command can arrive in the middle of one: OnCommand decides which
+// then count.
 #include "ui/wizard.h"
 
 #include <initializer_list>
@@ -67,10 +68,6 @@ void SelectLanguage(int32_t language) {
   Post(WM_SET_LANGUAGE, static_cast<WPARAM>(language));
 }
 
-void Inform(SetupContext* context, uint32_t event, const char* text = nullptr) {
-  (void)AddEvent(&context->events, event, SeverityInformation, text);
-}
-
 // ---- The two ends of a run
 
 void MakeDetailsButton(const SetupContext* context) {
@@ -94,7 +91,8 @@ void MakeEndButton(int id, int32_t language) {
   SetFocus(Control(id));
 }
 
-// Without a context the page stands all the same, in the catalog's first set.
+// Without a context the page stands all the same: its message from the set at offset 0, its button
+// in French.
 void FailRun(SetupContext* context, StatusCode status) {
   wizardState.cancelRequested = 0;
   wizardState.busy = BusyFailed;
@@ -116,7 +114,7 @@ void SucceedRun(SetupContext* context, uint32_t message, uint32_t event) {
   Renumber(IDCANCEL, IDOK);
   MakeDetailsButton(context);
   MakeEndButton(IDOK, context->currentLanguage);
-  Inform(context, event);
+  Inform(&context->events, event);
   WriteLogs(&context->events, context->reportFile);
   context->result = StatusOk;
 }
@@ -141,7 +139,7 @@ void InitDialog(HWND dialog, SetupContext* context) {
   wizardState.busy = BusyIdle;
   BuildLanguageList(dialog, &languageArt);
   CreateFonts();
-  AssignFonts(dialog);
+  DressControls(dialog);
   HideWorkControls();
   if (context != nullptr) {
     context->messageId = 0;
@@ -229,7 +227,8 @@ void FailForServices(SetupContext* context, const char* services) {
   FailRun(context, StatusServicesRemain);
 }
 
-void ShowPage(SetupContext* context) {
+// Shows none when there is nothing to remove, or services stand in the way of a removal.
+void ChoosePage(SetupContext* context) {
   (void)FindInstalledProduct(context);
   const bool isRemoval = (context->options & OptionRemove) != 0;
   const bool isFound = context->productFound == 1;
@@ -271,7 +270,7 @@ void ShowPage(SetupContext* context) {
 // Its check for older files dispatches messages; what the user clicks meanwhile waits for its end.
 void SetUpPage(SetupContext* context) {
   HoldCommands();
-  ShowPage(context);
+  ChoosePage(context);
   ReleaseCommands();
 }
 
@@ -285,6 +284,7 @@ void RefuseDirectory() {
 }
 
 void StartInstall(SetupContext* context) {
+  if (context == nullptr) return;
   context->language = context->currentLanguage;
   context->header.defaultLanguage = context->currentLanguage;
   char directory[kPathSize] = {};
@@ -296,14 +296,14 @@ void StartInstall(SetupContext* context) {
   }
   (void)CopyText(context->installDir, directory);  // the same size
   if (CheckDiskSpace(context) != StatusOk) {
-    (void)AddEvent(&context->events, EventNoDiskSpace, SeverityWarning, context->installDir);
+    Warn(&context->events, EventNoDiskSpace, context->installDir);
     ShowMessage(context, Exists(IDC_UPDATE) ? CatalogNoSpace : CatalogNoSpaceChooseOther, nullptr);
     RefuseDirectory();
     return;
   }
   HideWorkControls();
   const bool isUpdate = context->productFound == 1;
-  Inform(context, isUpdate ? EventUpdating : EventInstalling);
+  Inform(&context->events, isUpdate ? EventUpdating : EventInstalling);
   ShowMessage(context, isUpdate ? CatalogUpdateBegins : CatalogInstallBegins, nullptr);
   wizardState.busy = BusyWorking;
   Post(WM_STEP_COPY);
@@ -321,9 +321,9 @@ void CopyFiles(SetupContext* context) {
 void Register(SetupContext* context) {
   ShowMessage(context, CatalogRegistering, nullptr);
   if (RegisterProduct(context) == StatusOk) {
-    Inform(context, EventRegistered);
+    Inform(&context->events, EventRegistered);
   } else {
-    (void)AddEvent(&context->events, EventNotRegistered, SeverityWarning, nullptr);
+    Warn(&context->events, EventNotRegistered);
   }
   Post(WM_STEP_REMOVAL_PROGRAM);
 }
@@ -332,9 +332,9 @@ void LeaveRemovalProgram(SetupContext* context) {
   char path[kPathSize] = {};
   if (WriteRemovalProgram(context, path, sizeof(path)) == StatusOk) {
     if ((context->options & OptionRegister) != 0) (void)WriteUninstallEntry(context);
-    Inform(context, EventRemovalProgramWritten, path);
+    Inform(&context->events, EventRemovalProgramWritten, path);
   } else {
-    (void)AddEvent(&context->events, EventRemovalProgramFailed, SeverityWarning, path);
+    Warn(&context->events, EventRemovalProgramFailed, path);
   }
   Post(WM_STEP_INSTALL_DONE);
 }
@@ -347,7 +347,8 @@ void FinishInstall(SetupContext* context) {
 // ---- Removal: all in one handler, then REMOVAL_DONE
 
 void StartRemoval(SetupContext* context) {
-  Inform(context, EventRemoving);
+  if (context == nullptr) return;
+  Inform(&context->events, EventRemoving);
   HideWorkControls();
   SetTitle(CatalogRemovalTitle, *context);
   char services[kEventTextSize] = {};
@@ -364,7 +365,7 @@ void StartRemoval(SetupContext* context) {
       return;
     }
   }
-  Inform(context, EventUnregistered);
+  Inform(&context->events, EventUnregistered);
   (void)UnregisterProduct();
   if ((context->options & OptionRegister) != 0) (void)DeleteUninstallEntry();
   (void)ScheduleFinalCleanup();
@@ -405,65 +406,47 @@ void SelectListedLanguage() {
   if (item != nullptr) Post(WM_SET_LANGUAGE, static_cast<WPARAM>(item->languageOffset));
 }
 
-// Whether the table of commands knows a command, told by its id and notification.
-bool IsCommand(int id, WORD notification) {
-  switch (id) {
-    case IDC_LOGO:
-    case IDC_LINK:
-      return notification == STN_CLICKED;
-    case IDC_LANGUAGE:
-      return notification == CBN_SELCHANGE;
-    case IDOK:
-    case IDCANCEL:
-    case IDC_BROWSE:
-    case IDC_FAILURE_END:
-    case IDC_NEXT:
-    case IDC_UPDATE:
-    case IDC_REMOVE:
-    case IDC_DETAILS:
-      return true;
-    default:
-      return false;
-  }
+// A side command of the dialog.
+template <auto kSideCommand>
+void AsCommand(SetupContext* context) {
+  kSideCommand(wizardState.window, context);
 }
+
+constexpr WORD kAnyNotification = UINT16_MAX;
+constexpr uint32_t kAnyPhase = UINT32_MAX;
+
+struct CommandRow {
+  int id;
+  WORD notification;
+  uint32_t phase;  // a value of `busy`
+  void (*carryOut)(SetupContext* context);
+};
 
 // A command that starts or ends something does so only in the phase whose page offers it: the key
 // Enter gives command 1 also while no page stands, and a second click can be under way when the
 // first has hidden the button.
-void CarryOut(int id, SetupContext* context) {
-  switch (id) {
-    case IDOK:
-      if (wizardState.busy == BusyDone && context != nullptr) CloseWizard(context->result);
-      break;
-    case IDCANCEL:
-      AskCancel(context);
-      break;
-    case IDC_FAILURE_END:
-      if (wizardState.busy == BusyFailed) CloseWizard(StatusDialogAborted);
-      break;
-    case IDC_LOGO:
-    case IDC_LINK:
-      OpenWebAddress(wizardState.window, context);
-      break;
-    case IDC_BROWSE:
-      BrowseForDirectory(wizardState.window, context);
-      break;
-    case IDC_NEXT:
-    case IDC_UPDATE:
-      if (wizardState.busy == BusyIdle && context != nullptr) StartInstall(context);
-      break;
-    case IDC_REMOVE:
-      if (wizardState.busy == BusyIdle && context != nullptr) StartRemoval(context);
-      break;
-    case IDC_LANGUAGE:
-      SelectListedLanguage();
-      break;
-    case IDC_DETAILS:
-      OpenLogFile(wizardState.window, context);
-      break;
-    default:
-      break;
+constexpr CommandRow kCommands[] = {
+    {IDOK, kAnyNotification, BusyDone, [](SetupContext* context) { CloseWizard(context->result); }},
+    {IDCANCEL, kAnyNotification, kAnyPhase, AskCancel},
+    {IDC_FAILURE_END, kAnyNotification, BusyFailed,
+     [](SetupContext*) { CloseWizard(StatusDialogAborted); }},
+    {IDC_LOGO, STN_CLICKED, kAnyPhase, AsCommand<OpenWebAddress>},
+    {IDC_LINK, STN_CLICKED, kAnyPhase, AsCommand<OpenWebAddress>},
+    {IDC_BROWSE, kAnyNotification, kAnyPhase, AsCommand<BrowseForDirectory>},
+    {IDC_NEXT, kAnyNotification, BusyIdle, StartInstall},
+    {IDC_UPDATE, kAnyNotification, BusyIdle, StartInstall},
+    {IDC_REMOVE, kAnyNotification, BusyIdle, StartRemoval},
+    {IDC_LANGUAGE, CBN_SELCHANGE, kAnyPhase, [](SetupContext*) { SelectListedLanguage(); }},
+    {IDC_DETAILS, kAnyNotification, kAnyPhase, AsCommand<OpenLogFile>},
+};
+
+const CommandRow* FindCommand(WPARAM command) {
+  for (const CommandRow& row : kCommands) {
+    const bool isNotified =
+        row.notification == kAnyNotification || row.notification == HIWORD(command);
+    if (row.id == LOWORD(command) && isNotified) return &row;
   }
+  return nullptr;
 }
 
 // The system disables the dialog for as long as a box or the folder picker stands. No user can mean
@@ -474,9 +457,10 @@ bool IsUnderABox() {
 }
 
 void OnCommand(WPARAM command, HWND control) {
-  const int id = LOWORD(command);
-  if (wizardState.window == nullptr || !IsCommand(id, HIWORD(command)) || IsUnderABox()) return;
-  if (!HoldCommand(command, control)) CarryOut(id, wizardState.context);
+  const CommandRow* const row = FindCommand(command);
+  if (wizardState.window == nullptr || row == nullptr || IsUnderABox()) return;
+  if (HoldCommand(command, control)) return;
+  if (row->phase == kAnyPhase || row->phase == wizardState.busy) row->carryOut(wizardState.context);
 }
 
 // ---- Messages

@@ -98,9 +98,8 @@ class DescriptionReader {
     if (const toml::node* language = package.get("default_language")) ReadLanguage(*language);
     if (const toml::node* space = package.get("space_needed")) {
       const auto* number = space->as_integer();
-      if (number == nullptr || number->get() < 0 ||
-          static_cast<uint64_t>(number->get()) > kLargestSize) {
-        Fail(LineOf(*space), "\"space_needed\" is to be a number of bytes from 0 to 2147483647");
+      if (number == nullptr || number->get() < 0 || number->get() > int64_t{UINT32_MAX}) {
+        Fail(LineOf(*space), "\"space_needed\" is to be a number of bytes from 0 to 4294967295");
       }
       description_.spaceNeeded = static_cast<uint32_t>(number->get());
     }
