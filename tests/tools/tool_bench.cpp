@@ -15,23 +15,6 @@ namespace fs = std::filesystem;
 
 namespace {
 
-using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
-
-ToolRun RunTool(Tool tool, std::vector<std::string> arguments, const fs::path& folder) {
-  for (std::string& argument : arguments) {
-    if (argument.starts_with('@')) argument = (folder / argument.substr(1)).string();
-  }
-  std::vector<const char*> argv = {"tool"};
-  for (const std::string& argument : arguments) argv.push_back(argument.c_str());
-  std::ostringstream out;
-  std::ostringstream err;
-  ToolRun run;
-  run.status = tool(static_cast<int>(argv.size()), argv.data(), out, err);
-  run.out = out.str();
-  run.err = err.str();
-  return run;
-}
-
 template <class Record>
 Record RecordAt(const std::vector<uint8_t>& image, size_t offset) {
   Record record;
@@ -76,11 +59,33 @@ std::vector<std::string> ToolBench::NamesIn(const std::string& folder) const {
 }
 
 ToolRun ToolBench::RunImage(const std::vector<std::string>& arguments) const {
-  return RunTool(image::RunImageTool, arguments, folder_.Path());
+  return Run(image::RunImageTool, arguments);
 }
 
 ToolRun ToolBench::RunMachine(const std::vector<std::string>& arguments) const {
-  return RunTool(machine_tool::RunMachineTool, arguments, folder_.Path());
+  return Run(machine_tool::RunMachineTool, arguments);
+}
+
+ToolRun ToolBench::Run(Tool tool, std::vector<std::string> arguments) const {
+  std::vector<const char*> argv = {"tool"};
+  for (std::string& argument : arguments) {
+    if (argument.starts_with('@')) argument = Path(argument.substr(1)).string();
+    argv.push_back(argument.c_str());
+  }
+  const std::vector<std::string> before = NamesIn(".");
+  std::ostringstream out;
+  std::ostringstream err;
+  const int status = tool(static_cast<int>(argv.size()), argv.data(), out, err);
+  if (status == 2) {
+    EXPECT_EQ(err.str().find('\n'), err.str().size() - 1) << err.str();
+    EXPECT_EQ(NamesIn("."), before) << err.str();
+  }
+  return {status, out.str(), err.str()};
+}
+
+void ToolBench::ExpectRefused(const ToolRun& run, const std::string& said) {
+  EXPECT_EQ(run.status, 2) << said;
+  EXPECT_NE(run.err.find(said), std::string::npos) << said << ": " << run.err;
 }
 
 const char* ToolBench::SampleDescription() {

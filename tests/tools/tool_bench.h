@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <functional>
+#include <iosfwd>
 #include <span>
 #include <string>
 #include <vector>
@@ -30,10 +31,14 @@ class ToolBench : public testing::Test {
   // Names of all that stands in a folder, sorted.
   std::vector<std::string> NamesIn(const std::string& folder) const;
 
-  // Runs moriv-image; an argument "@name" is a path in the test's folder.
+  // Runs moriv-image; an argument "@name" is a path in the test's folder. A run that is refused
+  // says so in one line and leaves the folder as it was.
   ToolRun RunImage(const std::vector<std::string>& arguments) const;
   // The same with moriv-machine.
   ToolRun RunMachine(const std::vector<std::string>& arguments) const;
+
+  // It was refused, and this is a part of what it said.
+  static void ExpectRefused(const ToolRun& run, const std::string& said = "");
 
   // Writes stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (random), empty.txt and setup.toml,
   // and packs them as image.exe, which must succeed.
@@ -50,6 +55,9 @@ class ToolBench : public testing::Test {
   size_t RecordOffset(const std::string& image, size_t number) const;
 
  private:
+  using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
+  ToolRun Run(Tool tool, std::vector<std::string> arguments) const;
+
   TemporaryFolder folder_;
 };
 
