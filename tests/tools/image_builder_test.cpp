@@ -9,6 +9,7 @@
 #include <string>
 #include <utility>
 
+#include "tests/support/test_image.h"
 #include "tests/tools/tool_bench.h"
 #include "tools/image/output_file.h"
 #include "tools/image/record_text.h"
@@ -16,7 +17,7 @@
 
 namespace {
 
-class ImageBuilder : public ToolBench {
+class ImagePacking : public ToolBench {
  protected:
   ToolRun Pack(const std::string& description, const std::string& stub = "@stub.exe",
                const std::string& output = "@new.exe") const {
@@ -44,10 +45,10 @@ std::string WithDirectory(const std::string& directory) {
 
 }  // namespace
 
-TEST_F(ImageBuilder, WritesEveryFieldOfHeaderAndRecords) {
+TEST_F(ImagePacking, WritesEveryFieldOfHeaderAndRecords) {
   PackSample();
-  const std::string stub = ReadText("stub.exe");
-  const std::string image = ReadText("image.exe");
+  const std::string stub = Read("stub.exe");
+  const std::string image = Read("image.exe");
   EXPECT_TRUE(image.starts_with(stub));
 
   const PackageHeader header = HeaderOf("image.exe");
@@ -76,21 +77,19 @@ TEST_F(ImageBuilder, WritesEveryFieldOfHeaderAndRecords) {
   EXPECT_EQ(RecordOffset("image.exe", 3), image.size() - 568);
 }
 
-TEST_F(ImageBuilder, DependsOnNothingButItsInputs) {
+TEST_F(ImagePacking, DependsOnNothingButItsInputs) {
   PackSample();
-  std::filesystem::create_directory(Path("elsewhere"));
-  std::filesystem::copy_file(Path("setup.toml"), Path("elsewhere/other.toml"));
+  std::filesystem::create_directory(Host("elsewhere"));
+  std::filesystem::copy_file(Host("setup.toml"), Host("elsewhere/other.toml"));
   const ToolRun run = RunImage({"pack", "@elsewhere/other.toml", "--stub", "@stub.exe", "-o",
                                 "@second.exe", "--source-dir", "@"});
   ASSERT_EQ(run.status, 0) << run.err;
   EXPECT_TRUE(Read("image.exe") == Read("second.exe"));
 }
 
-TEST_F(ImageBuilder, MakesASmallerImageWithBest) {
+TEST_F(ImagePacking, MakesASmallerImageWithBest) {
   PackSample();
-  std::vector<uint8_t> changing = RandomBytes(20'000, 1);
-  changing.resize(60'000, 'x');
-  Write("a.exe", changing);
+  Write("a.exe", RandomBytes(20'000, 1) + std::string(40'000, 'x'));
   ASSERT_EQ(Pack("@setup.toml").status, 0);
   const ToolRun best =
       RunImage({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@best.exe", "--best"});
@@ -98,11 +97,11 @@ TEST_F(ImageBuilder, MakesASmallerImageWithBest) {
   EXPECT_LT(Read("best.exe").size(), Read("new.exe").size());
 }
 
-TEST_F(ImageBuilder, LeavesNothingWhenItIsInterrupted) {
+TEST_F(ImagePacking, LeavesNothingWhenItIsInterrupted) {
   const auto interrupt = [this] {
     image::DeleteTemporaryFilesOnSignal();
-    const image::OutputFile one(Path("one.exe"), image::OutputFile::Kind::kProgram);
-    const image::OutputFile two(Path("two.exe"), image::OutputFile::Kind::kProgram);
+    const image::OutputFile one(Host("one.exe"), image::OutputFile::Kind::kProgram);
+    const image::OutputFile two(Host("two.exe"), image::OutputFile::Kind::kProgram);
     if (NamesIn(".").size() == 2) kill(getpid(), SIGTERM);
     sleep(60);
   };
@@ -110,15 +109,15 @@ TEST_F(ImageBuilder, LeavesNothingWhenItIsInterrupted) {
   EXPECT_TRUE(NamesIn(".").empty());
 }
 
-TEST_F(ImageBuilder, RefusesMoreThanTheFormatHolds) {
+TEST_F(ImagePacking, RefusesMoreThanTheFormatHolds) {
   PackSample();
   const std::string file = "[[file]]\nsource = 'empty.txt'\nname = 'x'\ndestination = '";
   std::string tooMany;
   for (int i = 0; i < 65536; ++i) tooMany += file + std::to_string(i) + "'\n";
   const uint64_t gibibyte = uint64_t{1} << 30;
   for (const auto& [name, size] : {std::pair{"half.bin", gibibyte}, {"whole.bin", 2 * gibibyte}}) {
-    Write(name, std::string());
-    std::filesystem::resize_file(Path(name), size);  // takes no room
+    Write(name, "");
+    std::filesystem::resize_file(Host(name), size);  // takes no room
   }
   const struct {
     std::string description, stub, said;
@@ -131,14 +130,14 @@ TEST_F(ImageBuilder, RefusesMoreThanTheFormatHolds) {
        "@stub.exe", "2 GiB or more together"},
       {SampleDescription(), "@whole.bin", "whole.bin: has 2 GiB or more"},
   };
-  Write("full.toml", std::string());
+  Write("full.toml", "");
   for (const auto& [description, packedStub, said] : rows) {
     Write("full.toml", description);
     ExpectRefused(Pack("@full.toml", packedStub), said);
   }
 }
 
-TEST_F(ImageBuilder, MakesARemovalProgramOfADescriptionThatSaysSo) {
+TEST_F(ImagePacking, MakesARemovalProgramOfADescriptionThatSaysSo) {
   PackSample();
   std::string text = SampleDescription();
   Write("removal.toml", text.insert(text.find('\n') + 1, "removal = true\n"));
@@ -147,7 +146,7 @@ TEST_F(ImageBuilder, MakesARemovalProgramOfADescriptionThatSaysSo) {
   EXPECT_TRUE(Read("new.exe") == Read("cut.exe"));
 }
 
-TEST_F(ImageBuilder, RefusesBadDescriptionsWithTheirLine) {
+TEST_F(ImagePacking, RefusesBadDescriptionsWithTheirLine) {
   PackSample();
   const std::string longPart(120, 'd');
   const struct {
@@ -208,12 +207,12 @@ TEST_F(ImageBuilder, RefusesBadDescriptionsWithTheirLine) {
   for (const auto& [text, line, said] : rows) {
     const ToolRun run = PackText(text);
     ExpectRefused(run, said);
-    const std::string place = Path("setup.toml").string() + ":" + std::to_string(line) + ": ";
+    const std::string place = Host("setup.toml").string() + ":" + std::to_string(line) + ": ";
     EXPECT_TRUE(run.err.starts_with("moriv-image: " + place)) << text << run.err;
   }
 }
 
-TEST_F(ImageBuilder, TakesWhatIsOnlyUnusual) {
+TEST_F(ImagePacking, TakesWhatIsOnlyUnusual) {
   PackSample();
   // C:\ and 119 + 1 + 120 + 1 + 9 and \a.exe: a path of exactly 259.
   std::string longPath(250, 'd');
@@ -231,11 +230,11 @@ TEST_F(ImageBuilder, TakesWhatIsOnlyUnusual) {
   EXPECT_STREQ(RecordOf("new.exe", 0).fileName, "\xE9t\xE9.txt");  // in the code page
 }
 
-TEST_F(ImageBuilder, RefusesStubsAndSourcesThatWillNotDo) {
+TEST_F(ImagePacking, RefusesStubsAndSourcesThatWillNotDo) {
   PackSample();
   Write("text.exe", "no program at all");
-  Write("nameless.exe", MakeProgram("1.0", false));
-  Write("ageless.exe", MakeProgram(""));
+  Write("nameless.exe", ProgramWithStrings({{"FileVersion", "1.0"}}, false));
+  Write("ageless.exe", ProgramWithStrings({}));
   Write("sourceless.toml", "[[file]]\nsource = 'missing.exe'\ndestination = 'x'\n");
   Write("folder.toml", "[[file]]\nsource = '.'\nname = 'x'\ndestination = 'x'\n");
   Write("fileless.toml", "[package]\n");

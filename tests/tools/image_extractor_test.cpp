@@ -32,15 +32,15 @@ TEST_F(ImageExtractor, GivesBackWhatWasPackedAllOrByName) {
 
 TEST_F(ImageExtractor, ReplacesOnlyWhenForcedAndNeverBehindALink) {
   PackSample();
-  std::filesystem::create_directory(Path("out"));
+  std::filesystem::create_directory(Host("out"));
   Write("mine", "mine");
-  std::filesystem::create_symlink(Path("mine"), Path("out/b.dll"));
+  std::filesystem::create_symlink(Host("mine"), Host("out/b.dll"));
   EXPECT_EQ(RunImage({"extract", "@image.exe", "-o", "@out"}).status, 2);
   EXPECT_EQ(NamesIn("out"), Names{"b.dll"});
-  EXPECT_EQ(ReadText("out/b.dll"), "mine");
+  EXPECT_EQ(Read("out/b.dll"), "mine");
   EXPECT_EQ(RunImage({"extract", "@image.exe", "-o", "@out", "--force"}).status, 0);
   EXPECT_TRUE(Read("out/b.dll") == Read("b.dll"));
-  EXPECT_EQ(ReadText("mine"), "mine");
+  EXPECT_EQ(Read("mine"), "mine");
 }
 
 TEST_F(ImageExtractor, StaysInsideItsFolder) {
@@ -57,8 +57,8 @@ TEST_F(ImageExtractor, StaysInsideItsFolder) {
 
 TEST_F(ImageExtractor, LeavesNothingOfADamagedImage) {
   PackSample();
-  std::vector<uint8_t> image = Read("image.exe");
-  image[RecordOffset("image.exe", 1) + 699] ^= 0x80;  // in the second stream's first code
+  std::string image = Read("image.exe");
+  image[RecordOffset("image.exe", 1) + 699] ^= '\x80';  // in the second stream's first code
   Write("image.exe", image);
   ExpectRefused(RunImage({"extract", "@image.exe", "-o", "@new"}), "\"b.dll\"");
 

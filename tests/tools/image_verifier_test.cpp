@@ -15,7 +15,7 @@ class ImageVerifier : public ToolBench {
  protected:
   std::vector<std::string> WrongIn(const std::string& image) const {
     std::vector<std::string> wrong;
-    for (const image::Finding& finding : image::VerifyImage(Path(image))) {
+    for (const image::Finding& finding : image::VerifyImage(Host(image))) {
       if (!finding.isGood) wrong.push_back(finding.text);
     }
     return wrong;
@@ -130,25 +130,24 @@ TEST_F(ImageVerifier, ComparesStreamsWithTheirSizes) {
 }
 
 TEST_F(ImageVerifier, FindsBadStreamsGapsAndMissingPrograms) {
-  using Image = std::vector<uint8_t>;
   const struct {
-    std::function<void(Image*)> change;
+    std::function<void(std::string*)> change;
     std::function<void(PackageHeader*)> adapt;
     const char* part;
   } rows[] = {
-      {[this](Image* image) { (*image)[RecordOffset("image.exe", 1) + 696] = 'p'; },
+      {[this](std::string* image) { (*image)[RecordOffset("image.exe", 1) + 696] = 'p'; },
        [](PackageHeader*) {}, "does not begin with"},
-      {[](Image* image) { image->insert(image->end() - 568, 0); },
+      {[](std::string* image) { image->insert(image->end() - 568, 0); },
        [](PackageHeader* header) { ++header->packageLength; }, "1 bytes stand between"},
-      {[](Image* image) { (*image)[0] = 'X'; }, [](PackageHeader*) {}, "no version resource"},
-      {[this](Image* image) {
+      {[](std::string* image) { (*image)[0] = 'X'; }, [](PackageHeader*) {}, "no version resource"},
+      {[this](std::string* image) {
          image->erase(image->begin(), image->begin() + HeaderOf("image.exe").dataOffset);
        },
        [](PackageHeader* header) { header->dataOffset = 0; }, "no executable"},
   };
   for (const auto& row : rows) {
     PackSample();
-    Image image = Read("image.exe");
+    std::string image = Read("image.exe");
     row.change(&image);
     Write("image.exe", image);
     ChangeHeader(row.adapt);

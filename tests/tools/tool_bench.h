@@ -7,7 +7,6 @@
 #include <filesystem>
 #include <functional>
 #include <iosfwd>
-#include <span>
 #include <string>
 #include <vector>
 
@@ -21,13 +20,8 @@ struct ToolRun {
   std::string err;
 };
 
-class ToolBench : public testing::Test {
+class ToolBench : public testing::Test, protected TemporaryFolder {
  protected:
-  std::filesystem::path Path(const std::string& name) const { return folder_.Path() / name; }
-  void Write(const std::string& name, std::span<const uint8_t> bytes) const;
-  void Write(const std::string& name, const std::string& text) const;
-  std::vector<uint8_t> Read(const std::string& name) const;
-  std::string ReadText(const std::string& name) const;
   // Names of all that stands in a folder, sorted.
   std::vector<std::string> NamesIn(const std::string& folder) const;
 
@@ -57,12 +51,6 @@ class ToolBench : public testing::Test {
  private:
   using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
   ToolRun Run(Tool tool, std::vector<std::string> arguments) const;
-
-  TemporaryFolder folder_;
 };
 
-// A program with a version resource, as a setup program without a package or as a file to pack. An
-// empty version leaves FileVersion out; without a translation no table names the string block.
-std::string MakeProgram(const std::string& version, bool hasTranslation = true);
-
-std::vector<uint8_t> RandomBytes(size_t count, unsigned seed);
+std::string RandomBytes(size_t count, unsigned seed);
