@@ -4,6 +4,7 @@ A world gives machines, one after the other or (the stand-in) several at once. A
 tree and a registry, starts programs and can be restarted.
 """
 
+import contextlib
 import errno
 import fcntl
 import os
@@ -310,11 +311,9 @@ class Agent:
 
     def ask(self, command):
         """Sends one command; gives the lines of its answer."""
-        try:
+        with contextlib.suppress(BrokenPipeError):  # the missing answer tells it below
             self.process.stdin.write(command.encode('cp1252') + b'\n')
             self.process.stdin.flush()
-        except BrokenPipeError:
-            pass  # the missing answer tells it below
         lines = []
         for raw in self.process.stdout:
             line = raw.decode('cp1252', 'replace').rstrip('\r\n')
