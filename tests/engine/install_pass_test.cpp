@@ -12,10 +12,7 @@ using Strings = std::vector<std::string>;
 class InstallPass : public ProductTest {
  protected:
   InstallPass() {
-    ImageBuilder()
-        .Add("a.dll", "%INSTALL_DIR%;%SYS_DIR%\\sub", "aaaa")
-        .Add("b.dll", "%INSTALL_DIR%", "bbbb")
-        .Write(&pc);
+    ImageBuilder().Add("a.dll", "%INSTALL_DIR%;%SYS_DIR%\\sub", "aaaa").Write(&pc);
     EXPECT_EQ(OpenPackage(&context), 1);
   }
 };

@@ -97,25 +97,21 @@ TEST_P(DataFileByEitherWay, AFileMadeCanBeWrittenAgainAndDeletedWhileOpen) {
 
 using DataFileTest = ProductTest;
 
-TEST_F(DataFileTest, AClosedOneKnowsItsSizeAlone) {
+TEST_F(DataFileTest, AClosedOneKnowsItsSizeAndANamelessOneNothing) {
   pc.Write(kHostName, "text");
-  DataFile file(kName);
-  EXPECT_EQ(file.GetSize(), 4u);
-  EXPECT_EQ(ReadAll(file, 4), "");
-  EXPECT_FALSE(Write(file, "x"));
-  EXPECT_EQ(file.SeekTo(0), 0);
-  EXPECT_EQ(file.SeekToEnd(), 0);
-  EXPECT_EQ(file.Tell(), -1);
-}
-
-TEST_F(DataFileTest, ANamelessOneDoesNothing) {
   FailAllocation(1);
   DataFile withoutMemory(kName);
+  DataFile closed(kName);
   DataFile empty("");
   DataFile none(nullptr);
-  for (DataFile* file : {&withoutMemory, &empty, &none}) {
+  for (DataFile* file : {&withoutMemory, &closed, &empty, &none}) {
+    EXPECT_EQ(ReadAll(*file, 4), "");
+    EXPECT_FALSE(Write(*file, "x"));
+    EXPECT_EQ(file->SeekTo(0) + file->SeekToEnd(), 0);
+    EXPECT_EQ(file->Tell(), -1);
+    EXPECT_EQ(file->GetSize(), file == &closed ? 4u : 0u);
+    if (file == &closed) continue;
     EXPECT_EQ(file->OpenForRead() + file->OpenForWrite() + file->Create() + file->Delete(), 0);
-    EXPECT_EQ(file->GetSize(), 0u);
     EXPECT_EQ(file->GetName(), nullptr);
   }
 }

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstring>
+#include <random>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -17,6 +18,13 @@ inline std::string PackStream(std::string_view bytes) {
   const auto* const first = reinterpret_cast<const uint8_t*>(bytes.data());
   const std::vector<uint8_t> stream = image::PackStream({first, bytes.size()}, image::kPackFast);
   return {stream.begin(), stream.end()};
+}
+
+inline std::string RandomBytes(size_t count, unsigned seed) {
+  std::mt19937 random(seed);
+  std::string bytes(count, '\0');
+  for (char& byte : bytes) byte = static_cast<char>(random());
+  return bytes;
 }
 
 // A program with a version resource of these strings.

@@ -13,7 +13,7 @@
 #include <utility>
 
 #include "tests/support/plain_expander.h"
-#include "tests/tools/tool_bench.h"
+#include "tests/support/test_image.h"
 #include "tools/image/parallel_packer.h"
 #include "tools/image/phrase_parser.h"
 

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <random>
 #include <sstream>
 
 #include "tests/support/test_image.h"
@@ -130,11 +129,4 @@ size_t ToolBench::RecordOffset(const std::string& image, size_t number) const {
     offset += sizeof(FileRecord) + RecordAt<FileRecord>(bytes, offset).storedSize;
   }
   return offset;
-}
-
-std::string RandomBytes(size_t count, unsigned seed) {
-  std::mt19937 random(seed);
-  std::string bytes(count, '\0');
-  for (char& byte : bytes) byte = static_cast<char>(random());
-  return bytes;
 }

@@ -52,5 +52,3 @@ class ToolBench : public testing::Test, protected TemporaryFolder {
   using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
   ToolRun Run(Tool tool, std::vector<std::string> arguments) const;
 };
-
-std::string RandomBytes(size_t count, unsigned seed);

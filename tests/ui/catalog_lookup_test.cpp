@@ -37,15 +37,4 @@ TEST_F(CatalogLookup, ALongerTextIsCutAndNoBufferIsFine) {
   LoadCatalogText(nullptr, CatalogCancel, nullptr, 500);
 }
 
-TEST_F(CatalogLookup, TheSystemsPrimaryLanguageCounts) {
-  const std::pair<LANGID, int32_t> rows[] = {
-      {0x0C07, kLanguageGerman},  {0x0809, kLanguageEnglish}, {0x0C0A, kLanguageSpanish},
-      {0x0410, kLanguageItalian}, {0x040C, kLanguageFrench},  {0x0413, kLanguageFrench},
-      {0x0000, kLanguageFrench},  {0xFC07, kLanguageGerman},  {0x0207, kLanguageFrench}};
-  for (const auto& [system, language] : rows) {
-    machine::CurrentSettings().language = system;
-    EXPECT_EQ(SystemLanguage(), language) << std::hex << system;
-  }
-}
-
 }  // namespace
