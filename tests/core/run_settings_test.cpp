@@ -4,6 +4,7 @@
 #include <string>
 
 #include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
 
 namespace {
 
@@ -104,6 +105,13 @@ TEST_F(RunSettings, FreeSpaceIsComparedIn64BitsAndStopsNothingWhenUnknown) {
   EXPECT_EQ(CheckDiskSpace(&context), StatusNoDiskSpace);
   FailAllCalls("LoadLibraryA");
   EXPECT_EQ(CheckDiskSpace(&context), StatusOk);
+}
+
+TEST_F(RunSettings, AskingForTheSpaceNeededLeavesAnOpenPackageOpen) {
+  ImageBuilder().Write(&pc);
+  ASSERT_EQ(OpenPackage(&context), StatusOk);
+  EXPECT_EQ(GetNeededSpace(&context), 0u);
+  EXPECT_NE(context.packageFile, nullptr);
 }
 
 }  // namespace

@@ -4,7 +4,6 @@ import difflib
 import re
 from collections import namedtuple
 from datetime import datetime, timedelta
-from itertools import takewhile
 from os.path import commonprefix
 
 import file_tree
@@ -12,7 +11,7 @@ import registry_text
 from package_image import Image, ImageError, damage
 from packed_image import PackedImage, file_content, quoted_bytes
 from registry_text import RegistryError
-from scenario_text import ACTIONS, CHECKS, ScenarioError
+from scenario_text import ACTIONS, ScenarioError
 
 LOG = r'C:\windows\MorivLog.txt'
 LANGUAGES = {'English': 0, 'French': 10000, 'German': 20000, 'Italian': 30000, 'Spanish': 40000}
@@ -42,13 +41,9 @@ def play(scenario, machine, tools, folder):
     tools: what images are made with (packed_image.py); folder: for the sources of the images.
     """
     player = _Player(machine, tools, folder)
-    sections = list(scenario.sections)
-    while sections:
-        section = sections.pop(0)
+    for section in scenario.sections:
         if section.keyword in ACTIONS:
-            checks = list(takewhile(lambda check: check.keyword in CHECKS, sections))
-            del sections[:len(checks)]
-            player.act(section, checks)
+            player.act(section)
         else:
             player.prepare(section)
 
@@ -123,7 +118,7 @@ class _Player:
 
     # Actions
 
-    def act(self, section, checks):
+    def act(self, section):
         files = self.machine.files.snapshot()
         registry = self.machine.registry()
         report = []
@@ -137,15 +132,15 @@ class _Player:
                 report.append(outcome.trouble)
         found = Found(exit_code, shown, file_tree.changes(files, self.machine.files.snapshot()),
                       registry_text.changes(registry, self.machine.registry()))
-        report += self._compare(found, checks, section)
+        report += self._compare(found, section)
         if report:
             what = f'{section.place}: {section.keyword} {section.argument}'
             raise ScenarioFailure('\n'.join([what, *report]))
 
-    def _compare(self, found, checks, action):
-        texts = {(c.argument or LOG): c for c in checks if c.keyword in ('log', 'text')}
-        others = {c.keyword: c for c in checks if c.keyword not in ('log', 'text')}
-        if len(texts) + len(others) != len(checks):
+    def _compare(self, found, action):
+        texts = {c.argument or LOG: c for c in action.checks if c.keyword in ('log', 'text')}
+        others = {c.keyword: c for c in action.checks if c.keyword not in ('log', 'text')}
+        if len(texts) + len(others) != len(action.checks):
             raise ScenarioError(f'{action.place}: two checks of the same thing')
         if (action.keyword == 'run') != ('exit' in others):
             raise ScenarioError(f'{action.place}: a run has an exit code, a restart has none')

@@ -37,4 +37,12 @@ TEST_F(CatalogLookup, ALongerTextIsCutAndNoBufferIsFine) {
   LoadCatalogText(nullptr, CatalogCancel, nullptr, 500);
 }
 
+TEST_F(CatalogLookup, TheSystemsPrimaryLanguageHasTenBits) {
+  for (const auto& [system, language] :
+       {std::pair{0xFC07, kLanguageGerman}, {0x0207, kLanguageFrench}}) {
+    machine::CurrentSettings().language = static_cast<LANGID>(system);
+    EXPECT_EQ(SystemLanguage(), language) << system;
+  }
+}
+
 }  // namespace
