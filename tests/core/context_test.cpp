@@ -5,34 +5,21 @@
 
 namespace {
 
-TEST(Context, ARequestIsMadeWhole) {
-  uint32_t options = 0;
-  EXPECT_EQ(ApplyDefaultOptions(&options), StatusOk);
-  EXPECT_EQ(options, OptionInteractive | OptionRegister);
-  options = OptionRemove;
-  EXPECT_EQ(ApplyDefaultOptions(&options), StatusOk);
-  EXPECT_EQ(options, OptionRemove);
-  EXPECT_EQ(ApplyDefaultOptions(nullptr), StatusBadArgument);
-
+TEST(Context, OnlyKnownLanguagesAndTheImageKindOfExactlyOneCount) {
   for (const int32_t given : {-1, 0, 10000, 20000, 30000, 40000, 1, -2, 9999, 50000}) {
     int32_t language = given;
     EXPECT_EQ(ValidateLanguage(&language), StatusOk);
     EXPECT_EQ(language, given % 10000 == 0 && given < 50000 ? given : kLanguageNone);
   }
-  EXPECT_EQ(ValidateLanguage(nullptr), StatusBadArgument);
-}
-
-TEST(Context, TheFlagOfARemovalProgramIsExactlyOne) {
-  SetupContext context = {};
-  for (const uint16_t flag : {uint16_t{0}, uint16_t{2}, uint16_t{0xFFFF}}) {
+  for (const uint16_t flag : {uint16_t{0}, uint16_t{1}, uint16_t{2}, uint16_t{0xFFFF}}) {
+    SetupContext context = {};
+    context.options = OptionSilent;
     context.header.removalImageFlag = flag;
     EXPECT_EQ(ApplyImageKind(&context), StatusOk);
-    EXPECT_EQ(context.options, 0u) << flag;
+    EXPECT_EQ(context.options, flag == 1 ? OptionSilent | OptionRemove : OptionSilent) << flag;
   }
-  context.header.removalImageFlag = 1;
-  context.options = OptionSilent;
-  EXPECT_EQ(ApplyImageKind(&context), StatusOk);
-  EXPECT_EQ(context.options, OptionSilent | OptionRemove);
+  EXPECT_EQ(ApplyDefaultOptions(nullptr), StatusBadArgument);
+  EXPECT_EQ(ValidateLanguage(nullptr), StatusBadArgument);
   EXPECT_EQ(ApplyImageKind(nullptr), StatusBadArgument);
 }
 

@@ -12,12 +12,11 @@
 
 #include "core/status.h"
 #include "machine/seam_functions.h"
-#include "platform/registry_key.h"
 #include "tests/faults/faulty_run.h"
 #include "tests/faults/machine_state.h"
 #include "tests/faults/run_judgement.h"
+#include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
-#include "tests/support/test_machine.h"
 #include "ui/control_ids.h"
 
 namespace {
@@ -43,22 +42,15 @@ constexpr std::string_view kChangingFunctions[] = {
     "RegSetValueExA",   "RegDeleteKeyA", "RegDeleteValueA",
 };
 
-// No pattern repeats, so that a stream is about as long as its file.
-std::string Noise(size_t size, unsigned seed) {
-  std::string bytes(size, '\0');
-  for (char& byte : bytes) byte = static_cast<char>((seed = seed * 1103515245 + 12345) >> 23);
-  return bytes;
-}
-
 // Targets in subdirectories, in the system's and in a browser's; a browser that is missing; streams
 // of one block and of several; no two versions of a file alike.
 void WriteImage(const TestMachine& pc, const std::string& version) {
   const auto seed = static_cast<unsigned>(version.back());
   ImageBuilder image(version);
-  image.Add("moriv.exe", "%INSTALL_DIR%", VersionedProgram(version) + Noise(1500, seed))
-      .Add("moriv.dll", "%INSTALL_DIR%\\bin;%SYS_DIR%", Noise(2500, seed + 1))
-      .Add("plugin.dll", "%INSTALL_DIR%\\plug;%PLUGIN_ALL_DIR%", Noise(200, seed + 2))
-      .Add("netscape.dll", "%PLUGIN_NS_DIR%", Noise(300, seed + 3))
+  image.Add("moriv.exe", "%INSTALL_DIR%", VersionedProgram(version) + RandomBytes(1500, seed))
+      .Add("moriv.dll", "%INSTALL_DIR%\\bin;%SYS_DIR%", RandomBytes(2500, seed + 1))
+      .Add("plugin.dll", "%INSTALL_DIR%\\plug;%PLUGIN_ALL_DIR%", RandomBytes(200, seed + 2))
+      .Add("netscape.dll", "%PLUGIN_NS_DIR%", RandomBytes(300, seed + 3))
       .Add("empty.txt", "%INSTALL_DIR%", version == kOldVersion ? "not yet" : "");
   image.header().defaultLanguage = kLanguageFrench;
   image.header().spaceNeeded = 9000;
@@ -70,12 +62,9 @@ void WriteImage(const TestMachine& pc, const std::string& version) {
 void FurnishMachine(const TestMachine& pc) {
   pc.Write("drive_c/Opera/Plugins/other.dll", "other");
   pc.Write("drive_c/Program Files/other.txt", "other");
-  const std::string system = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\";
-  RegistryKey key;
-  ASSERT_TRUE(key.Create(HKEY_LOCAL_MACHINE, (system + "App Paths\\Opera.exe").c_str()));
-  ASSERT_TRUE(key.SetText("Path", "C:\\Opera", 9));
-  ASSERT_TRUE(key.Create(HKEY_LOCAL_MACHINE, (system + "Uninstall\\Other").c_str()));
-  ASSERT_TRUE(key.SetText("DisplayName", "Other", 6));
+  SetRegistryText(AppPathsKey("Opera.exe"), "Path", std::string("C:\\Opera", 9));
+  SetRegistryText("SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\Other", "DisplayName",
+                  std::string("Other", 6));
 }
 
 class FaultLoop : public testing::Test {

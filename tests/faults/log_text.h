@@ -3,7 +3,6 @@
 
 #include <optional>
 #include <string>
-#include <string_view>
 #include <vector>
 
 struct LogLine {
@@ -12,4 +11,4 @@ struct LogLine {
 };
 
 // The events of a log of one block; nullopt when a byte of it is out of form.
-std::optional<std::vector<LogLine>> ReadLog(std::string_view log);
+std::optional<std::vector<LogLine>> ReadLog(const std::string& log);

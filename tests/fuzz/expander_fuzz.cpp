@@ -23,19 +23,6 @@ namespace {
 constexpr size_t kOutputLimit = 1 << 20;
 constexpr int kLiterals = 34704;  // whole bytes of 9-bit codes; 60 entries stay free
 
-class RecordingPlainExpander : public PlainExpander {
- public:
-  std::string output;
-  int writes = 0;
-
- protected:
-  uint32_t Write(const uint8_t* bytes, uint32_t count) override {
-    output.append(reinterpret_cast<const char*>(bytes), count);
-    ++writes;
-    return count;
-  }
-};
-
 std::string CodesOf(std::string_view units) {
   CodeStream stream;
   for (size_t i = 0; i + 1 < units.size() && stream.width() <= 32; i += 2) {

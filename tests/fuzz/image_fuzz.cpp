@@ -6,6 +6,7 @@
 //   1...  the package
 #include <cstring>
 #include <optional>
+#include <set>
 
 #include "engine/resolver.h"
 #include "machine/drives.h"

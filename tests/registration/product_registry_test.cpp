@@ -17,6 +17,13 @@ class ProductRegistry : public ProductTest {
  protected:
   ProductRegistry() { EXPECT_EQ(ProductCreateTree(nullptr), 1); }
 
+  static void MakeService(const std::string& name, const std::string& profile,
+                          const std::string& application) {
+    ASSERT_EQ(ProductCreateTree(name.c_str()), 1);
+    MakeRegistryKey(kServices + "\\" + name + "\\NetProfiles\\" + profile);
+    MakeRegistryKey(kServices + "\\" + name + "\\Applications\\" + application);
+  }
+
   static std::vector<std::string> Names(KeyNameNode* list) {
     std::vector<std::string> names;
     for (const KeyNameNode* node = list; node != nullptr; node = node->next) {
@@ -38,25 +45,25 @@ class ProductRegistry : public ProductTest {
 using Strings = std::vector<std::string>;
 
 TEST_F(ProductRegistry, EveryRangeOfItemsHasItsKey) {
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
-  MakeRegistryKey(kServices + "\\Sky\\NetProfiles\\home");
-  MakeRegistryKey(kServices + "\\Sky\\Applications\\mail");
-  EXPECT_EQ(ProductSetItem(3, nullptr, nullptr, "root"), 1);
-  EXPECT_EQ(ProductSetItem(76, "Sky", nullptr, "service"), 1);
-  EXPECT_EQ(ProductSetItem(135, "Sky", "home", "profile"), 1);
-  EXPECT_EQ(ProductSetItem(203, "Sky", "mail", "application"), 1);
-  EXPECT_EQ(Get(3), "root");
-  EXPECT_EQ(Get(76, "Sky"), "service");
-  EXPECT_EQ(Get(135, "Sky", "home"), "profile");
-  EXPECT_EQ(Get(203, "Sky", "mail"), "application");
+  MakeService("Sky", "home", "mail");
+  const struct {
+    int32_t item;
+    const char *service, *subKey;
+  } rows[] = {
+      {3, nullptr, nullptr}, {76, "Sky", nullptr}, {135, "Sky", "home"}, {203, "Sky", "mail"}};
+  for (const auto& [item, service, subKey] : rows) {
+    const std::string text = "item " + std::to_string(item);
+    EXPECT_EQ(ProductSetItem(item, service, subKey, text.c_str()), 1);
+    EXPECT_EQ(Get(item, service, subKey), text);
+  }
   char text[32];
   DWORD size = sizeof(text);
   EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, kRoot.c_str(), "Version", text, &size), 1);
-  EXPECT_EQ(size, 4u) << "a text is stored without its NUL";
+  EXPECT_EQ(size, 6u) << "a text is stored without its NUL";
 }
 
 TEST_F(ProductRegistry, RefusedItemsAndAbsentOnesAreToldApart) {
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
+  MakeService("Sky", "home", "mail");
   for (const int32_t item : {-1, 0, 10, 100, 200, 300}) {
     EXPECT_EQ(Get(item, "Sky", "x"), "null, old") << item;
     EXPECT_EQ(ProductSetItem(item, "Sky", "x", "text"), -1) << item;
@@ -71,20 +78,22 @@ TEST_F(ProductRegistry, RefusedItemsAndAbsentOnesAreToldApart) {
 }
 
 TEST_F(ProductRegistry, EitherKindTakesAnyItemOfASubKey) {
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
-  MakeRegistryKey(kServices + "\\Sky\\Applications\\mail");
+  MakeService("Sky", "home", "mail");
   char text[] = "modem";
-  const auto access = [&](int32_t item, int32_t kind, int32_t operation) {
-    return ProductAccessItem(item, "Sky", kind, "mail", text, 5, operation);
-  };
-  EXPECT_EQ(access(101, kKindApplication, kOperationWrite), 1);
-  EXPECT_EQ(access(101, kKindApplication, kOperationRead), 1);
-  EXPECT_EQ(access(101, kKindNetProfile, kOperationRead), 0);
-  EXPECT_EQ(access(101, 3, kOperationRead), -1);
-  EXPECT_EQ(access(101, kKindApplication, 4), -1);
-  EXPECT_EQ(access(101, kKindApplication, kOperationDelete), 1);
-  EXPECT_EQ(access(101, kKindApplication, kOperationDelete), -1) << "it is gone";
-  EXPECT_EQ(access(76, kKindApplication, kOperationRead), -1);
+  const struct {
+    int32_t item, kind, operation, result;
+  } rows[] = {{101, kKindApplication, kOperationWrite, 1},
+              {101, kKindApplication, kOperationRead, 1},
+              {101, kKindNetProfile, kOperationRead, 0},
+              {101, 3, kOperationRead, -1},
+              {101, kKindApplication, 4, -1},
+              {101, kKindApplication, kOperationDelete, 1},
+              {101, kKindApplication, kOperationDelete, -1},  // it is gone
+              {76, kKindApplication, kOperationRead, -1}};
+  for (const auto& [item, kind, operation, result] : rows) {
+    EXPECT_EQ(ProductAccessItem(item, "Sky", kind, "mail", text, 5, operation), result)
+        << item << " " << kind << " " << operation;
+  }
 }
 
 TEST_F(ProductRegistry, NamesHaveTheirLengths) {
@@ -97,18 +106,12 @@ TEST_F(ProductRegistry, NamesHaveTheirLengths) {
   for (const std::string& good : {std::string("abc"), std::string(63, 's')}) {
     EXPECT_EQ(ProductCreateTree(good.c_str()), 1) << good;
     EXPECT_EQ(ProductRootExists(good.c_str()), 1) << good;
-    EXPECT_EQ(ProductKeyExists(good.c_str(), 3, "x"), -1);
     EXPECT_EQ(ProductDeleteTree(good.c_str()), 1) << good;
   }
   EXPECT_EQ(ProductDeleteApplication("Sky", ""), -1);
-  EXPECT_EQ(ProductDeleteSubKey("Sky", 3, "x"), -1);
-}
-
-TEST_F(ProductRegistry, AKeyPathEndsAt127Characters) {
-  // "SOFTWARE\Zeb\Moriv\Services\Sky\NetProfiles\" has 44.
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
+  // "SOFTWARE\Zeb\Moriv\Services\Sky\NetProfiles\" has 44 of the 127 characters of a key's path.
   const std::string fits(83, 'p');
-  MakeRegistryKey(kServices + "\\Sky\\NetProfiles\\" + fits);
+  MakeService("Sky", fits, "mail");
   EXPECT_EQ(ProductKeyExists("Sky", kKindNetProfile, fits.c_str()), 1);
   EXPECT_EQ(ProductKeyExists("Sky", kKindNetProfile, (fits + "p").c_str()), -1);
   EXPECT_EQ(ProductSetItem(101, "Sky", (fits + "p").c_str(), "x"), -1);
@@ -127,17 +130,15 @@ TEST_F(ProductRegistry, ValuesEndWhereTheRegistrySaysOrAt510Characters) {
 }
 
 TEST_F(ProductRegistry, AServiceComesAndGoesWithItsEntries) {
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
-  ASSERT_EQ(ProductCreateTree("Sky"), 1) << "keys that are there are fine";
-  for (const char* name : {"b", "a"}) {
-    MakeRegistryKey(kServices + "\\Sky\\NetProfiles\\" + name);
-    MakeRegistryKey(kServices + "\\Sky\\Applications\\" + name + "app");
-  }
+  MakeService("Sky", "b", "bapp");
+  MakeService("Sky", "a", "aapp");  // keys that are there are fine
   EXPECT_EQ(Names(ProductListServices()), Strings{"Sky"});
   EXPECT_EQ(Names(ProductListNetProfiles("Sky")), (Strings{"b", "a"}));
   EXPECT_EQ(Names(ProductListApplications("Sky")), (Strings{"bapp", "aapp"}));
-  EXPECT_EQ(ProductEnumKeys("Sky", 3), nullptr);
   EXPECT_EQ(ProductListNetProfiles(nullptr), nullptr);
+  EXPECT_EQ(ProductEnumKeys("Sky", 3), nullptr) << "there is no third kind";
+  EXPECT_EQ(ProductKeyExists("Sky", 3, "x"), -1);
+  EXPECT_EQ(ProductDeleteSubKey("Sky", 3, "x"), -1);
   EXPECT_EQ(ProductDeleteNetProfile("Sky", "b"), 1);
   EXPECT_EQ(ProductDeleteNetProfile("Sky", "b"), 0);
   EXPECT_EQ(ProductDeleteTree(nullptr), -1) << "a service is left";
@@ -167,7 +168,7 @@ TEST_F(ProductRegistry, LanguagesAreReadInEveryForm) {
   EXPECT_EQ(Get(27, "Sky"), "ES");
 }
 
-TEST_F(ProductRegistry, NamesOfServicesFitOrLeaveTheBufferAlone) {
+TEST_F(ProductRegistry, JoinedNamesFitOrLeaveTheBufferAloneAndEndWithTheLastWholeOne) {
   char names[520] = "as it was";
   MakeRegistryKey(kServices + "\\Sky");
   MakeRegistryKey(kServices + "\\A");
@@ -176,6 +177,9 @@ TEST_F(ProductRegistry, NamesOfServicesFitOrLeaveTheBufferAlone) {
   EXPECT_STREQ(names, "as it was");
   EXPECT_EQ(CheckDependingServices(names, 6), 0);
   EXPECT_STREQ(names, "Sky,A");
+  for (char c = 'a'; c < 'k'; ++c) MakeRegistryKey(kServices + "\\" + std::string(63, c));
+  EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 0);
+  EXPECT_EQ(std::string(names).size(), 6u + 8 * 63 + 7);
 }
 
 TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {
@@ -187,13 +191,6 @@ TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {
   machine::CurrentSettings().ntFamily = false;  // there a key goes with all below it
   EXPECT_EQ(ProductDeleteTree(nullptr), -1);
   EXPECT_TRUE(HasRegistryKey(kServices));
-}
-
-TEST_F(ProductRegistry, JoinedNamesEndWithTheLastThatFitsWhole) {
-  for (char c = 'a'; c < 'k'; ++c) MakeRegistryKey(kServices + "\\" + std::string(63, c));
-  char names[520] = {};
-  EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 0);
-  EXPECT_EQ(std::string(names).size(), 8u * 63 + 7);
 }
 
 }  // namespace

@@ -1,16 +1,13 @@
 // The message catalog as the program sees it: through LoadStringA, in code page 1252.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <unistd.h>
 
-#include <filesystem>
 #include <map>
 #include <set>
 #include <string>
-#include <utility>
 
-#include "machine/machine.h"
 #include "platform/win32.h"
+#include "tests/support/test_machine.h"
 
 namespace {
 
@@ -27,46 +24,13 @@ const std::map<UINT, std::string> kTags = {
 const std::set<UINT> kAtOffsetZeroAlone = {115, 117, 137, 510, 600, 601, 602, 603, 604};
 // The default directory and the web address in its two forms.
 const std::set<UINT> kWithoutTag = {113, 127, 128};
-// Rows of the tagged sets that are not tag and French text, by set and id.
-const std::map<std::pair<UINT, UINT>, std::string> kOwnTexts = {
-    {{kEnglish, 107}, "Ok"},
-    {{kEnglish, 108}, "Cancel"},
-    {{kEnglish, 109}, "End"},
-    {{kEnglish, 110}, "Install"},
-    {{kEnglish, 120}, "Remove"},
-    {{kEnglish, 125}, "Update"},
-    {{kEnglish, 135}, "Language :"},
-    {{kEnglish, 138}, "_ENG_ Etes-vous bien s\xFBr de vouloir abandonner l'op\xE9ration ?"},
-    {{kEnglish, 140}, "_ENG_ Space needed :"},
-    {{kEnglish, 141}, "_ENG_ Space occupied :"},
-    {{kEnglish, 142}, "Mb"},
-    {{kGerman, 141},
-     "_GER_ Taille occup\xE9"
-     "e"},
-    {{kGerman, 142}, "Mo"},
-    {{kItalian, 141},
-     "_ITA_ Taille occup\xE9"
-     "e"},
-    {{kItalian, 142}, "Mo"},
-    {{kSpanish, 141},
-     "_SPA_ Taille occup\xE9"
-     "e"},
-    {{kSpanish, 142}, "Mo"},
-};
+// Rows that are not tag and French text: those that English has of its own, and those that all the
+// others have, too.
+const std::set<UINT> kOwnInEnglish = {107, 108, 109, 110, 120, 125, 135, 138, 140, 141, 142};
+const std::set<UINT> kOwnInAll = {141, 142};
 
 class Catalog : public testing::Test {
  protected:
-  static void SetUpTestSuite() {
-    folder_ = std::filesystem::path(testing::TempDir()) / ("catalog_" + std::to_string(getpid()));
-    std::string error;
-    ASSERT_TRUE(machine::Start(folder_, {}, &error)) << error;
-  }
-
-  static void TearDownTestSuite() {
-    machine::Stop();
-    std::filesystem::remove_all(folder_);
-  }
-
   // Empty for a row that does not exist: the catalog has no empty rows.
   static std::string Load(UINT id) {
     char buffer[2000] = "";
@@ -85,7 +49,7 @@ class Catalog : public testing::Test {
   }
 
  private:
-  static inline std::filesystem::path folder_;
+  TestMachine pc_;
 };
 
 TEST_F(Catalog, EverySetHasItsRowsAndThereAreNoOthers) {
@@ -100,14 +64,11 @@ TEST_F(Catalog, EverySetHasItsRowsAndThereAreNoOthers) {
   EXPECT_THAT(found, testing::ContainerEq(expected));
 }
 
-TEST_F(Catalog, RowsOfATaggedSetAreTagAndFrenchTextUnlessListed) {
+TEST_F(Catalog, RowsOfATaggedSetAreTagAndFrenchTextUnlessTheyAreItsOwn) {
   for (const auto& [set, tag] : kTags) {
     for (const UINT id : FrenchIds()) {
-      const auto own = kOwnTexts.find({set, id});
-      const std::string french = Load(kFrench + id);
-      const std::string expected = own != kOwnTexts.end()     ? own->second
-                                   : kWithoutTag.contains(id) ? french
-                                                              : tag + french;
+      if ((set == kEnglish ? kOwnInEnglish : kOwnInAll).contains(id)) continue;
+      const std::string expected = (kWithoutTag.contains(id) ? "" : tag) + Load(kFrench + id);
       EXPECT_EQ(Load(set + id), expected) << "row " << set + id;
     }
   }
@@ -116,8 +77,14 @@ TEST_F(Catalog, RowsOfATaggedSetAreTagAndFrenchTextUnlessListed) {
 TEST_F(Catalog, RowsStandToTheLetter) {
   const std::map<UINT, std::string> rows = {
       {10113, "C:\\Program Files\\Moriv"},
+      {108, "Cancel"},
       {128, "http://www.moriv.example/"},
       {137, "MorivLog.txt"},
+      {142, "Mb"},
+      {20142, "Mo"},
+      {30141,
+       "_ITA_ Taille occup\xE9"
+       "e"},
       {510, "5"},
       {601, "Francais"},
       {604, "Espa\xF1ol"},

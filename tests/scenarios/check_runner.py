@@ -5,11 +5,10 @@ Takes scenarios that hold, changes one thing at a time in what they say, and pla
 stand-in machine.
 """
 
-import shutil
 import sys
 
 sys.dont_write_bytecode = True  # before the modules of this folder
-import run_scenarios
+from run_scenarios import HERE, in_world, read_options, run_one
 from scenario_text import ScenarioError, parse
 
 # Scenario, what stands there, and what is said instead.
@@ -51,24 +50,18 @@ MALFORMED = [
 ]
 
 
-def main():
+def check(world, tools, images):
     faults = [f'taken for a scenario: {text!r}' for text in MALFORMED if is_scenario(text)]
-    options = run_scenarios.read_options()
-    world = run_scenarios.make_world(options)
-    tools, images = run_scenarios.make_tools(options, world)
-    shutil.rmtree(images, ignore_errors=True)
-    world.open()
     for number, (name, truth, falsehood) in enumerate(FALSEHOODS):
-        text = (run_scenarios.HERE / f'{name}.scenario').read_text(encoding='utf-8')
+        text = (HERE / f'{name}.scenario').read_text(encoding='utf-8')
         if truth not in text:
             faults.append(f'{name} does not say: {truth!r}')
             continue
         changed = parse(f'{number}-{name}', text.replace(truth, falsehood, 1), name)
-        report = run_scenarios.run_one(world, changed, tools, images)
-        if not report.startswith('FAILED '):
+        if not run_one(world, changed, tools, images).startswith('FAILED '):
             faults.append(f'{name} holds with {falsehood!r} for {truth!r}')
-    print('\n'.join(faults) or f'{len(FALSEHOODS)} falsehoods and {len(MALFORMED)} bad texts found')
-    return 1 if faults else 0
+    found = f'{len(FALSEHOODS)} falsehoods and {len(MALFORMED)} bad texts found'
+    return len(faults), '\n'.join(faults) or found
 
 
 def is_scenario(text):
@@ -80,4 +73,4 @@ def is_scenario(text):
 
 
 if __name__ == '__main__':
-    sys.exit(main())
+    sys.exit(in_world(read_options(), check))

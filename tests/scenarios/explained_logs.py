@@ -15,16 +15,13 @@ HEADING = '\r\n\r\nInstalling Moriv : Tuesday, 03 February 2026 at : 04h 05m 06s
 
 def silent_runs(scenario):
     """The exit code and the log's lines of each run that has both and no user."""
-    user, code = False, None
+    has_user = False
     for section in scenario.sections:
-        if section.keyword == 'given user':
-            user = True
-        elif section.keyword == 'run':
-            silent, user = not user, False
-        elif section.keyword == 'exit':
-            code = section.argument
-        elif section.keyword == 'log' and silent:
-            yield code, [line[1:-1] for line in section.body if line.startswith('|')]
+        checks = {check.keyword: check for check in section.checks}
+        if 'log' in checks and not has_user and section.keyword == 'run':
+            lines = [line[1:-1] for line in checks['log'].body if line.startswith('|')]
+            yield checks['exit'].argument, lines
+        has_user = section.keyword == 'given user' or (has_user and section.keyword != 'run')
 
 
 def explained_codes(tool, log):

@@ -5,7 +5,6 @@ the file. All integers are little-endian.
 """
 
 import re
-import struct
 
 HEADER_SIZE = 568
 RECORD_SIZE = 696
@@ -92,31 +91,26 @@ def damage(data, line):
     NUL ends it) or hex BYTES.
     """
     for pattern, change in _DAMAGES:
-        match = re.fullmatch(pattern, line)
-        if match:
+        if match := re.fullmatch(pattern, line):
             return change(data, *match.groups())
     raise ImageError(f'no such damage: {line}')
 
 
-def _change_header(data, name, value):
+def _change_field(data, number, name, value):
+    """Of the record with this number, of the header without one."""
     image = Image(data)
-    place = _place(HEADER_FIELDS, name)
-    _set(image.header, place, _field_value(value, place))
-    return image.bytes()
-
-
-def _change_record(data, number, name, value):
-    image = Image(data)
-    place = _place(RECORD_FIELDS, name)
-    _set(image.records[int(number) - 1], place, _field_value(value, place))
+    fields = RECORD_FIELDS if number else HEADER_FIELDS
+    if name not in fields:
+        raise ImageError(f'no such field: {name}')
+    block = image.records[int(number) - 1] if number else image.header
+    _set(block, fields[name], _field_value(value, fields[name][1]))
     return image.bytes()
 
 
 def _change_stream(data, number, value):
     image = Image(data)
     index = int(number) - 1
-    first = re.fullmatch(r'first (\d+) bytes', value)
-    if first:
+    if first := re.fullmatch(r'first (\d+) bytes', value):
         stream = image.streams[index][:int(first[1])]
     elif value.startswith('hex '):
         stream = bytes.fromhex(value[4:])
@@ -135,8 +129,7 @@ def _drop_records(data, kept):
 
 
 _DAMAGES = [
-    (r'header (\w+) = (.+)', _change_header),
-    (r'record (\d+) (\w+) = (.+)', _change_record),
+    (r'(?:header|record (\d+)) (\w+) = (.+)', _change_field),
     (r'stream (\d+) = (.+)', _change_stream),
     (r'no records(?: but (\d+))?', lambda data, kept: _drop_records(data, int(kept or 0))),
     (r'executable alone', lambda data: Image(data).executable),
@@ -146,19 +139,9 @@ _DAMAGES = [
 ]
 
 
-def _place(fields, name):
-    if name not in fields:
-        raise ImageError(f'no such field: {name}')
-    return fields[name]
-
-
-def _field_value(text, place):
-    filled = re.fullmatch(r'filled "(.+)"', text)
-    if filled:
-        width = place[1]
+def _field_value(text, width):
+    if filled := re.fullmatch(r'filled "(.+)"', text):
         return (filled[1].encode('cp1252') * width)[:width]
     if re.fullmatch(r'".*"', text):
         return text[1:-1].encode('cp1252')
-    if text.startswith('hex '):
-        return bytes.fromhex(text[4:])
-    return int(text, 0)
+    return bytes.fromhex(text[4:]) if text.startswith('hex ') else int(text, 0)

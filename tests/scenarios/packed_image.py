@@ -33,13 +33,10 @@ class PackedImage:
 
     def _set_option(self, line):
         name, _, value = line.partition(' = ')
-        if name == 'default directory':
-            self.options['default_directory'] = f"'{value}'"
-        elif name == 'default language':
-            self.options['default_language'] = f'"{value}"'
-        elif name == 'space needed':
-            self.options['space_needed'] = value
-        elif name == 'allow unknown macros':
+        quote = {'default directory': "'", 'default language': '"', 'space needed': ''}
+        if name in quote:
+            self.options[name.replace(' ', '_')] = quote[name] + value + quote[name]
+        elif line == 'allow unknown macros':
             self.flags.append('--allow-unknown-macros')
         else:
             raise ValueError(f'no such line of an image: {line}')

@@ -6,13 +6,12 @@ loads by bare name, has to load them all: else nothing would be shown.
 """
 
 import os
-import shutil
 import sys
 
 sys.dont_write_bytecode = True  # before the modules of this folder
 from packed_image import PackedImage
-from run_scenarios import make_tools, make_world, read_options, status_without_world
-from worlds import WorldError, require
+from run_scenarios import in_world, read_options
+from worlds import require
 
 FOLDER = 'C:\\Planted\\'
 SETUP = FOLDER + 'Setup.exe'
@@ -44,36 +43,18 @@ RUNS = [
 ]
 
 
-def main():
-    options = read_options()
-    world = make_world(options)
-    if reason := world.missing():
-        print(f'{world.name}: left out: {reason}')
-        return status_without_world(options)
-    try:
-        library = world.stub.parent / 'tests' / 'planted_library.dll'
-        loader = world.stub.parent / 'tests' / 'careless_loader.exe'
-        require(library, loader)
-        tools, _ = make_tools(options, world)
-        sources = options.work / f'{world.name}-planted'
-        shutil.rmtree(sources, ignore_errors=True)
-        image = PackedImage(IMAGE, tools).make(sources)
-        os.environ['MORIV_WINE_NATIVE'] = ','.join(NAMES)
-        world.open()
-        machine = world.machine('planted')
-        files = {FOLDER + name + '.dll': library.read_bytes() for name in NAMES}
-        files |= {SETUP: image, LOADER: loader.read_bytes()}
-        for path, content in files.items():
-            machine.files.write(path, content)
-        troubles = control(machine) + setup_runs(machine)
-        machine.discard()
-    except WorldError as error:
-        print(error, file=sys.stderr)
-        return 2
-    finally:
-        world.close()
-    print('\n'.join(troubles) or f'{world.name}: {len(NAMES)} planted libraries, none loaded')
-    return 1 if troubles else 0
+def plant(world, tools, images):
+    library = world.stub.parent / 'tests' / 'planted_library.dll'
+    loader = world.stub.parent / 'tests' / 'careless_loader.exe'
+    require(library, loader)
+    machine = world.machine('planted')
+    files = {FOLDER + name + '.dll': library.read_bytes() for name in NAMES}
+    files |= {SETUP: PackedImage(IMAGE, tools).make(images), LOADER: loader.read_bytes()}
+    for path, content in files.items():
+        machine.files.write(path, content)
+    troubles = control(machine) + setup_runs(machine)
+    machine.discard()
+    return len(troubles), '\n'.join(troubles) or f'{len(NAMES)} planted libraries, none loaded'
 
 
 def take_marks(machine):
@@ -105,4 +86,5 @@ def setup_runs(machine):
 
 
 if __name__ == '__main__':
-    sys.exit(main())
+    os.environ['MORIV_WINE_NATIVE'] = ','.join(NAMES)
+    sys.exit(in_world(read_options(), plant))

@@ -38,11 +38,11 @@ class Value:
         return self._line(self._bare(), True)
 
     def _line(self, data, terminated):
-        name = '@' if not self.name else _quote(self.name)
+        name = _quote(self.name) if self.name else '@'
         text = self._bare()
         if self.type == REG_SZ and terminated and not any(byte < 0x20 for byte in text):
             return f'{name}={_quote(text.decode("cp1252", "replace"))}'
-        return f'{name}=hex({self.type:x}):' + ','.join(f'{byte:02x}' for byte in data)
+        return f'{name}=hex({self.type:x}):{data.hex(",")}'
 
 
 @dataclass
@@ -99,11 +99,6 @@ class Registry:
             lines += [f'[{ROOT}\\{key.path}]', *values, '']
         return lines
 
-    def copy(self):
-        other = Registry()
-        other.keys = {low: Key(key.path, dict(key.values)) for low, key in self.keys.items()}
-        return other
-
 
 def changes(before, after):
     """What differs, as lines: '+ [KEY]', '- [KEY]' and '  [KEY]' for one that stays, and below a
@@ -127,12 +122,8 @@ def _value_changes(old, new):
     lines = []
     for name in sorted(old.keys() | new.keys()):
         was, now = old.get(name), new.get(name)
-        if now is not None and now.same(was):
-            continue
-        if was is not None:
-            lines.append(f'- {was}')
-        if now is not None:
-            lines.append(f'+ {now}')
+        if not now or not now.same(was):
+            lines += [f'{sign} {value}' for sign, value in (('-', was), ('+', now)) if value]
     return lines
 
 
@@ -141,13 +132,10 @@ def _quote(text):
 
 
 def _below_root(path):
-    if path.upper() == ROOT:
-        return ''
-    if path.upper().startswith(ROOT + '\\'):
-        return path[len(ROOT) + 1:]
-    if path.upper().startswith('HKEY_'):
+    root, _, rest = path.partition('\\')
+    if root.upper().startswith('HKEY_') and root.upper() != ROOT:
         raise RegistryError(f'a key outside {ROOT}: {path}')
-    return path
+    return rest if root.upper() == ROOT else path
 
 
 _QUOTED = r'"((?:[^"\\]|\\.)*)"'

@@ -33,36 +33,44 @@ class Tools:
 
 def main():
     options = read_options()
+
+    def tell(line):
+        """Prints the closing line, and keeps it for tools/test, which tells all worlds' at its end."""
+        print(line, flush=True)
+        kind = 'real-input' if options.real_input else 'scenarios'
+        options.work.mkdir(parents=True, exist_ok=True)
+        (options.work / f'{kind}.{options.world}.count').write_text(f'{kind}: {line}\n')
+
+    def play_all(world, tools, images):
+        return run_all(world, choose_scenarios(options, tools), tools, images)
+
+    return in_world(options, play_all, tell)
+
+
+def in_world(options, check, tell=print):
+    """An exit status. check(world, tools, images) gives the number of failures and the closing line, which
+    is told behind the world's name; images is a folder for the sources of images."""
     world = make_world(options)
-    reason = world.missing() or (real_input.missing() if options.real_input else '')
-    if reason:
-        tell(options, world, f'{world.name}: left out: {reason}')
-        return status_without_world(options)
-    tools, images = make_tools(options, world)
+    if reason := world.missing() or (options.real_input and real_input.missing()):
+        tell(f'{world.name}: left out: {reason}')
+        # Only what the host can't do and what was asked for is left out without a failure.
+        asked_for = os.environ.get('MORIV_WINE') == 'none' or options.world == 'wine32'
+        return LEFT_OUT if asked_for else 1
+    tools = Tools(world.stub, options.native / 'moriv-image', options.win32 / 'samples',
+                  options.work / 'real-input')
+    images = options.work / f'{world.name}-images'
     try:
         require(tools.image_tool)
-        scenarios = choose_scenarios(options, tools)
-        failures, counts = run_all(world, scenarios, tools, images)
-        tell(options, world, counts)
+        world.open()
+        shutil.rmtree(images, ignore_errors=True)
+        failures, line = check(world, tools, images)
     except (ScenarioError, WorldError) as error:
         print(error, file=sys.stderr)
         return 2
+    finally:
+        world.close()
+    tell(f'{world.name}: {line}')
     return 1 if failures else 0
-
-
-def status_without_world(options):
-    """Only what the host can't do and what was asked for is left out without a failure."""
-    asked_for = os.environ.get('MORIV_WINE') == 'none'
-    return LEFT_OUT if asked_for or options.world == 'wine32' else 1
-
-
-def tell(options, world, line):
-    """Prints the closing line, and keeps it in a file for tools/test, which tells all worlds' at its
-    end."""
-    print(line, flush=True)
-    kind = 'real-input' if options.real_input else 'scenarios'
-    options.work.mkdir(parents=True, exist_ok=True)
-    (options.work / f'{kind}.{world.name}.count').write_text(f'{kind}: {line}\n')
 
 
 def make_world(options):
@@ -71,13 +79,6 @@ def make_world(options):
     bits = int(options.world[len('wine'):])
     return Wine(bits, getattr(options, f'win{bits}'), ROOT / 'tools' / 'wine',
                 options.wine / f'scenarios{bits}')
-
-
-def make_tools(options, world):
-    """What images are made with, and the folder for their sources."""
-    tools = Tools(world.stub, options.native / 'moriv-image', options.win32 / 'samples',
-                  options.work / 'real-input')
-    return tools, options.work / f'{world.name}-images'
 
 
 def read_options():
@@ -102,45 +103,34 @@ def choose_scenarios(options, tools):
     files = sorted(HERE.glob('*.scenario'))
     if options.names:
         known = {file.stem: file for file in files}
-        for name in options.names:
-            if name not in known:
-                raise ScenarioError(f'no scenario {name}')
+        if unknown := [name for name in options.names if name not in known]:
+            raise ScenarioError(f'no scenario {unknown[0]}')
         files = [known[name] for name in options.names]
     return [parse(file.stem, file.read_text(encoding='utf-8'), file.name) for file in files]
 
 
 def run_all(world, scenarios, tools, images):
-    """Prints one line a scenario; gives the number of failures and the closing line."""
+    """Prints one line a scenario; gives the number of failures and the counts."""
     mine = [s for s in scenarios if not s.only or world.name.lower().startswith(s.only.lower())]
-    shutil.rmtree(images, ignore_errors=True)
     failures = 0
-    try:
-        world.open()
-        with ThreadPoolExecutor(world.at_once) as pool:
-            for report in pool.map(lambda s: run_one(world, s, tools, images), mine):
-                print(report, flush=True)
-                failures += not report.startswith('ok ')
-    finally:
-        world.close()
+    with ThreadPoolExecutor(world.at_once) as pool:
+        for report in pool.map(lambda s: run_one(world, s, tools, images), mine):
+            print(report, flush=True)
+            failures += not report.startswith('ok ')
     for scenario in scenarios:
         if scenario not in mine:
             print(f'skipped {scenario.name}: only {scenario.only}: {scenario.reason}')
     skipped = len(scenarios) - len(mine)
-    counts = f'{len(mine) - failures} passed, {failures} failed, {skipped} skipped'
-    return failures, f'{world.name}: {counts}'
+    return failures, f'{len(mine) - failures} passed, {failures} failed, {skipped} skipped'
 
 
 def run_one(world, scenario, tools, images):
-    """'ok NAME', or 'FAILED NAME' and why; the machine of a failure stays."""
+    """'ok NAME', or 'FAILED NAME' and why; a stand-in machine that failed stays."""
     machine = world.machine(scenario.name)
     try:
         play(scenario, machine, tools, images / scenario.name)
     except (ScenarioFailure, ScenarioError) as failure:
-        where = getattr(machine, 'folder', None)
-        kept = f'\nthe machine is kept in {where}' if where else ''
-        if not where:
-            machine.discard()
-        return f'FAILED {scenario.name}: {scenario.title}\n{failure}{kept}'
+        return f'FAILED {scenario.name}: {scenario.title}\n{failure}{machine.keep()}'
     machine.discard()
     shutil.rmtree(images / scenario.name, ignore_errors=True)
     return f'ok {scenario.name}'

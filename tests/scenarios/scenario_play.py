@@ -4,13 +4,14 @@ import difflib
 import re
 from collections import namedtuple
 from datetime import datetime, timedelta
+from os.path import commonprefix
 
 import file_tree
 import registry_text
 from package_image import Image, ImageError, damage
 from packed_image import PackedImage, file_content, quoted_bytes
 from registry_text import RegistryError
-from scenario_text import ACTIONS, CHECKS, ScenarioError
+from scenario_text import ACTIONS, ScenarioError
 
 LOG = r'C:\windows\MorivLog.txt'
 LANGUAGES = {'English': 0, 'French': 10000, 'German': 20000, 'Italian': 30000, 'Spanish': 40000}
@@ -40,14 +41,9 @@ def play(scenario, machine, tools, folder):
     tools: what images are made with (packed_image.py); folder: for the sources of the images.
     """
     player = _Player(machine, tools, folder)
-    sections = list(scenario.sections)
-    while sections:
-        section = sections.pop(0)
+    for section in scenario.sections:
         if section.keyword in ACTIONS:
-            checks = []
-            while sections and sections[0].keyword in CHECKS:
-                checks.append(sections.pop(0))
-            player.act(section, checks)
+            player.act(section)
         else:
             player.prepare(section)
 
@@ -122,7 +118,7 @@ class _Player:
 
     # Actions
 
-    def act(self, section, checks):
+    def act(self, section):
         files = self.machine.files.snapshot()
         registry = self.machine.registry()
         report = []
@@ -136,15 +132,15 @@ class _Player:
                 report.append(outcome.trouble)
         found = Found(exit_code, shown, file_tree.changes(files, self.machine.files.snapshot()),
                       registry_text.changes(registry, self.machine.registry()))
-        report += self._compare(found, checks, section)
+        report += self._compare(found, section)
         if report:
             what = f'{section.place}: {section.keyword} {section.argument}'
             raise ScenarioFailure('\n'.join([what, *report]))
 
-    def _compare(self, found, checks, action):
-        texts = {(c.argument or LOG): c for c in checks if c.keyword in ('log', 'text')}
-        others = {c.keyword: c for c in checks if c.keyword not in ('log', 'text')}
-        if len(texts) + len(others) != len(checks):
+    def _compare(self, found, action):
+        texts = {c.argument or LOG: c for c in action.checks if c.keyword in ('log', 'text')}
+        others = {c.keyword: c for c in action.checks if c.keyword not in ('log', 'text')}
+        if len(texts) + len(others) != len(action.checks):
             raise ScenarioError(f'{action.place}: two checks of the same thing')
         if (action.keyword == 'run') != ('exit' in others):
             raise ScenarioError(f'{action.place}: a run has an exit code, a restart has none')
@@ -171,9 +167,9 @@ class _Player:
             return [f'(the run did not write {path})']
         text = self.machine.files.read(path).decode('cp1252', 'replace')
         lines = []
-        parts = re.split(r'(\r\n\r\nInstalling Moriv : .*? \r\n\r\n)', text) if headings else [text]
-        for part in parts:
-            if headings and part.startswith('\r\n\r\nInstalling Moriv : '):
+        parts = re.split(r'\r\n\r\nInstalling Moriv : (.*?) \r\n\r\n', text) if headings else [text]
+        for number, part in enumerate(parts):
+            if number % 2 == 1:
                 lines.append(self._heading_line(part))
             elif part:
                 lines += [f'|{line}|' for line in part.split('\r\n')]
@@ -182,17 +178,13 @@ class _Player:
                     lines.append(f'|{part.split(chr(10))[-1]}| without a line end')
         return lines
 
-    def _heading_line(self, text):
-        """'heading' if the time in it is good, else what it says."""
-        stamp = text.strip()[len('Installing Moriv : '):]
-        try:
-            time = datetime.strptime(stamp, '%A, %d %B %Y at : %Hh %Mm %Ss')
-        except ValueError:
-            return f'heading with the time "{stamp}"'
-        # Parsing takes any name of a day and numbers without their zero.
-        exact = time.strftime('%A, %d %B %Y at : %Hh %Mm %Ss') == stamp
-        near = abs(time - (self.now or datetime.now())) <= timedelta(minutes=0 if self.now else 10)
-        return 'heading' if exact and near else f'heading with the time "{stamp}"'
+    def _heading_line(self, stamp):
+        """'heading' if the time is good, else what it is."""
+        latest = self.now or datetime.now()
+        seconds = 0 if self.now else 600
+        good = {(latest - timedelta(seconds=ago)).strftime('%A, %d %B %Y at : %Hh %Mm %Ss')
+                for ago in range(seconds + 1)}
+        return 'heading' if stamp in good else f'heading with the time "{stamp}"'
 
     def _compare_files(self, lines, found, place):
         actual = []
@@ -200,7 +192,7 @@ class _Player:
             sign, path, words = _split_file_line(line, place)
             if found.get(path) == sign:
                 del found[path]
-                actual.append(line + (self._content_trouble(path, words, place) if words else ''))
+                actual.append(line + self._content_trouble(path, words, place))
         for path, sign in found.items():
             is_file = sign != '-' and not path.endswith('\\')
             size = f' = {len(self.machine.files.read(path))} bytes' if is_file else ''
@@ -208,27 +200,15 @@ class _Player:
         return _difference('files', sorted(lines), sorted(actual))
 
     def _content_trouble(self, path, words, place):
-        expected = self._expected_content(words, place)
-        actual = self.machine.files.read(path)
+        actual = self.machine.files.read(path) if words else ''
+        expected = self._expected_content(words, place) if words else ''
         if actual == expected:
             return ''
-        common = min(len(actual), len(expected))
-        at = next((i for i in range(common) if actual[i] != expected[i]), common)
+        at = len(commonprefix([actual, expected]))
         return f' BUT {len(actual)} bytes for {len(expected)}, other from byte {at} on'
 
     def _expected_content(self, words, place):
-        try:
-            for pattern, content in self._contents():
-                match = re.fullmatch(pattern, words)
-                if match:
-                    return content(*match.groups())
-        except (KeyError, ValueError) as error:
-            raise ScenarioError(f'{place}: {words}: {error}') from error
-        raise ScenarioError(f'{place}: no such content: {words}')
-
-    def _contents(self):
-        """What may stand behind a file's '=' in a check."""
-        return [
+        contents = [  # what may stand behind a file's '='
             (r'the INF file', lambda: INF_FILE),
             (r'original (\S+)(?: of (.+))?', self._original),
             (r'first (\d+) bytes of (\S+)', lambda n, name: self._original(name, None)[:int(n)]),
@@ -236,6 +216,13 @@ class _Player:
                 Image(self.images[image]).removal_program(int(LANGUAGES.get(language, language)))),
             (r'(".*")', quoted_bytes),
         ]
+        try:
+            for pattern, content in contents:
+                if match := re.fullmatch(pattern, words):
+                    return content(*match.groups())
+        except (KeyError, ValueError) as error:
+            raise ScenarioError(f'{place}: {words}: {error}') from error
+        raise ScenarioError(f'{place}: no such content: {words}')
 
     def _original(self, name, image):
         if image is None and len(self.originals) != 1:
@@ -245,8 +232,7 @@ class _Player:
 
 def _program_and_arguments(section):
     """The path, in quotes when it has blanks, and all that stands behind it and one blank."""
-    quoted = re.match('"([^"]*)"(?: |$)(.*)', section.argument)
-    if quoted:
+    if quoted := re.match('"([^"]*)"(?: |$)(.*)', section.argument):
         return quoted.groups()
     program, _, arguments = section.argument.partition(' ')
     return program, arguments

@@ -25,6 +25,7 @@ class Section:
     argument: str            # the rest of its first line
     place: str               # FILE:LINE, for messages
     body: list = field(default_factory=list)
+    checks: list = field(default_factory=list)   # of an action
 
 
 @dataclass
@@ -44,25 +45,27 @@ def parse(name, text, file_name):
         if line.startswith('#'):
             title = title or line[1:].strip()
         elif line.startswith('  ') and sections:
-            body_line = line[2:]
-            if not body_line.startswith('#'):
-                sections[-1].body.append(body_line)
+            if not line.startswith('  #'):
+                section.body.append(_body_line(section, line[2:]))
         elif line.strip():
             match = _KEYWORD.match(line)
             if not match:
                 raise ScenarioError(f'{place}: no such section: {line}')
-            sections.append(Section(match[1], match[2].strip(), place))
-    for section in sections:
-        if section.keyword in VERBATIM:
-            _check_verbatim(section)
+            section = Section(match[1], match[2].strip(), place)
+            if section.keyword not in CHECKS:
+                sections.append(section)
+            elif sections and sections[-1].keyword in ACTIONS:
+                sections[-1].checks.append(section)
+            else:
+                raise ScenarioError(f'{place}: a check stands behind what it checks')
     return _scenario(name, title, sections, file_name)
 
 
-def _check_verbatim(section):
-    """'|TEXT|' is TEXT, so that blanks at a line's end are seen; 'heading' is a log's heading."""
-    for line in section.body:
-        if line != 'heading' and (len(line) < 2 or line[0] != '|' or line[-1] != '|'):
-            raise ScenarioError(f'{section.place}: a line of text stands between bars: {line}')
+def _body_line(section, line):
+    """In a text, '|TEXT|' is TEXT, so that blanks at its end are seen; 'heading' is a log's heading."""
+    if section.keyword in VERBATIM and line != 'heading' and not re.fullmatch(r'\|.*\|', line):
+        raise ScenarioError(f'{section.place}: a line of text stands between bars: {line}')
+    return line
 
 
 def _scenario(name, title, sections, file_name):
@@ -79,8 +82,4 @@ def _scenario(name, title, sections, file_name):
             raise ScenarioError(f'{section.place}: only the stand-in has settings')
     if not any(section.keyword in ACTIONS for section in sections):
         raise ScenarioError(f'{file_name}: nothing is run')
-    for before, section in zip([None, *sections], sections):
-        after_action = before is not None and before.keyword in ACTIONS + CHECKS
-        if section.keyword in CHECKS and not after_action:
-            raise ScenarioError(f'{section.place}: a check stands behind what it checks')
     return Scenario(name, title, only, reason, sections)

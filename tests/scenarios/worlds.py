@@ -4,6 +4,7 @@ A world gives machines, one after the other or (the stand-in) several at once. A
 tree and a registry, starts programs and can be restarted.
 """
 
+import contextlib
 import errno
 import fcntl
 import os
@@ -25,6 +26,25 @@ Outcome = namedtuple('Outcome', 'exit_code shown trouble')
 
 class WorldError(Exception):
     """The world itself can't be had or broke down."""
+
+
+class Machine:
+    """What the machines of both worlds do alike."""
+
+    def __init__(self, script):
+        """script: file for what the user of the next run does."""
+        self.script = script
+        self.has_user = False
+
+    def user(self, lines):
+        """The script of the user of the next run."""
+        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
+        self.has_user = True
+
+    def take_user(self):
+        """Whether the run that begins now has a user; the one behind it has none."""
+        had_user, self.has_user = self.has_user, False
+        return had_user
 
 
 class StandIn:
@@ -56,19 +76,14 @@ class StandIn:
         return StandInMachine(folder, self.machine_tool)
 
 
-class StandInMachine:
+class StandInMachine(Machine):
     tells_requests = True  # what the program asks of the system is shown
 
     def __init__(self, folder, machine_tool):
+        super().__init__(folder.with_suffix('.user'))
         self.folder = folder
         self.machine_tool = machine_tool
         self.files = FileTree(folder)
-        self.script = None  # of the next run's user
-
-    def user(self, lines):
-        """The script of the user of the next run."""
-        self.script = self.folder.with_suffix('.user')
-        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
 
     def settings(self, lines):
         (self.folder / 'machine.ini').write_text('\n'.join(lines) + '\n', encoding='utf-8')
@@ -82,17 +97,13 @@ class StandInMachine:
         (self.folder / 'registry.reg').write_bytes(text.encode('cp1252'))
 
     def run(self, program, arguments):
-        host = self.files.host(program)
         try:
-            done = self._start([host, arguments] if arguments else [host])
+            done = self._start([self.files.host(program), *([arguments] if arguments else [])])
         except subprocess.TimeoutExpired:
             return Outcome(None, [], f'ended after {TIME_LIMIT} seconds')
         except OSError as error:
             return Outcome(None, [], f'cannot start: {error}')
-        shown = done.stdout.decode('utf-8', 'replace').splitlines()
-        code = None
-        if shown and shown[-1].startswith('exit code: '):
-            code = int(shown.pop()[len('exit code: '):])
+        code, shown = _split_exit_code(done.stdout.decode('utf-8', 'replace').splitlines())
         return Outcome(code, shown, _trouble(done, code))
 
     def add_drive(self, letter):
@@ -102,7 +113,8 @@ class StandInMachine:
     def _start(self, command):
         """Another thread's child, before it has become a program of its own, can still hold the new
         file open for writing; then the system refuses to start it, and soon no more."""
-        environment = self._environment()
+        user = {'MORIV_USER': str(self.script)} if self.take_user() else {}
+        environment = os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'} | user
         for attempt in range(100):
             try:
                 return subprocess.run(command, cwd=self.folder, env=environment,
@@ -112,17 +124,22 @@ class StandInMachine:
                     raise
                 time.sleep(0.02)
 
-    def _environment(self):
-        user = {'MORIV_USER': str(self.script)} if self.script else {}
-        self.script = None
-        return os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'} | user
-
     def restart(self):
         _call([self.machine_tool, 'restart', self.folder])
 
+    def keep(self):
+        return f'\nthe machine is kept in {self.folder}'
+
     def discard(self):
         shutil.rmtree(self.folder)
-        self.folder.with_suffix('.user').unlink(missing_ok=True)
+        self.script.unlink(missing_ok=True)
+
+
+def _split_exit_code(lines):
+    """The exit code that the last line tells, None when it tells none, and the lines before it."""
+    if lines and lines[-1].startswith('exit code: '):
+        return int(lines[-1].removeprefix('exit code: ')), lines[:-1]
+    return None, lines
 
 
 def _trouble(done, code):
@@ -130,8 +147,7 @@ def _trouble(done, code):
     errors = done.stderr.decode('utf-8', 'replace').strip()
     if errors:
         return f'standard error (exit status {done.returncode}): {errors}'
-    expected = None if code is None else 0 if code in (0, 1) or code > 100000 else 1
-    if expected is not None and done.returncode != expected:
+    if code is not None and done.returncode != (0 if code in (0, 1) or code > 100000 else 1):
         return f'exit status {done.returncode} for exit code {code}'
     return ''
 
@@ -204,12 +220,12 @@ class Wine:
         return WineMachine(self)
 
 
-class WineMachine:
+class WineMachine(Machine):
     tells_requests = False
 
     def __init__(self, world):
+        super().__init__(Path(f'{world.prefix}.user'))
         self.world = world
-        self.script = None  # of the next run's user
         self.files = world.files
         self.agent = world.agent
         self.fresh_registry = self.registry()
@@ -246,34 +262,26 @@ class WineMachine:
         if not link.is_symlink():
             link.symlink_to(f'../drive_{letter}')
 
-    def user(self, lines):
-        """The script of the user of the next run, played by tests/windows/dialog_driver.cpp."""
-        self.script = Path(f'{self.world.prefix}.user')
-        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
-
-    def _run_with_user(self, program, arguments):
+    def run(self, program, arguments):
+        """A user's script is played by tests/windows/dialog_driver.cpp, which writes what is shown."""
+        if not self.take_user():
+            code, rest = _split_exit_code(self.agent.ask(f'run {TIME_LIMIT} {program}\t{arguments}'))
+            return Outcome(code, [], ' '.join(rest))
         shown = Path(f'{self.world.prefix}.shown')
         shown.write_bytes(b'')
-        words = [_windows_path(self.script), _windows_path(shown), f'"{program}"', arguments]
-        self.script = None
-        answer = self.agent.ask(f'run {TIME_LIMIT} {_windows_path(self.world.driver)}\t'
-                                + ' '.join(words))
-        lines = shown.read_bytes().decode('utf-8', 'replace').splitlines()
-        if lines and lines[-1].startswith('exit code: '):
-            return Outcome(int(lines.pop()[len('exit code: '):]), lines, '')
-        return Outcome(None, lines, f'the driver gave no exit code: {" ".join(answer)}')
-
-    def run(self, program, arguments):
-        if self.script:
-            return self._run_with_user(program, arguments)
-        answer = self.agent.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
-        if len(answer) == 1 and answer[0].startswith('exit code: '):
-            return Outcome(int(answer[0][len('exit code: '):]), [], '')
-        return Outcome(None, [], ' '.join(answer))
+        driver, script, output = (_windows_path(p) for p in (self.world.driver, self.script, shown))
+        answer = self.agent.ask(f'run {TIME_LIMIT} {driver}\t{script} {output} "{program}" {arguments}')
+        code, lines = _split_exit_code(shown.read_bytes().decode('utf-8', 'replace').splitlines())
+        trouble = '' if code is not None else f'the driver gave no exit code: {" ".join(answer)}'
+        return Outcome(code, lines, trouble)
 
     def restart(self):
         # Only what a start does with one-time commands; the session and the agent stay.
         _call([self.world.tool, 'run', self.world.prefix, 'wineboot', '-r'])
+
+    def keep(self):
+        self.discard()
+        return ''
 
     def discard(self):
         self.world.clean_files()
@@ -303,11 +311,9 @@ class Agent:
 
     def ask(self, command):
         """Sends one command; gives the lines of its answer."""
-        try:
+        with contextlib.suppress(BrokenPipeError):  # the missing answer tells it below
             self.process.stdin.write(command.encode('cp1252') + b'\n')
             self.process.stdin.flush()
-        except BrokenPipeError:
-            pass  # the missing answer tells it below
         lines = []
         for raw in self.process.stdout:
             line = raw.decode('cp1252', 'replace').rstrip('\r\n')

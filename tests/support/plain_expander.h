@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <cstring>
 #include <memory>
+#include <string>
 
 class PlainExpander {
  public:
@@ -159,4 +160,23 @@ class PlainExpander {
   bool magicSeen_ = false;
   uint8_t buffer_[kBufferSize] = {};
   uint32_t bufferFill_ = 0;
+};
+
+// Keeps what is written. The n-th write fails, counted from 1; 0: none does.
+class RecordingPlainExpander : public PlainExpander {
+ public:
+  explicit RecordingPlainExpander(int failingWrite = 0) : failingWrite_(failingWrite) {}
+
+  std::string output;
+  int writes = 0;
+
+ protected:
+  uint32_t Write(const uint8_t* bytes, uint32_t count) override {
+    if (++writes == failingWrite_) return 0;
+    output.append(reinterpret_cast<const char*>(bytes), count);
+    return count;
+  }
+
+ private:
+  int failingWrite_;
 };

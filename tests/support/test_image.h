@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstring>
+#include <random>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -19,10 +20,24 @@ inline std::string PackStream(std::string_view bytes) {
   return {stream.begin(), stream.end()};
 }
 
+inline std::string RandomBytes(size_t count, unsigned seed) {
+  std::mt19937 random(seed);
+  std::string bytes(count, '\0');
+  for (char& byte : bytes) byte = static_cast<char>(random());
+  return bytes;
+}
+
+// A program with a version resource of these strings.
+inline std::string ProgramWithStrings(
+    const std::vector<std::pair<std::string, std::string>>& strings, bool hasTranslation = true) {
+  const std::string resource = VersionResource(strings, 0x40C, 0x4B0, hasTranslation);
+  return PortableExecutable(false, 16, 1, {{0x40C, resource}});
+}
+
 // A program with version `version`; an empty one leaves the version resource out.
 inline std::string VersionedProgram(const std::string& version) {
-  if (version.empty()) return PortableExecutable(false, 6, 1, {{0x40C, ""}});
-  return PortableExecutable(false, 16, 1, {{0x40C, VersionResource({{"FileVersion", version}})}});
+  return version.empty() ? PortableExecutable(false, 6, 1, {{0x40C, ""}})
+                         : ProgramWithStrings({{"FileVersion", version}});
 }
 
 class ImageBuilder {

@@ -26,34 +26,10 @@ class TemporaryFolder {
 
   const std::filesystem::path& Path() const { return path_; }
 
- private:
-  std::filesystem::path path_;
-};
+  // Host path of a file in it: "drive_c/windows/a.txt".
+  std::filesystem::path Host(const std::string& path) const { return path_ / path; }
 
-class TestMachine {
- public:
-  // Starts the machine with these settings, the text of machine.ini.
-  explicit TestMachine(const std::string& settings = "") {
-    if (!settings.empty()) Write("machine.ini", settings);
-    Restart();
-  }
-
-  ~TestMachine() { machine::Stop(); }
-
-  TestMachine(const TestMachine&) = delete;
-  TestMachine& operator=(const TestMachine&) = delete;
-
-  // Starts it anew, for a program whose file is `image` in the machine's folder ("" for none).
-  void Restart(const std::string& image = "") {
-    machine::Stop();
-    std::string error;
-    ASSERT_TRUE(machine::Start(folder_.Path(), image.empty() ? "" : Host(image), &error)) << error;
-  }
-
-  // Host path of a file of the machine: "drive_c/windows/a.txt".
-  std::filesystem::path Host(const std::string& path) const { return folder_.Path() / path; }
-
-  // Writes a file behind the program's back, its directories too.
+  // Writes a file, its directories too.
   void Write(const std::string& path, const std::string& bytes) const {
     std::filesystem::create_directories(Host(path).parent_path());
     std::ofstream(Host(path), std::ios::binary) << bytes;
@@ -68,5 +44,24 @@ class TestMachine {
   bool Has(const std::string& path) const { return std::filesystem::exists(Host(path)); }
 
  private:
-  TemporaryFolder folder_;
+  std::filesystem::path path_;
+};
+
+// Files are written and read behind the program's back.
+class TestMachine : public TemporaryFolder {
+ public:
+  // Starts the machine with these settings, the text of machine.ini.
+  explicit TestMachine(const std::string& settings = "") {
+    if (!settings.empty()) Write("machine.ini", settings);
+    Restart();
+  }
+
+  ~TestMachine() { machine::Stop(); }
+
+  // Starts it anew, for a program whose file is `image` in the machine's folder ("" for none).
+  void Restart(const std::string& image = "") {
+    machine::Stop();
+    std::string error;
+    ASSERT_TRUE(machine::Start(Host(""), image.empty() ? "" : Host(image), &error)) << error;
+  }
 };

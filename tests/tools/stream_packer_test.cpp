@@ -5,75 +5,61 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <memory>
 #include <random>
+#include <span>
 #include <string>
 #include <utility>
 
 #include "tests/support/plain_expander.h"
-#include "tests/tools/tool_bench.h"
+#include "tests/support/test_image.h"
 #include "tools/image/parallel_packer.h"
 #include "tools/image/phrase_parser.h"
 
 namespace {
 
-using image::PackStream;
-using Bytes = std::vector<uint8_t>;
-
 constexpr image::PackMethod kMethods[] = {image::kPackGreedily, image::kPackFast, image::kPackBest};
 
+std::span<const uint8_t> BytesOf(const std::string& text) {
+  return {reinterpret_cast<const uint8_t*>(text.data()), text.size()};
+}
+
+std::string Pack(const std::string& file, const image::PackMethod& method,
+                 const std::function<void(size_t)>& progress = {}) {
+  const std::vector<uint8_t> stream = image::PackStream(BytesOf(file), method, progress);
+  return {stream.begin(), stream.end()};
+}
+
 // Words of a made-up language, some much more frequent than others.
-Bytes Text(size_t size, unsigned seed) {
+std::string Text(size_t size, unsigned seed) {
   std::mt19937 random(seed);
   std::vector<std::string> words(2000);
   for (std::string& word : words) {
     for (auto length = 2 + random() % 9; length > 0; --length)
       word += static_cast<char>('a' + random() % 26 % (1 + random() % 26));
   }
-  Bytes text;
-  while (text.size() < size) {
-    const std::string& word = words[random() % (1 + random() % words.size())];
-    text.insert(text.end(), word.begin(), word.end());
-    text.push_back(' ');
-  }
+  std::string text;
+  while (text.size() < size) text += words[random() % (1 + random() % words.size())] + ' ';
   text.resize(size);
   return text;
 }
 
-Bytes Joined(std::initializer_list<Bytes> parts) {
-  Bytes whole;
-  for (const Bytes& part : parts) whole.insert(whole.end(), part.begin(), part.end());
-  return whole;
-}
-
 // The first bytes of a sequence that has each pair of bytes once, so that n bytes take n codes.
-Bytes PairsOnce(size_t size) {
-  Bytes bytes;
-  for (unsigned first = 0; first < 256; ++first) {
-    bytes.push_back(static_cast<uint8_t>(first));
-    for (unsigned second = first + 1; second < 256; ++second) {
-      bytes.push_back(static_cast<uint8_t>(first));
-      bytes.push_back(static_cast<uint8_t>(second));
-    }
+std::string PairsOnce(size_t size) {
+  std::string bytes;
+  for (int first = 0; first < 256; ++first) {
+    bytes += static_cast<char>(first);
+    for (int second = first + 1; second < 256; ++second)
+      bytes += {static_cast<char>(first), static_cast<char>(second)};
   }
   bytes.resize(size);
   return bytes;
 }
 
-class CollectingPlainExpander : public PlainExpander {
- public:
-  Bytes output;
-
- protected:
-  uint32_t Write(const uint8_t* bytes, uint32_t count) override {
-    output.insert(output.end(), bytes, bytes + count);
-    return count;
-  }
-};
-
-void ExpectExpands(const Bytes& stream, const Bytes& file) {
-  const auto plain = std::make_unique<CollectingPlainExpander>();
-  plain->ExpandBlock(stream.data(), static_cast<uint32_t>(stream.size()));
+void ExpectExpands(const std::string& stream, const std::string& file) {
+  const auto plain = std::make_unique<RecordingPlainExpander>();
+  plain->ExpandBlock(BytesOf(stream).data(), static_cast<uint32_t>(stream.size()));
   plain->Flush();
   EXPECT_EQ(plain->failed(), 0);
   EXPECT_TRUE(plain->output == file)
@@ -82,13 +68,13 @@ void ExpectExpands(const Bytes& stream, const Bytes& file) {
 
 // Code 257 stands where the next free code is the last that fits, and nowhere else; no entry is
 // made beyond those of 15 bits, and an early reset stands in a planned stream alone.
-void ExpectUsualShape(const Bytes& stream, bool isPlanned) {
+void ExpectUsualShape(const std::string& stream, bool isPlanned) {
   unsigned width = 9;
   uint32_t nextFree = 258;
   for (size_t bit = 24; stream.size() * 8 - bit >= width;) {
     uint32_t code = 0;
     for (const size_t end = bit + width; bit < end; ++bit)
-      code = code << 1 | (stream[bit / 8] >> (7 - bit % 8) & 1);
+      code = code << 1 | (BytesOf(stream)[bit / 8] >> (7 - bit % 8) & 1);
     const bool isLastThatFits = nextFree == (1u << width) - 1;
     ASSERT_EQ(code == 257, isLastThatFits && width < 15) << nextFree;
     ASSERT_TRUE(code == 258 ? isPlanned || nextFree == 32767 : nextFree != 32767) << nextFree;
@@ -108,27 +94,22 @@ void ExpectUsualShape(const Bytes& stream, bool isPlanned) {
 
 TEST(StreamPacker, PacksTheWorkedExampleAndTheEmptyFile) {
   for (const image::PackMethod& method : kMethods) {
-    EXPECT_EQ(PackStream(Bytes{'a', 'b', 'a', 'b', 'a', 'b', 'a'}, method),
-              (Bytes{0x50, 0x4B, 0x5A, 0x30, 0x98, 0xA0, 0x70, 0x50}));
-    EXPECT_EQ(PackStream({}, method), (Bytes{'P', 'K', 'Z', 0}));
+    EXPECT_EQ(Pack("abababa", method), "PKZ\x30\x98\xA0\x70\x50");
+    EXPECT_EQ(Pack("", method), std::string("PKZ\0", 4));
   }
 }
 
 TEST(StreamPacker, MakesGoodStreamsOfEveryFile) {
-  const Bytes files[] = {
-      {0},
-      Bytes(1'000'000, 0),
-      RandomBytes(200'000, 1),
-      Text(700'000, 2),
-      Joined({Text(130'000, 6), RandomBytes(12'000, 7), Text(100'000, 8), RandomBytes(12'000, 9),
-              Text(150'000, 10)}),
-  };
-  for (const Bytes& file : files) {
+  const std::string files[] = {std::string(1, '\0'), std::string(1'000'000, '\0'),
+                               RandomBytes(200'000, 1), Text(700'000, 2),
+                               Text(130'000, 6) + RandomBytes(12'000, 7) + Text(100'000, 8) +
+                                   RandomBytes(12'000, 9) + Text(150'000, 10)};
+  for (const std::string& file : files) {
     SCOPED_TRACE(std::to_string(file.size()) + " bytes");
     std::vector<size_t> sizes;
     for (const image::PackMethod& method : kMethods) {
       size_t told = 0;
-      const Bytes stream = PackStream(file, method, [&told](size_t count) { told += count; });
+      const std::string stream = Pack(file, method, [&told](size_t count) { told += count; });
       EXPECT_EQ(told, file.size());
       ExpectExpands(stream, file);
       ExpectUsualShape(stream, method.plansResets);
@@ -147,8 +128,8 @@ TEST(StreamPacker, EndsWellAroundEachWideningAndReset) {
     // Behind limit - 258 codes the next free code is `limit`.
     for (size_t size = limit - 258 - 2; size <= limit - 258 + 2; ++size) {
       SCOPED_TRACE(size);
-      const Bytes file = PairsOnce(size);
-      const Bytes stream = PackStream(file, image::kPackFast);
+      const std::string file = PairsOnce(size);
+      const std::string stream = Pack(file, image::kPackFast);
       ExpectExpands(stream, file);
       ExpectUsualShape(stream, false);
     }
@@ -157,8 +138,8 @@ TEST(StreamPacker, EndsWellAroundEachWideningAndReset) {
 
 // So that a life ends where it was planned to, and costs what was planned.
 TEST(PhraseParser, CutsAPhraseOffWhereALifeEnds) {
-  const Bytes file = {'a', 'b', 'a', 'b', 'a', 'b', 'a'};  // a, b, ab, aba
-  image::PhraseParser parser(file, true);
+  const std::string file = "abababa";  // a, b, ab, aba
+  image::PhraseParser parser(BytesOf(file), true);
   for (const auto& [end, code] : {std::pair{5u, uint32_t{'a'}}, {6u, 259u}, {7u, 261u}}) {
     parser.Restart(0);
     image::Phrase phrase;
@@ -174,7 +155,7 @@ TEST(ParallelPacker, TellsAFailureAndLeavesOutWhatIsNotBegun) {
   {
     image::ParallelPacker packer(
         100'000,
-        [&begun](size_t) -> Bytes {
+        [&begun](size_t) -> std::vector<uint8_t> {
           ++begun;
           throw std::runtime_error("no");
         },

@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <functional>
-#include <span>
+#include <iosfwd>
 #include <string>
 #include <vector>
 
@@ -20,20 +20,19 @@ struct ToolRun {
   std::string err;
 };
 
-class ToolBench : public testing::Test {
+class ToolBench : public testing::Test, protected TemporaryFolder {
  protected:
-  std::filesystem::path Path(const std::string& name) const { return folder_.Path() / name; }
-  void Write(const std::string& name, std::span<const uint8_t> bytes) const;
-  void Write(const std::string& name, const std::string& text) const;
-  std::vector<uint8_t> Read(const std::string& name) const;
-  std::string ReadText(const std::string& name) const;
   // Names of all that stands in a folder, sorted.
   std::vector<std::string> NamesIn(const std::string& folder) const;
 
-  // Runs moriv-image; an argument "@name" is a path in the test's folder.
+  // Runs moriv-image; an argument "@name" is a path in the test's folder. A run that is refused
+  // says so in one line and leaves the folder as it was.
   ToolRun RunImage(const std::vector<std::string>& arguments) const;
   // The same with moriv-machine.
   ToolRun RunMachine(const std::vector<std::string>& arguments) const;
+
+  // It was refused, and this is a part of what it said.
+  static void ExpectRefused(const ToolRun& run, const std::string& said = "");
 
   // Writes stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (random), empty.txt and setup.toml,
   // and packs them as image.exe, which must succeed.
@@ -50,11 +49,6 @@ class ToolBench : public testing::Test {
   size_t RecordOffset(const std::string& image, size_t number) const;
 
  private:
-  TemporaryFolder folder_;
+  using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
+  ToolRun Run(Tool tool, std::vector<std::string> arguments) const;
 };
-
-// A program with a version resource, as a setup program without a package or as a file to pack. An
-// empty version leaves FileVersion out; without a translation no table names the string block.
-std::string MakeProgram(const std::string& version, bool hasTranslation = true);
-
-std::vector<uint8_t> RandomBytes(size_t count, unsigned seed);

@@ -2,7 +2,7 @@
 
 #include <malloc.h>
 
-#include <tuple>
+#include <cstdio>
 
 #include "core/driver.h"
 #include "machine/dialog_template.h"
@@ -17,54 +17,44 @@
 
 namespace {
 
+// One line for a window: its id, class, style, place and text.
+std::string Describe(const machine::TemplateItem& item) {
+  char line[200];
+  std::snprintf(line, sizeof(line), "%d %s %08X %d,%d %dx%d %s", item.id, item.className.c_str(),
+                item.style | item.extendedStyle, item.x, item.y, item.width, item.height,
+                item.text.c_str());
+  return line;
+}
+
 TEST(DialogResource, IsTheTemplateToTheLetter) {
   const auto bytes = machine::OwnResource(5, 116);
   ASSERT_TRUE(bytes);
   const auto dialog = machine::ReadDialogTemplate(*bytes);
   ASSERT_TRUE(dialog);
-  EXPECT_EQ(dialog->frame.style, 0x90C808C0u);
-  EXPECT_EQ(dialog->frame.extendedStyle, 0u);
-  EXPECT_EQ(
-      std::make_tuple(dialog->frame.x, dialog->frame.y, dialog->frame.width, dialog->frame.height),
-      std::make_tuple(0, 0, 315, 174));
   EXPECT_EQ(dialog->fontName, "MS Sans Serif");
   EXPECT_EQ(dialog->fontSize, 8);
-  EXPECT_EQ(dialog->frame.text, "Installation de la machine virtuelle Moriv");
-
-  struct Row {
-    int id;
-    const char* className;
-    uint32_t style;
-    int x, y, width, height;
-    const char* text;
+  const char* const rows[] = {
+      "0  90C808C0 0,0 315x174 Installation de la machine virtuelle Moriv",
+      "65535 Static 50000006 0,0 41x174 ",
+      "900 Static 5000010E 6,9 30x28 ",
+      "911 Static 50020100 4,158 37x10 www.moriv.example",
+      "910 Static 50021000 49,8 259x31 ZEB",
+      "901 Static 50020000 49,58 259x46 Message d'installation ....",
+      "65535 Static 50001007 49,48 259x1 ",
+      "903 Edit 50810080 49,130 139x12 ",
+      "904 Button 50010F00 189,130 16x12 ...",
+      "918 Static 50020000 49,158 39x10 Langue :",
+      "917 ComboBox 58230013 91,156 66x63 ",
+      "908 Button 50010000 163,156 47x14 Supprimer",
+      "907 Button 50010000 212,156 47x14 Suivant",
+      "2 Button 50010000 261,156 47x14 Annuler",
+      "65535 Static 50001007 49,148 259x1 ",
+      "921 Static 50020202 216,130 92x11 0,0 Mo",
   };
-  const Row rows[] = {{65535, "Static", 0x50000006, 0, 0, 41, 174, ""},
-                      {900, "Static", 0x5000010E, 6, 9, 30, 28, ""},
-                      {911, "Static", 0x50020100, 4, 158, 37, 10, "www.moriv.example"},
-                      {910, "Static", 0x50021000, 49, 8, 259, 31, "ZEB"},
-                      {901, "Static", 0x50020000, 49, 58, 259, 46, "Message d'installation ...."},
-                      {65535, "Static", 0x50001007, 49, 48, 259, 1, ""},
-                      {903, "Edit", 0x50810080, 49, 130, 139, 12, ""},
-                      {904, "Button", 0x50010F00, 189, 130, 16, 12, "..."},
-                      {918, "Static", 0x50020000, 49, 158, 39, 10, "Langue :"},
-                      {917, "ComboBox", 0x58230013, 91, 156, 66, 63, ""},
-                      {908, "Button", 0x50010000, 163, 156, 47, 14, "Supprimer"},
-                      {907, "Button", 0x50010000, 212, 156, 47, 14, "Suivant"},
-                      {2, "Button", 0x50010000, 261, 156, 47, 14, "Annuler"},
-                      {65535, "Static", 0x50001007, 49, 148, 259, 1, ""},
-                      {921, "Static", 0x50020202, 216, 130, 92, 11, "0,0 Mo"}};
-  ASSERT_EQ(dialog->controls.size(), std::size(rows));
-  for (size_t i = 0; i < std::size(rows); ++i) {
-    const machine::TemplateItem& control = dialog->controls[i];
-    const Row& row = rows[i];
-    EXPECT_EQ(control.id, row.id) << i;
-    EXPECT_EQ(control.className, row.className) << i;
-    EXPECT_EQ(control.style, row.style) << i;
-    EXPECT_EQ(control.extendedStyle, 0u) << i;
-    EXPECT_EQ(std::make_tuple(control.x, control.y, control.width, control.height),
-              std::make_tuple(row.x, row.y, row.width, row.height))
-        << i;
-    EXPECT_EQ(control.text, row.text) << i;
+  ASSERT_EQ(dialog->controls.size(), std::size(rows) - 1);
+  EXPECT_EQ(Describe(dialog->frame), rows[0]);
+  for (size_t i = 1; i < std::size(rows); ++i) {
+    EXPECT_EQ(Describe(dialog->controls[i - 1]), rows[i]);
   }
   EXPECT_EQ(dialog->controls[1].pictureId, 118);
 }

@@ -9,13 +9,11 @@
 // code page, names of values and data are hexadecimal bytes ("-" for none), keys lie under
 // HKEY_LOCAL_MACHINE.
 //
-//   run SECONDS PROGRAM<TAB>ARGUMENTS  starts the program with exactly these arguments, waits for
-//   its
-//                                      end: "exit code: N", "ended after N seconds" or
+//   run SECONDS PROGRAM<TAB>ARGUMENTS  starts the program with exactly these arguments and waits:
+//                                      "exit code: N", "ended after N seconds" or
 //                                      "cannot start: ERROR"
 //   key KEY                            makes the key; the values that follow are its own
 //   value TYPE NAME DATA               sets a value
-//   unset NAME                         deletes a value
 //   delete KEY                         deletes a key and all below it, if it is there
 //   dump KEY                           prints the key and all below it as "key" and "value" lines;
 //                                      nothing for a key that is not there
@@ -85,7 +83,7 @@ void RunProgram(std::string line) {
   CloseHandle(process.hProcess);
 }
 
-// The key that "value" and "unset" act on: the last one that "key" named.
+// The key that "value" acts on: the last one that "key" named.
 HKEY selectedKey = nullptr;
 
 void CloseSelectedKey() {
@@ -107,12 +105,6 @@ void SetValue(std::string line) {
   const LSTATUS error =
       RegSetValueExA(selectedKey, name.c_str(), 0, type, reinterpret_cast<const BYTE*>(data.data()),
                      static_cast<DWORD>(data.size()));
-  if (error != ERROR_SUCCESS) PrintFailure(name.c_str(), error);
-}
-
-void UnsetValue(const std::string& nameInHex) {
-  const std::string name = BytesFromHex(nameInHex);
-  const LSTATUS error = RegDeleteValueA(selectedKey, name.c_str());
   if (error != ERROR_SUCCESS) PrintFailure(name.c_str(), error);
 }
 
@@ -163,8 +155,6 @@ void CarryOut(std::string line) {
     SelectKey(line);
   } else if (command == "value") {
     SetValue(line);
-  } else if (command == "unset") {
-    UnsetValue(line);
   } else if (command == "delete") {
     DeleteKey(line);
   } else if (command == "dump") {
