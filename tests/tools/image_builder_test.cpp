@@ -157,7 +157,7 @@ TEST_F(ImagePacking, RefusesBadDescriptionsWithTheirLine) {
       {"[package\n", 1, ""},
       {"[packages]\n", 1, "unknown key \"packages\""},
       {"[package]\nremoval = 1\n", 2, "removal"},
-      {"[package]\nspace_needed = 2147483648\n", 2, "space_needed"},
+      {"[package]\nspace_needed = 4294967296\n", 2, "space_needed"},
       {"[package]\n\ntitle = 'x'\n", 3, "unknown key \"title\""},
       {"[package]\ndefault_language = 'latin'\n", 2, "default_language"},
       {"[package]\ndefault_directory = 5\n", 2, "default_directory"},
