@@ -2,28 +2,16 @@
 
 #ifdef _WIN32
 
-#include <cstring>
-
 namespace contract {
 namespace {
 
 int button;
 std::string folder;
 
-BOOL CALLBACK FindModal(HWND window, LPARAM found) {
-  char className[8] = "";
-  GetClassNameA(window, className, sizeof(className));
-  const bool isDialog = std::strcmp(className, "#32770") == 0;
-  if (!isDialog || IsWindowVisible(window) == FALSE || IsWindowEnabled(window) == FALSE)
-    return TRUE;
-  *reinterpret_cast<HWND*>(found) = window;
-  return FALSE;
-}
-
-// The timer's message comes when no other waits, in the loop of the box or picker.
+// The timer's message comes when no other waits, in the loop of the box or picker, which is then
+// the active window of the thread.
 void CALLBACK Answer(HWND, UINT, UINT_PTR timer, DWORD) {
-  HWND modal = nullptr;
-  EnumThreadWindows(GetCurrentThreadId(), FindModal, reinterpret_cast<LPARAM>(&modal));
+  const HWND modal = GetActiveWindow();
   if (modal == nullptr) return;
   KillTimer(nullptr, timer);
   if (!folder.empty()) {

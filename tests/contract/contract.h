@@ -51,8 +51,8 @@ struct Shown {
 void Expect(const Shown& actual, const Shown& expected, const std::string& row = "",
             std::source_location where = std::source_location::current());
 
-// The same for calls, made from left to right, that all answer alike.
-void ExpectEach(std::initializer_list<Shown> actual, const Shown& expected,
+// The same for calls, made from left to right: each has its own answer, or all have the one.
+void ExpectEach(std::initializer_list<Shown> actual, std::initializer_list<Shown> expected,
                 const std::string& row = "",
                 std::source_location where = std::source_location::current());
 
@@ -61,8 +61,11 @@ HANDLE Open(const std::string& name, DWORD access, DWORD share = 0);
 HANDLE Create(const std::string& name, DWORD attributes = FILE_ATTRIBUTE_NORMAL);
 // Whether an open has worked; what it opened is closed again.
 bool Opens(HANDLE file);
+// What is read, or "failed"; whether all is written.
+std::string Read(HANDLE file, DWORD count);
+BOOL Write(HANDLE file, const std::string& bytes);
 
-// A file's bytes, written and read as one; "none" for a file that can't be opened.
+// A whole file; "failed" for one that can't be read.
 void WriteText(const std::string& path, const std::string& bytes);
 std::string ReadText(const std::string& path);
 

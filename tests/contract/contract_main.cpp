@@ -64,11 +64,13 @@ void Expect(const Shown& actual, const Shown& expected, const std::string& row,
               actual.text + ", not " + expected.text + ';';
 }
 
-void ExpectEach(std::initializer_list<Shown> actual, const Shown& expected, const std::string& row,
-                std::source_location where) {
-  int number = 0;
+void ExpectEach(std::initializer_list<Shown> actual, std::initializer_list<Shown> expected,
+                const std::string& row, std::source_location where) {
+  if (expected.size() != 1) Expect(expected.size(), actual.size(), "answers", where);
+  const Shown* answer = expected.begin();
   for (const Shown& one : actual) {
-    Expect(one, expected, row + " call " + std::to_string(++number), where);
+    Expect(one, *answer, row + " call " + std::to_string(&one - actual.begin() + 1), where);
+    if (answer + 1 != expected.end()) ++answer;
   }
 }
 
@@ -86,22 +88,32 @@ bool Opens(HANDLE file) {
   return file != INVALID_HANDLE_VALUE && CloseHandle(file) != FALSE;
 }
 
+std::string Read(HANDLE file, DWORD count) {
+  std::string bytes(count, '?');
+  DWORD done = 99;
+  if (ReadFile(file, bytes.data(), count, &done, nullptr) == FALSE) return "failed";
+  bytes.resize(done);
+  return bytes;
+}
+
+BOOL Write(HANDLE file, const std::string& bytes) {
+  const auto count = static_cast<DWORD>(bytes.size());
+  DWORD done = 99;
+  const BOOL isWritten = WriteFile(file, bytes.data(), count, &done, nullptr);
+  Expect(done, isWritten != FALSE ? count : 0);
+  return isWritten;
+}
+
 void WriteText(const std::string& path, const std::string& bytes) {
   const HANDLE file = Create(path);
-  DWORD done = 0;
-  Expect(WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr), TRUE,
-         path);
-  CloseHandle(file);
+  ExpectEach({Write(file, bytes), CloseHandle(file)}, {TRUE}, path);
 }
 
 std::string ReadText(const std::string& path) {
   const HANDLE file = Open(path, GENERIC_READ);
-  if (file == INVALID_HANDLE_VALUE) return "none";
-  std::string bytes(GetFileSize(file, nullptr), '?');
-  DWORD done = 0;
-  ReadFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
+  const DWORD size = GetFileSize(file, nullptr);
+  const std::string bytes = Read(file, size != INVALID_FILE_SIZE ? size : 0);
   CloseHandle(file);
-  bytes.resize(done);
   return bytes;
 }
 

@@ -1,7 +1,4 @@
 // The dialog and its controls: start and end, look-ups, styles, texts, focus, default button.
-#include <cstdio>
-#include <vector>
-
 #include "tests/contract/standing_dialog.h"
 
 namespace contract {
@@ -12,7 +9,7 @@ CONTRACT(Dialog, InitialisesWithItsDataAndFirstTabStop) {
       RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
         if (message == WM_MEASUREITEM) {
           const auto& measure = *reinterpret_cast<const MEASUREITEMSTRUCT*>(lParam);
-          ExpectEach({wParam, measure.CtlID}, 14);
+          ExpectEach({wParam, measure.CtlID}, {14});
           Expect(measure.CtlType, ODT_COMBOBOX);
           if (order.empty()) order = "measure";
         }
@@ -21,8 +18,8 @@ CONTRACT(Dialog, InitialisesWithItsDataAndFirstTabStop) {
           Expect(reinterpret_cast<HWND>(wParam), edit);
           Expect(lParam, kData);
           order += ", init";
-          ExpectEach({EndDialog(edit, 9), EndDialog(nullptr, 9)}, FALSE, "no dialog");
-          ExpectEach({EndDialog(dialog, 3), EndDialog(dialog, 0x10004)}, TRUE);
+          ExpectEach({EndDialog(edit, 9), EndDialog(nullptr, 9)}, {FALSE}, "no dialog");
+          ExpectEach({EndDialog(dialog, 3), EndDialog(dialog, 0x10004)}, {TRUE});
           Expect(GetDlgItem(dialog, 10), edit, "it stands until the handler returns");
         }
         if (IsStep(message)) order += ", a step behind the end";
@@ -40,20 +37,16 @@ CONTRACT(Dialog, LookUpsFollowRenumberingInTabOrder) {
     Expect(SetWindowLongA(first, GWL_ID, 20), 9);
     const HWND second = GetDlgItem(dialog, 9);
     Expect(second != nullptr && second != first, true);
-    Expect(GetDlgItem(dialog, 20), first);
-    Expect(GetWindowLongA(first, GWL_ID), 20);
-    Expect(SetWindowLongA(second, GWL_ID, 20), 9);
-    Expect(GetDlgItem(dialog, 20), first);
-    Expect(GetDlgItem(dialog, 9), nullptr);
-
-    ExpectEach({IsWindow(first), DestroyWindow(first)}, TRUE);
-    Expect(GetDlgItem(dialog, 20), second);
+    ExpectEach({GetDlgItem(dialog, 20), GetWindowLongA(first, GWL_ID),
+                SetWindowLongA(second, GWL_ID, 20), GetDlgItem(dialog, 20), GetDlgItem(dialog, 9),
+                IsWindow(first), DestroyWindow(first), GetDlgItem(dialog, 20)},
+               {first, 20, 9, first, nullptr, TRUE, TRUE, second});
     for (const HWND none : {first, HWND{nullptr}}) {
       ExpectEach(
           {IsWindow(none), DestroyWindow(none), SetWindowLongA(none, GWL_ID, 12),
            GetWindowLongA(none, GWL_STYLE), ShowWindow(none, SW_HIDE), EnableWindow(none, TRUE),
            SetWindowTextA(none, "x"), SendMessageA(none, WM_GETTEXT, 0, 0), GetDlgItem(none, 10)},
-          0);
+          {0});
     }
   });
 }
@@ -62,14 +55,11 @@ CONTRACT(Dialog, StyleTellsAndSetsTheState) {
   RunStanding([](HWND dialog) {
     const HWND button = GetDlgItem(dialog, 11);
     constexpr uint32_t kShown = 0x50010000;
-    Expect(StyleOf(button), kShown);
-    Expect(ShowWindow(button, SW_HIDE), TRUE);
-    ExpectEach({ShowWindow(button, SW_HIDE), EnableWindow(button, FALSE)}, FALSE);
-    Expect(EnableWindow(button, FALSE), TRUE);
-    Expect(StyleOf(button), (kShown & ~0x10000000u) | 0x08000000u);
-    Expect(EnableWindow(button, TRUE), TRUE);
-    Expect(ShowWindow(button, SW_SHOW), FALSE);
-    Expect(SetWindowLongA(button, GWL_STYLE, static_cast<LONG>(kShown | 0xB00)), kShown);
+    ExpectEach({StyleOf(button), ShowWindow(button, SW_HIDE), ShowWindow(button, SW_HIDE),
+                EnableWindow(button, FALSE), EnableWindow(button, FALSE), StyleOf(button),
+                EnableWindow(button, TRUE), ShowWindow(button, SW_SHOW),
+                SetWindowLongA(button, GWL_STYLE, static_cast<LONG>(kShown | 0xB00))},
+               {kShown, TRUE, FALSE, FALSE, TRUE, 0x48010000, TRUE, FALSE, kShown});
     // The type is the low four bits; the others stay.
     SendMessageA(button, BM_SETSTYLE, BS_DEFPUSHBUTTON, TRUE);
     Expect(StyleOf(button), kShown | 0xB01);
@@ -89,16 +79,11 @@ CONTRACT(Dialog, TextsAreCutToTheBuffer) {
     };
     for (const int id : {9, 10, 11}) {
       const HWND control = GetDlgItem(dialog, id);
-      const std::string row = std::to_string(id);
-      Expect(SetWindowTextA(control, "abcdef"), TRUE, row);
-      Expect(read(control, 8), "6 abcdef", row);
-      Expect(read(control, 4), "3 abc", row);
-      Expect(read(control, 1), "0 ", row);
-      Expect(read(control, 0), "0 before", row);
-      ExpectEach({SendMessageA(control, WM_SETTEXT, 0, reinterpret_cast<LPARAM>("x")),
-                  SetWindowTextA(control, nullptr)},
-                 TRUE, row);
-      Expect(read(control, 8), "0 ", row);
+      ExpectEach(
+          {SetWindowTextA(control, "abcdef"), read(control, 8), read(control, 4), read(control, 1),
+           read(control, 0), SendMessageA(control, WM_SETTEXT, 0, reinterpret_cast<LPARAM>("x")),
+           read(control, 8), SetWindowTextA(control, nullptr), read(control, 8)},
+          {TRUE, "6 abcdef", "3 abc", "0 ", "0 before", TRUE, "1 x", TRUE, "0 "});
     }
     Expect(read(dialog, 8), "5 Title");
   });
@@ -127,19 +112,13 @@ CONTRACT(Focus, ControlThatGoesPassesItOn) {
     const HWND button = GetDlgItem(dialog, 11);
     const HWND other = GetDlgItem(dialog, 12);
     SetFocus(edit);
-    Expect(SetFocus(other), edit);
-    DestroyWindow(other);
-    Expect(SetFocus(edit), edit, "destroyed");
-    ShowWindow(edit, SW_HIDE);
-    Expect(SetFocus(button), button, "hidden");
-    ShowWindow(edit, SW_SHOW);
-    Expect(SetFocus(button), button, "shown again");
+    ExpectEach({SetFocus(other), DestroyWindow(other), SetFocus(edit)}, {edit, TRUE, edit});
+    ExpectEach({ShowWindow(edit, SW_HIDE), SetFocus(button)}, {TRUE, button});
+    ExpectEach({ShowWindow(edit, SW_SHOW), SetFocus(button)}, {FALSE, button});
     // A disabled control keeps nothing and gets nothing.
-    EnableWindow(button, FALSE);
-    ExpectEach({SetFocus(button), SetFocus(nullptr)}, nullptr);
-    SetFocus(dialog);
-    ExpectEach({SetFocus(edit), SetFocus(nullptr)}, edit, "the dialog passes it on");
-    Expect(SetFocus(edit), nullptr);
+    ExpectEach({EnableWindow(button, FALSE), SetFocus(button), SetFocus(nullptr)}, {0});
+    SetFocus(dialog);  // it passes it on
+    ExpectEach({SetFocus(edit), SetFocus(nullptr), SetFocus(edit)}, {edit, edit, nullptr});
   });
 }
 

@@ -12,23 +12,6 @@ int OpenDescriptor(const char* name, int access = _O_RDONLY) {
   return _sopen(name, access | _O_BINARY, _SH_DENYNO);
 }
 
-// What is read, or "failed".
-std::string Read(HANDLE file, DWORD count) {
-  std::string bytes(count, '?');
-  DWORD done = 99;
-  if (ReadFile(file, bytes.data(), count, &done, nullptr) == FALSE) return "failed";
-  bytes.resize(done);
-  return bytes;
-}
-
-BOOL Write(HANDLE file, const std::string& bytes) {
-  DWORD done = 99;
-  const BOOL written =
-      WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
-  Expect(done, written != FALSE ? bytes.size() : 0);
-  return written;
-}
-
 DWORD Seek(HANDLE file, LONG distance, DWORD method) {
   return SetFilePointer(file, distance, nullptr, method);
 }
@@ -36,76 +19,64 @@ DWORD Seek(HANDLE file, LONG distance, DWORD method) {
 }  // namespace
 
 CONTRACT(Files, EachOpenerSharesWhatTheOtherDoes) {
-  const struct {
-    DWORD access, share;    // of the first
-    DWORD access2, share2;  // of the second
-    bool opens;
-  } rows[] = {{GENERIC_READ, kShareNone, GENERIC_READ, kShareBoth, false},
-              {GENERIC_READ, kShareBoth, GENERIC_READ, kShareNone, false},
-              {GENERIC_READ, kShareRead, GENERIC_READ, kShareRead, true},
-              {GENERIC_READ, kShareRead, GENERIC_WRITE, kShareBoth, false},
-              {GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareRead, false},
-              {GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareBoth, true}};
   const char* const name = "C:\\contract\\shared";
   WriteText(name, "x");
-  for (size_t i = 0; i < std::size(rows); ++i) {
-    const HANDLE first = Open(name, rows[i].access, rows[i].share);
-    const HANDLE second = Open("c:/CONTRACT/Shared", rows[i].access2, rows[i].share2);
-    Expect(Opens(second), rows[i].opens, "row " + std::to_string(i));
+  const auto shares = [&](DWORD access, DWORD share, DWORD access2, DWORD share2) {
+    const HANDLE first = Open(name, access, share);
+    const bool isShared = Opens(Open("c:/CONTRACT/Shared", access2, share2));
     Expect(CloseHandle(first), TRUE);
-  }
+    return isShared;
+  };
+  ExpectEach({shares(GENERIC_READ, kShareRead, GENERIC_READ, kShareRead),
+              shares(GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareBoth)},
+             {true});
+  ExpectEach({shares(GENERIC_READ, kShareNone, GENERIC_READ, kShareBoth),
+              shares(GENERIC_READ, kShareBoth, GENERIC_READ, kShareNone),
+              shares(GENERIC_READ, kShareRead, GENERIC_WRITE, kShareBoth),
+              shares(GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareRead)},
+             {false});
 
   // Descriptors let everyone read and write, but not delete.
   const HANDLE exclusive = Open(name, GENERIC_READ);
-  ExpectEach({OpenDescriptor(name), _creat(name, kOwnerMayReadAndWrite)}, -1);
-  Expect(DeleteFileA(name), FALSE);
-  CloseHandle(exclusive);
+  ExpectEach({OpenDescriptor(name), _creat(name, kOwnerMayReadAndWrite), DeleteFileA(name),
+              CloseHandle(exclusive)},
+             {-1, -1, FALSE, TRUE});
   const int descriptor = OpenDescriptor(name);
-  Expect(Opens(Open(name, GENERIC_READ)), false);
-  Expect(Opens(Open(name, GENERIC_READ, kShareBoth)), true);
-  ExpectEach({DeleteFileA(name), _close(descriptor)}, 0);
-  Expect(DeleteFileA(name), TRUE);
+  ExpectEach({Opens(Open(name, GENERIC_READ)), Opens(Open(name, GENERIC_READ, kShareBoth)),
+              DeleteFileA(name), _close(descriptor), DeleteFileA(name)},
+             {false, true, FALSE, 0, TRUE});
 }
 
 CONTRACT(Files, PositionsHaveThirtyTwoBits) {
   const HANDLE file = Create("C:\\contract\\positions");
   Expect(Write(file, "abc"), TRUE);
   ExpectEach({Seek(file, -1, FILE_BEGIN), Seek(file, -4, FILE_CURRENT), Seek(file, 0, 3)},
-             INVALID_SET_FILE_POINTER);
-  Expect(Seek(file, 0, FILE_CURRENT), 3, "a refused move moves nothing");
-  Expect(Seek(file, INT32_MAX, FILE_BEGIN), 0x7FFFFFFF);
-  Expect(Seek(file, INT32_MAX, FILE_CURRENT), 0xFFFFFFFE);
-  Expect(Seek(file, 1, FILE_CURRENT), INVALID_SET_FILE_POINTER);
+             {INVALID_SET_FILE_POINTER});
+  // A refused move moves nothing.
+  ExpectEach({Seek(file, 0, FILE_CURRENT), Seek(file, INT32_MAX, FILE_BEGIN),
+              Seek(file, INT32_MAX, FILE_CURRENT), Seek(file, 1, FILE_CURRENT)},
+             {3, 0x7FFFFFFF, 0xFFFFFFFE, INVALID_SET_FILE_POINTER});
   LONG high = 1;
-  Expect(SetFilePointer(file, 5, &high, FILE_BEGIN), 5);
-  Expect(high, 1);
-  Expect(Read(file, 4), "", "far behind the end");
-  // Wine gives the lower half.
-  if (!IsWine()) {
-    Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER, "nowhere for the upper half");
-  }
-  Expect(Seek(file, 2, FILE_END), 5);
-  Expect(GetFileSize(file, nullptr), 3, "a move behind the end adds nothing");
-  Expect(Write(file, "z"), TRUE);
-  Expect(Seek(file, 1, FILE_BEGIN), 1);
-  Expect(Read(file, 100), std::string("bc\0\0z", 5));
-  Expect(Read(file, 1), "");
-  ExpectEach({Write(file, ""), CloseHandle(file)}, TRUE);
-  Expect(CloseHandle(file), FALSE);
-  Expect(Read(file, 1), "failed");
-  ExpectEach({GetFileSize(file, nullptr), Seek(file, 0, FILE_BEGIN)}, INVALID_FILE_SIZE);
+  ExpectEach({SetFilePointer(file, 5, &high, FILE_BEGIN), high, Read(file, 4)}, {5, 1, ""});
+  // There is nowhere for the upper half; Wine gives the lower one.
+  if (!IsWine()) Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER);
+  // A move behind the end adds nothing.
+  ExpectEach({Seek(file, 2, FILE_END), GetFileSize(file, nullptr), Write(file, "z"),
+              Seek(file, 1, FILE_BEGIN), Read(file, 100), Read(file, 1)},
+             {5, 3, TRUE, 1, std::string("bc\0\0z", 5), ""});
+  ExpectEach({Write(file, ""), CloseHandle(file)}, {TRUE});
+  ExpectEach({CloseHandle(file), Read(file, 1)}, {FALSE, "failed"});
+  ExpectEach({GetFileSize(file, nullptr), Seek(file, 0, FILE_BEGIN)}, {INVALID_FILE_SIZE});
 }
 
-CONTRACT(Files, AccessIsWhatWasAskedFor) {
-  const char* const name = "C:\\contract\\access";
-  WriteText(name, "old");
+CONTRACT(Files, OpenGivesTheAccessAskedForAndCreateCuts) {
+  const char* const name = "C:\\contract\\Old.Log";
+  WriteText(name, "long text");
+  WriteText("C:\\contract\\OLD.log", "old");
   const HANDLE reader = Open(name, GENERIC_READ);
-  Expect(Write(reader, "x"), FALSE);
-  CloseHandle(reader);
+  ExpectEach({Write(reader, "x"), CloseHandle(reader)}, {FALSE, TRUE});
   const HANDLE writer = Open(name, GENERIC_WRITE);
-  Expect(Read(writer, 1), "failed");
-  Expect(Write(writer, "N"), TRUE);
-  CloseHandle(writer);
+  ExpectEach({Read(writer, 1), Write(writer, "N"), CloseHandle(writer)}, {"failed", TRUE, TRUE});
   Expect(ReadText(name), "Nld");
 }
 
@@ -121,20 +92,14 @@ CONTRACT(Files, SomeCanBeNeitherOpenedNorMade) {
         "Q:\\x"}) {
     ExpectEach({Opens(Open(name, GENERIC_READ)), Opens(Create(name)), DeleteFileA(name),
                 CopyFileA("C:\\contract\\plain", name, FALSE), CopyFileA(name, copy, FALSE)},
-               FALSE, name);
-    ExpectEach({_creat(name, kOwnerMayReadAndWrite), OpenDescriptor(name)}, -1, name);
+               {FALSE}, name);
+    ExpectEach({_creat(name, kOwnerMayReadAndWrite), OpenDescriptor(name)}, {-1}, name);
   }
   ExpectEach({Open("C:\\contract\\absent", GENERIC_WRITE),
               CreateFileA(nullptr, GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr)},
-             INVALID_HANDLE_VALUE);
+             {INVALID_HANDLE_VALUE});
   ExpectEach({GetFileAttributesA("C:\\contract\\absent"), GetFileAttributesA(copy)},
-             INVALID_FILE_ATTRIBUTES);
-}
-
-CONTRACT(Files, CreateCutsAndKeepsTheNameThatIsThere) {
-  WriteText("C:\\contract\\Old.Log", "long text");
-  WriteText("C:\\contract\\OLD.log", "new");
-  Expect(ReadText("C:\\contract\\old.log"), "new");
+             {INVALID_FILE_ATTRIBUTES});
 }
 
 CONTRACT(Files, ReadOnlyOnesAreNeitherWrittenNorDeleted) {
@@ -149,8 +114,8 @@ CONTRACT(Files, ReadOnlyOnesAreNeitherWrittenNorDeleted) {
     WriteText("C:\\contract\\other", "new");
     ExpectEach({Opens(Open(fixed, GENERIC_WRITE)), Opens(Create(fixed)),
                 CopyFileA("C:\\contract\\other", fixed, FALSE)},
-               FALSE);
-    ExpectEach({_creat(fixed, kOwnerMayReadAndWrite), OpenDescriptor(fixed, _O_WRONLY)}, -1);
+               {FALSE});
+    ExpectEach({_creat(fixed, kOwnerMayReadAndWrite), OpenDescriptor(fixed, _O_WRONLY)}, {-1});
   }
   Expect(ReadText(fixed), "kept");
   Expect(Opens(Create("C:\\contract\\made", FILE_ATTRIBUTE_READONLY)), true);
@@ -187,34 +152,33 @@ CONTRACT(Files, CopiesCarryBytesAndAttributes) {
   const char* const copy = "C:\\contract\\copy";
   WriteText(self, "whole");
   HANDLE holder = Open(self, GENERIC_READ, kShareRead);
-  Expect(CopyFileA(self, copy, FALSE), TRUE);
-  Expect(CopyFileA(from, self, FALSE), FALSE, "held target");
-  CloseHandle(holder);
+  ExpectEach({CopyFileA(self, copy, FALSE), CopyFileA(from, self, FALSE), CloseHandle(holder)},
+             {TRUE, FALSE, TRUE});
   holder = Open(self, GENERIC_READ);
-  Expect(CopyFileA(self, copy, FALSE), FALSE);
-  CloseHandle(holder);
+  ExpectEach({CopyFileA(self, copy, FALSE), CloseHandle(holder)}, {FALSE, TRUE});
   ExpectEach({CopyFileA(self, "C:\\contract\\SELF", FALSE),
               CopyFileA("C:\\contract\\absent", copy, FALSE)},
-             FALSE);
+             {FALSE});
   Expect(ReadText(self), "whole");
 }
 
 CONTRACT(Files, DirectoriesComeOneByOneAndGoEmpty) {
-  Expect(CreateDirectoryA("C:\\contract\\A\\b", nullptr), FALSE, "no parent");
-  Expect(CreateDirectoryA("C:\\contract\\A", nullptr), TRUE);
-  Expect(CreateDirectoryA("C:\\contract\\a", nullptr), FALSE, "there already");
-  Expect(CreateDirectoryA("C:\\contract\\a\\b\\", nullptr), TRUE);
+  ExpectEach(
+      {CreateDirectoryA("C:\\contract\\A\\b", nullptr),
+       CreateDirectoryA("C:\\contract\\A", nullptr), CreateDirectoryA("C:\\contract\\a", nullptr),
+       CreateDirectoryA("C:\\contract\\a\\b\\", nullptr)},
+      {FALSE, TRUE, FALSE, TRUE});
   WriteText("C:\\contract\\a\\b\\file", "x");
   for (const char* name : {"C:\\contract\\a\\b\\file", "C:\\contract\\a\\b\\file\\x", "C:\\", "",
                            "Q:\\x", "C:\\contract\\a\\x?y"}) {
-    ExpectEach({CreateDirectoryA(name, nullptr), RemoveDirectoryA(name)}, FALSE, name);
+    ExpectEach({CreateDirectoryA(name, nullptr), RemoveDirectoryA(name)}, {FALSE}, name);
   }
   ExpectEach({RemoveDirectoryA("C:\\contract\\a"), RemoveDirectoryA("C:\\contract\\a\\b"),
               RemoveDirectoryA("C:\\contract\\absent"), DeleteFileA("C:\\contract\\a\\b")},
-             FALSE);
+             {FALSE});
   ExpectEach({DeleteFileA("C:\\contract\\a\\b\\FILE"), RemoveDirectoryA("C:\\contract\\a\\b"),
               RemoveDirectoryA("C:\\contract\\a\\")},
-             TRUE);
+             {TRUE});
   Expect(GetFileAttributesA("C:\\contract\\a"), INVALID_FILE_ATTRIBUTES);
 }
 

@@ -49,34 +49,26 @@ CONTRACT(Modal, BoxGivesTheButtonWhileTheDialogsStepsRun) {
 }
 
 CONTRACT(Modal, PickerGivesAListOrNone) {
-  char name[MAX_PATH] = {};
-  BROWSEINFOA browse = {};
-  browse.pszDisplayName = name;
-  browse.lpszTitle = "Where?";
-  IMalloc* allocator = nullptr;
-  Expect(SHGetMalloc(&allocator), S_OK);
-  RunAsking(
-      [&](HWND dialog) {
-        browse.hwndOwner = dialog;
-        AnswerNext(IDOK, "C:\\contract");
-        const LPITEMIDLIST list = SHBrowseForFolderA(&browse);
-        char path[MAX_PATH] = {};
-        Expect(SHGetPathFromIDListA(list, path), TRUE);
-        Expect(path, "C:\\contract");
-        allocator->Free(list);
-      },
-      false);
-  RunAsking(
-      [&](HWND dialog) {
-        browse.hwndOwner = dialog;
-        AnswerNext(IDCANCEL);
-        Expect(SHBrowseForFolderA(&browse) != nullptr, false);
-      },
-      false);
-  char path[MAX_PATH] = {};
-  Expect(SHGetPathFromIDListA(nullptr, path), FALSE);
-  allocator->Free(nullptr);
-  allocator->Release();
+  // What is picked, or "none".
+  const auto pick = [](HWND owner, int button, const char* folder) -> std::string {
+    char name[MAX_PATH] = {};
+    BROWSEINFOA browse = {};
+    browse.hwndOwner = owner;
+    browse.pszDisplayName = name;
+    browse.lpszTitle = "Where?";
+    AnswerNext(button, folder);
+    const LPITEMIDLIST list = SHBrowseForFolderA(&browse);
+    char path[MAX_PATH] = {};
+    Expect(SHGetPathFromIDListA(list, path), list != nullptr);
+    IMalloc* allocator = nullptr;
+    Expect(SHGetMalloc(&allocator), S_OK);
+    allocator->Free(list);
+    allocator->Release();
+    return list != nullptr ? path : "none";
+  };
+  RunAsking([&](HWND dialog) { Expect(pick(dialog, IDOK, "C:\\contract"), "C:\\contract"); },
+            false);
+  RunAsking([&](HWND dialog) { Expect(pick(dialog, IDCANCEL, ""), "none"); }, false);
 }
 
 }  // namespace contract

@@ -7,28 +7,19 @@
 namespace contract {
 
 CONTRACT(List, GivesBackWhatItWasGiven) {
-  const struct {
-    UINT message;
-    int wParam;
-    LPARAM lParam;
-    LRESULT result;
-  } rows[] = {{CB_GETCOUNT, 0, 0, 0},         {CB_GETCURSEL, 0, 0, CB_ERR},
-              {CB_GETITEMDATA, 0, 0, CB_ERR}, {CB_SETCURSEL, 0, 0, CB_ERR},
-              {CB_ADDSTRING, 0, 1000, 0},     {CB_ADDSTRING, 0, 900, 1},
-              {CB_GETCOUNT, 0, 0, 2},         {CB_GETITEMDATA, 1, 0, 900},
-              {CB_SETCURSEL, 1, 0, 1},        {CB_GETCURSEL, 0, 0, 1},
-              {CB_SETCURSEL, 2, 0, CB_ERR},   {CB_SETCURSEL, 0, 0, 0},
-              {CB_SETCURSEL, -1, 0, CB_ERR},  {CB_GETCURSEL, 0, 0, CB_ERR},
-              {CB_GETITEMDATA, 2, 0, CB_ERR}, {CB_GETITEMDATA, -1, 0, CB_ERR},
-              {CB_SETITEMDATA, 2, 5, CB_ERR}, {CB_SETITEMDATA, 0, 5, TRUE},
-              {CB_GETITEMDATA, 0, 0, 5}};
-  RunStanding([&](HWND dialog) {
-    int number = 0;
-    for (const auto& row : rows) {
-      const auto wParam = static_cast<WPARAM>(row.wParam);
-      Expect(SendMessageA(GetDlgItem(dialog, 14), row.message, wParam, row.lParam), row.result,
-             "row " + std::to_string(number++));
-    }
+  RunStanding([](HWND dialog) {
+    const auto send = [&](UINT message, int wParam = 0, LPARAM lParam = 0) {
+      return SendMessageA(GetDlgItem(dialog, 14), message, static_cast<WPARAM>(wParam), lParam);
+    };
+    ExpectEach({send(CB_GETCURSEL), send(CB_GETITEMDATA), send(CB_SETCURSEL)}, {CB_ERR});
+    ExpectEach({send(CB_GETCOUNT), send(CB_ADDSTRING, 0, 1000), send(CB_ADDSTRING, 0, 900),
+                send(CB_GETCOUNT), send(CB_GETITEMDATA, 1), send(CB_SETCURSEL, 1),
+                send(CB_GETCURSEL), send(CB_SETCURSEL, 2), send(CB_SETCURSEL, 0)},
+               {0, 0, 1, 2, 900, 1, 1, CB_ERR, 0});
+    ExpectEach({send(CB_SETCURSEL, -1), send(CB_GETCURSEL), send(CB_GETITEMDATA, 2),
+                send(CB_GETITEMDATA, -1), send(CB_SETITEMDATA, 2, 5)},
+               {CB_ERR});
+    ExpectEach({send(CB_SETITEMDATA, 0, 5), send(CB_GETITEMDATA)}, {TRUE, 5});
     Expect(SendMessageA(GetDlgItem(dialog, 11), CB_GETCOUNT, 0, 0), 0, "a button");
   });
 }
@@ -47,7 +38,7 @@ CONTRACT(List, TellsOfEveryEntryThatGoes) {
     }
     if (message == WM_DELETEITEM) {
       const auto& deleted = *reinterpret_cast<const DELETEITEMSTRUCT*>(lParam);
-      ExpectEach({wParam, deleted.CtlID}, 14);
+      ExpectEach({wParam, deleted.CtlID}, {14});
       Expect(deleted.CtlType, ODT_COMBOBOX);
       Expect(IsWindow(deleted.hwndItem), TRUE);
       order += std::to_string(deleted.itemID) + " " + std::to_string(deleted.itemData) + ";";

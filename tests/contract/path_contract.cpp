@@ -56,7 +56,7 @@ CONTRACT(Paths, NamesLeadToTheirFiles) {
   Expect(ReadText("C:\\contract\\end"), "x");
   ExpectEach({DeleteFileA("C:\\contract\\END.. "), CreateDirectoryA("C:\\contract\\tail ", nullptr),
               RemoveDirectoryA("C:\\contract\\tail")},
-             TRUE);
+             {TRUE});
 }
 
 // Names of devices are no names of files: the null device takes and forgets what is written.
@@ -85,12 +85,12 @@ CONTRACT(Paths, PathsOf260CharactersAreTooLong) {
   ExpectEach(
       {RemoveDirectoryA(path(247).c_str()), Opens(Create(path(259))),
        CopyFileA(path(259).c_str(), path(258).c_str(), FALSE), DeleteFileA(path(259).c_str())},
-      TRUE);
+      {TRUE});
   // Wine has no limits of its own.
   if (IsWine()) return;
   ExpectEach({CreateDirectoryA(path(248).c_str(), nullptr), Opens(Create(path(260))),
               CopyFileA(path(258).c_str(), path(260).c_str(), FALSE)},
-             FALSE);
+             {FALSE});
 }
 
 }  // namespace contract

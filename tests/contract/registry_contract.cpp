@@ -29,21 +29,12 @@ class CaseKey {
   HKEY key_ = nullptr;
 };
 
-// Below the case's key.
-LSTATUS Delete(const std::string& path) {
-  return RegDeleteKeyA(kMachine, (kKey + path).c_str());
-}
-
 // Status of an open that is closed again at once.
 LSTATUS OpenKey(HKEY parent, const char* path) {
   HKEY key = nullptr;
   const LSTATUS status = RegOpenKeyExA(parent, path, 0, KEY_READ, &key);
   if (status == ERROR_SUCCESS) RegCloseKey(key);
   return status;
-}
-
-LSTATUS OpenBelow(const std::string& path) {
-  return OpenKey(kMachine, (kKey + path).c_str());
 }
 
 LSTATUS Set(HKEY key, const char* name, const char* bytes, DWORD size, DWORD type = REG_SZ) {
@@ -82,13 +73,14 @@ CONTRACT(Registry, PathsAreMadeWholeAndFoundInAnyCase) {
     ExpectEach({RegCreateKeyExA(kMachine, path.c_str(), 0, nullptr, 0, KEY_READ, nullptr, &key,
                                 &disposition),
                 OpenKey(key, ""), RegCloseKey(key)},
-               ERROR_SUCCESS);
+               {ERROR_SUCCESS});
     Expect(disposition, expected);
   }
-  ExpectEach({OpenKey(kMachine, "software\\zEB\\CONTRACT\\made"), OpenBelow("\\Made\\Whole\\"),
-              OpenBelow("\\Made\\\\Whole"), OpenKey(kMachine, ""), OpenKey(kMachine, nullptr)},
-             ERROR_SUCCESS);
-  ExpectEach({OpenBelow("\\Other"), OpenBelow("\\Other\\Below")}, ERROR_FILE_NOT_FOUND);
+  const CaseKey made;
+  ExpectEach({OpenKey(kMachine, "software\\zEB\\CONTRACT\\made"), OpenKey(made, "Made\\Whole\\"),
+              OpenKey(made, "made\\\\Whole"), OpenKey(made, ""), OpenKey(kMachine, nullptr)},
+             {ERROR_SUCCESS});
+  ExpectEach({OpenKey(made, "Other"), OpenKey(made, "Other\\Below")}, {ERROR_FILE_NOT_FOUND});
   Expect(OpenKey(kMachine, ("\\" + path).c_str()), kErrorBadPathname);
 }
 
@@ -107,33 +99,23 @@ CONTRACT(Registry, SizesAreThoseOfTheBytesStored) {
   ExpectEach({Set(key, "v", "C:\\x!", 4), Set(key, "whole", "C:\\x", 5),
               Set(key, "empty", nullptr, 0, REG_EXPAND_SZ), Set(key, "raw", "\1\0\2", 3, 3),
               Set(key, nullptr, "default", 8)},
-             ERROR_SUCCESS);
-  const struct {
-    const char* name;
-    DWORD room;
-    const char* told;
-  } rows[] = {{"v", 0, "234 type 1 size 4"},
-              {"v", 3, "234 type 1 size 4"},
-              {"V", 4, "0 type 1 size 4 C:\\x"},
-              {"v", 8, "0 type 1 size 4 C:\\x"},
-              {"whole", 8, "0 type 1 size 5 C:\\x."},
-              {"empty", 8, "0 type 2 size 0 "},
-              {"raw", 8, "0 type 3 size 3 \1.\2"},
-              {"", 8, "0 type 1 size 8 default."},
-              {"absent", 8, "2"}};
-  for (const auto& row : rows) {
-    Expect(Query(key, row.name, row.room), row.told, row.name + std::to_string(row.room));
-  }
+             {ERROR_SUCCESS});
+  ExpectEach({Query(key, "v", 0), Query(key, "v", 3)}, {"234 type 1 size 4"});
+  ExpectEach({Query(key, "V", 4), Query(key, "v", 8)}, {"0 type 1 size 4 C:\\x"});
+  ExpectEach({Query(key, "whole"), Query(key, "empty"), Query(key, "raw"), Query(key, ""),
+              Query(key, "absent")},
+             {"0 type 1 size 5 C:\\x.", "0 type 2 size 0 ", "0 type 3 size 3 \1.\2",
+              "0 type 1 size 8 default.", "2"});
   BYTE data[8];
   DWORD type = 0;
   DWORD size = 0;
   ExpectEach({RegQueryValueExA(key, "v", nullptr, &type, nullptr, nullptr),
               RegQueryValueExA(key, "v", nullptr, nullptr, nullptr, &size)},
-             ERROR_SUCCESS);
+             {ERROR_SUCCESS});
   Expect(size, 4);
   ExpectEach({RegQueryValueExA(key, "v", nullptr, nullptr, data, nullptr),
               RegQueryValueExA(key, "v", &type, nullptr, data, &size)},
-             ERROR_INVALID_PARAMETER);
+             {ERROR_INVALID_PARAMETER});
 }
 
 CONTRACT(Registry, DefaultValueGetsANulWhereThereIsRoom) {
@@ -141,23 +123,18 @@ CONTRACT(Registry, DefaultValueGetsANulWhereThereIsRoom) {
   const CaseKey none("\\none");
   const CaseKey given("\\given");
   Expect(Set(given, nullptr, "page!", 4), ERROR_SUCCESS);
-  const struct {
-    const char* subkey;
-    LONG room;
-    LSTATUS status;
-    LONG size;
-    const char* text;
-  } rows[] = {{"given", 8, ERROR_SUCCESS, 4, "page"},   {"given", 5, ERROR_SUCCESS, 4, "page"},
-              {"given", 4, ERROR_SUCCESS, 4, "pagere"}, {"given", 3, ERROR_MORE_DATA, 4, nullptr},
-              {"none", 8, ERROR_SUCCESS, 1, ""},        {"absent", 8, 2, 0, nullptr}};
-  for (const auto& row : rows) {
-    const std::string name = row.subkey + std::to_string(row.room);
+  // Status, size and what is in the buffer.
+  const auto told = [&](const char* subkey, LONG room) {
     char data[8] = "before";
-    LONG size = row.room;
-    Expect(RegQueryValueA(key, row.subkey, data, &size), row.status, name);
-    if (row.size != 0) Expect(size, row.size, name);
-    if (row.text != nullptr) Expect(data, row.text, name);
-  }
+    LONG size = room;
+    const LSTATUS status = RegQueryValueA(key, subkey, data, &size);
+    if (status != ERROR_SUCCESS) data[0] = '\0';
+    return std::to_string(status) + ' ' + std::to_string(size) + ' ' + data;
+  };
+  ExpectEach({told("given", 8), told("given", 5)}, {"0 4 page"});
+  ExpectEach({told("given", 4), told("given", 3), told("none", 8)},
+             {"0 4 pagere", "234 4 ", "0 1 "});
+  Expect(told("absent", 8).substr(0, 2), "2 ");
   LONG size = 0;
   Expect(RegQueryValueA(given, nullptr, nullptr, &size), ERROR_SUCCESS);
   Expect(size, 4);
@@ -167,12 +144,11 @@ CONTRACT(Registry, RightsAreThoseOfTheHandle) {
   const CaseKey below("\\B");
   const CaseKey reader("", KEY_READ);
   const CaseKey writer("", KEY_WRITE);
-  ExpectEach({Set(reader, "v", "x", 2), RegDeleteValueA(reader, "v")}, ERROR_ACCESS_DENIED);
-  Expect(Set(writer, "v", "x", 2), ERROR_SUCCESS);
-  ExpectEach({Query(writer, "v"), Enumerate(writer, 0)}, "5");
+  ExpectEach({Set(writer, "v", "x", 2), Query(writer, "v"), Enumerate(writer, 0)}, {0, "5", "5"});
+  ExpectEach({Set(reader, "v", "y", 2), RegDeleteValueA(reader, "v")}, {ERROR_ACCESS_DENIED});
   Expect(Query(reader, "v"), "0 type 1 size 2 x.");
-  Expect(RegDeleteValueA(writer, "V"), ERROR_SUCCESS);
-  Expect(RegDeleteValueA(writer, "v"), ERROR_FILE_NOT_FOUND);
+  ExpectEach({RegDeleteValueA(writer, "V"), RegDeleteValueA(writer, "v")},
+             {ERROR_SUCCESS, ERROR_FILE_NOT_FOUND});
   Expect(RegDeleteKeyA(reader, "B"), ERROR_SUCCESS, "goes by the rights of the key below");
 }
 
@@ -180,21 +156,17 @@ CONTRACT(Registry, ListedNamesNeedRoomForTheirNul) {
   const CaseKey key;
   const CaseKey first("\\Aa");
   const CaseKey second("\\Mmmm");
-  Expect(Enumerate(key, 0, 3), "Aa");
-  ExpectEach({Enumerate(key, 0, 2), Enumerate(key, 1, 4)}, "234");
-  Expect(Enumerate(key, 1, 5), "Mmmm");
-  Expect(Enumerate(key, 2), "259");
-  Expect(Delete("\\Aa"), ERROR_SUCCESS);
-  Expect(Enumerate(key, 0), "Mmmm");
+  ExpectEach({Enumerate(key, 0, 3), Enumerate(key, 0, 2), Enumerate(key, 1, 4),
+              Enumerate(key, 1, 5), Enumerate(key, 2), RegDeleteKeyA(key, "Aa"), Enumerate(key, 0)},
+             {"Aa", "234", "234", "Mmmm", "259", ERROR_SUCCESS, "Mmmm"});
 }
 
 CONTRACT(Registry, KeyWithSubkeysStays) {
+  const CaseKey key;
   const CaseKey inner("\\A\\B\\C");
-  Expect(RegDeleteKeyA(kMachine, nullptr), ERROR_INVALID_PARAMETER);
-  Expect(Delete("\\A"), ERROR_ACCESS_DENIED);
-  ExpectEach({OpenKey(inner, ""), Delete("\\A\\B\\c")}, ERROR_SUCCESS);
-  Expect(Delete("\\A\\B\\c"), ERROR_FILE_NOT_FOUND);
-
+  ExpectEach({RegDeleteKeyA(kMachine, nullptr), RegDeleteKeyA(key, "A"), OpenKey(inner, ""),
+              RegDeleteKeyA(key, "A\\B\\c"), RegDeleteKeyA(key, "A\\B\\c")},
+             {ERROR_INVALID_PARAMETER, ERROR_ACCESS_DENIED, 0, 0, ERROR_FILE_NOT_FOUND});
   // The handle outlives its key, and a key made anew is another one.
   const CaseKey anew("\\A\\B\\C");
   Expect(Set(inner, "v", "x", 2), kErrorKeyDeleted);
@@ -205,10 +177,10 @@ CONTRACT(Registry, ClosedHandlesAreRefused) {
   HKEY key = nullptr;
   ExpectEach({RegOpenKeyExA(kMachine, "SOFTWARE", 0, KEY_READ, &key), RegCloseKey(key),
               RegCloseKey(kMachine)},
-             ERROR_SUCCESS);
+             {ERROR_SUCCESS});
   ExpectEach(
       {RegCloseKey(key), RegCloseKey(nullptr), Set(key, "v", "x", 2), OpenKey(nullptr, "SOFTWARE")},
-      ERROR_INVALID_HANDLE);
+      {ERROR_INVALID_HANDLE});
 }
 
 }  // namespace contract

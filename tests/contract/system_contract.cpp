@@ -14,9 +14,8 @@ CONTRACT(System, DirectoriesTellTheSizeTheyNeed) {
     const UINT length = tell(whole, sizeof(whole));
     Expect(length, std::strlen(whole));
     Expect(whole[length - 1] == '\\', false);
-    ExpectEach({tell(nullptr, 0), tell(part, length)}, length + 1);
-    Expect(tell(part, length + 1), length);
-    Expect(part, whole);
+    ExpectEach({tell(nullptr, 0), tell(part, length)}, {length + 1});
+    ExpectEach({tell(part, length + 1), part}, {length, whole});
   }
 }
 
@@ -25,17 +24,16 @@ CONTRACT(System, ProgramsPathIsCutToTheBuffer) {
   char buffer[MAX_PATH] = {};
   ExpectEach({GetModuleFileNameA(nullptr, buffer, sizeof(buffer)),
               GetModuleFileNameA(nullptr, buffer, kLength + 1)},
-             kLength);
+             {kLength});
   Expect(buffer, kProgram);
   ExpectEach({GetModuleFileNameA(nullptr, buffer, 0),
               GetModuleFileNameA(reinterpret_cast<HMODULE>(4), buffer, sizeof(buffer))},
-             0);
+             {0});
   // The oldest systems leave the NUL out; none writes more than the buffer has.
   std::memset(buffer, '!', sizeof(buffer));
   for (const DWORD size : {kLength, DWORD{4}}) {
-    Expect(GetModuleFileNameA(nullptr, buffer, size), size);
-    Expect(std::string(buffer, 3), "C:\\");
-    Expect(buffer[size], size == kLength ? '!' : kProgram[size]);
+    ExpectEach({GetModuleFileNameA(nullptr, buffer, size), std::string(buffer, 3), buffer[size]},
+               {size, "C:\\", size == kLength ? '!' : kProgram[size]});
   }
 }
 
@@ -46,7 +44,7 @@ CONTRACT(System, LibrariesAreFoundByNameOrPath) {
   ExpectEach({GetModuleHandleA("absent.dll"), LoadLibraryA("absent.dll"),
               LoadLibraryA("C:\\contract\\version.dll"), LoadLibraryA("C:\\windows\\absent.dll"),
               LoadLibraryA(nullptr), FreeLibrary(nullptr)},
-             0);
+             {0});
   char path[MAX_PATH + 16] = {};
   GetSystemDirectoryA(path, MAX_PATH);
   std::strcat(path, "\\Version.DLL");
@@ -55,50 +53,42 @@ CONTRACT(System, LibrariesAreFoundByNameOrPath) {
   Expect(byPath != nullptr, true);
   Expect(byName, byPath);
   Expect(FreeLibrary(byName), TRUE);
-  Expect(GetProcAddress(byPath, "VerQueryValueA") != nullptr &&
-             GetProcAddress(kernel, "GetDiskFreeSpaceExA") != nullptr,
-         true);
-  for (const char* name : {"verqueryvaluea", "GetDiskFreeSpaceExA", ""}) {
-    Expect(GetProcAddress(byPath, name) != nullptr, false, name);
-  }
-  Expect(GetProcAddress(kernel, "VerQueryValueA") != nullptr, false);
+  const auto has = [](HMODULE module, const char* name) {
+    return GetProcAddress(module, name) != nullptr;
+  };
+  ExpectEach({has(byPath, "VerQueryValueA"), has(kernel, "GetDiskFreeSpaceExA")}, {true});
+  ExpectEach({has(byPath, "verqueryvaluea"), has(byPath, "GetDiskFreeSpaceExA"), has(byPath, ""),
+              has(kernel, "VerQueryValueA")},
+             {false});
   Expect(FreeLibrary(byPath), TRUE);
 
   const auto setDirectories =
       FindProcedure<decltype(&SetDefaultDllDirectories)>(kernel, "SetDefaultDllDirectories");
-  ExpectEach({setDirectories(0), setDirectories(1)}, FALSE);
+  ExpectEach({setDirectories(0), setDirectories(1)}, {FALSE});
   Expect(setDirectories(LOAD_LIBRARY_SEARCH_SYSTEM32), TRUE);
 }
 
 CONTRACT(System, FreeSpaceIsAskedOfARoot) {
-  const struct {
-    const char* root;
-    bool drive;      // GetDiskFreeSpaceA takes it
-    bool directory;  // GetDiskFreeSpaceExA takes it
-  } rows[] = {{"C:\\", true, true},
-              {"c:/", true, true},
-              {"C:", true, true},
-              {"C:\\contract", false, true},
-              {"C:\\contract\\", false, true},
-              {kProgram, false, false},
-              {"C:\\contract\\absent", false, false},
-              {"Q:\\", false, false},
-              {"Q:", false, false},
-              {"", false, false}};
-  for (const auto& row : rows) {
-    DWORD sectors = 0, bytes = 0, freeClusters = 0, totalClusters = 0;
-    const bool drive =
-        GetDiskFreeSpaceA(row.root, &sectors, &bytes, &freeClusters, &totalClusters) != FALSE;
-    // Wine, as the NT family, also takes a directory; the 9x family a root alone.
-    if (!IsWine() || row.drive == row.directory) Expect(drive, row.drive, row.root);
-    if (drive) Expect(sectors * bytes != 0 && freeClusters <= totalClusters, true, row.root);
+  // What takes the name: "drive " is GetDiskFreeSpaceA, "directory" GetDiskFreeSpaceExA.
+  const auto takers = [](const std::string& root) {
+    std::string told;
+    DWORD sectors = 0, bytes = 0, clusters = 0, allClusters = 0;
+    if (GetDiskFreeSpaceA(root.c_str(), &sectors, &bytes, &clusters, &allClusters) != FALSE) {
+      Expect(sectors * bytes != 0 && clusters <= allClusters, true, root);
+      // Wine, as the NT family, also takes a directory; the 9x family a root alone.
+      if (!IsWine() || root.size() <= 3) told = "drive ";
+    }
     ULARGE_INTEGER toCaller = {}, total = {}, all = {};
-    const bool directory = GetDiskFreeSpaceExA(row.root, &toCaller, &total, &all) != FALSE;
-    Expect(directory, row.directory, row.root);
-    const bool isInOrder =
-        toCaller.QuadPart <= all.QuadPart && all.QuadPart <= total.QuadPart && total.QuadPart != 0;
-    if (directory) Expect(isInOrder, true, row.root);
-  }
+    if (GetDiskFreeSpaceExA(root.c_str(), &toCaller, &total, &all) == FALSE) return told;
+    Expect(toCaller.QuadPart <= all.QuadPart && all.QuadPart <= total.QuadPart, true, root);
+    Expect(total.QuadPart != 0, true, root);
+    return told + "directory";
+  };
+  ExpectEach({takers("C:\\"), takers("c:/"), takers("C:")}, {"drive directory"});
+  ExpectEach({takers("C:\\contract"), takers("C:\\contract\\")}, {"directory"});
+  ExpectEach(
+      {takers(kProgram), takers("C:\\contract\\absent"), takers("Q:\\"), takers("Q:"), takers("")},
+      {""});
   ULARGE_INTEGER bytes = {};
   Expect(GetDiskFreeSpaceExA(nullptr, &bytes, nullptr, nullptr), TRUE, "the current drive");
 }
@@ -107,9 +97,8 @@ CONTRACT(System, VersionNeedsTheRecordsSize) {
   OSVERSIONINFOA info = {};
   Expect(GetVersionExA(&info), FALSE);
   info.dwOSVersionInfoSize = sizeof(info);
-  Expect(sizeof(info), 148);
-  Expect(GetVersionExA(&info), TRUE);
-  Expect(info.dwPlatformId, VER_PLATFORM_WIN32_NT);
+  ExpectEach({sizeof(info), GetVersionExA(&info), info.dwPlatformId},
+             {148, TRUE, VER_PLATFORM_WIN32_NT});
   Expect(GetSystemDefaultLangID() != 0, true);
   SYSTEMTIME time = {};
   GetLocalTime(&time);
@@ -119,15 +108,14 @@ CONTRACT(System, VersionNeedsTheRecordsSize) {
 CONTRACT(System, MovableBlocksAreLocked) {
   const HGLOBAL block = GlobalAlloc(GMEM_MOVEABLE, 16);
   void* const bytes = GlobalLock(block);
-  Expect(bytes != nullptr, true);
-  Expect(GlobalLock(block), bytes);
-  Expect(GlobalUnlock(block), TRUE);
-  ExpectEach({GlobalUnlock(block), GlobalFree(block)}, 0);
+  ExpectEach({bytes != nullptr, GlobalLock(block), GlobalUnlock(block), GlobalUnlock(block),
+              GlobalFree(block)},
+             {true, bytes, TRUE, FALSE, nullptr});
   const HGLOBAL fixed = GlobalAlloc(0, 4);
   Expect(GlobalLock(fixed), fixed);
   ExpectEach({GlobalFree(fixed), GlobalFree(nullptr), GlobalLock(nullptr),
               GlobalAlloc(GMEM_MOVEABLE, SIZE_MAX / 2)},
-             nullptr);
+             {nullptr});
 }
 
 CONTRACT(Shell, OpensWhatIsThere) {
@@ -136,25 +124,14 @@ CONTRACT(Shell, OpensWhatIsThere) {
         ShellExecuteA(nullptr, "Open", file, "C:\\contract\\opened", nullptr, SW_SHOW);
     return reinterpret_cast<uintptr_t>(answer) > 32;
   };
-  Expect(opens(kProgram), true);
-  Expect(opens("C:\\contract\\absent.txt"), false);
-  Expect(MessageBeep(MB_ICONEXCLAMATION), TRUE);
+  ExpectEach({opens(kProgram), opens("C:\\contract\\absent.txt"), MessageBeep(MB_ICONEXCLAMATION)},
+             {true, false, TRUE});
 }
 
 // The command line begins with the program's path, quoted or not, with its extension or without.
 CONTRACT(Shell, StartsAProgramAndGivesTwoHandles) {
   CopyFileA(kProgram, "C:\\contract\\of two words.exe", FALSE);
-  const std::pair<const char*, BOOL> rows[] = {
-      {"C:\\contract\\seam_contract.exe C:\\contract\\first", TRUE},
-      {"C:\\contract\\seam_contract C:\\contract\\second", TRUE},
-      {"\"C:\\contract\\seam_contract.exe\"   C:\\contract\\third", TRUE},
-      {"C:\\contract\\of two words.exe C:\\contract\\fourth", TRUE},
-      {"C:\\contract\\of two C:\\contract\\fifth", FALSE},
-      {"\"C:\\contract\\absent.exe\"", FALSE},
-      {"absent x", FALSE},
-      {"C:\\contract C:\\contract\\x", FALSE},
-      {"", FALSE}};
-  for (const auto& [line, starts] : rows) {
+  const auto starts = [](const char* line) {
     char writable[MAX_PATH] = {};
     std::strcpy(writable, line);
     STARTUPINFOA startup = {};
@@ -162,16 +139,26 @@ CONTRACT(Shell, StartsAProgramAndGivesTwoHandles) {
     startup.dwFlags = STARTF_USESHOWWINDOW;
     startup.wShowWindow = SW_SHOW;
     PROCESS_INFORMATION process = {};
-    Expect(CreateProcessA(nullptr, writable, nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
-                          &process),
-           starts, line);
-    if (starts == FALSE) continue;
+    if (CreateProcessA(nullptr, writable, nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
+                       &process) == FALSE) {
+      return false;
+    }
     WaitForEnd(process.hProcess);
-    ExpectEach({CloseHandle(process.hProcess), CloseHandle(process.hThread)}, TRUE, line);
+    ExpectEach({CloseHandle(process.hProcess), CloseHandle(process.hThread)}, {TRUE}, line);
     Expect(CloseHandle(process.hThread), FALSE, line);
-  }
+    return true;
+  };
+  ExpectEach({starts("C:\\contract\\seam_contract.exe C:\\contract\\started"),
+              starts("C:\\contract\\seam_contract C:\\contract\\started"),
+              starts("\"C:\\contract\\seam_contract.exe\"   C:\\contract\\started"),
+              starts("C:\\contract\\of two words.exe C:\\contract\\started")},
+             {true});
+  ExpectEach(
+      {starts("C:\\contract\\of two C:\\contract\\x"), starts("\"C:\\contract\\absent.exe\""),
+       starts("absent x"), starts("C:\\contract C:\\contract\\x"), starts("")},
+      {false});
   // On the stand-in no other program exists.
-  if (IsWine()) Expect(ReadText("C:\\contract\\first"), "started");
+  if (IsWine()) Expect(ReadText("C:\\contract\\started"), "started");
 }
 
 }  // namespace contract
