@@ -47,10 +47,7 @@ std::string IdOrNone(const Window* window) {
 
 const Window* DefaultButton(const Dialog& dialog) {
   for (const auto& control : dialog.controls) {
-    const bool isDefault = (control->style & kButtonTypeMask) == BS_DEFPUSHBUTTON;
-    if (control->kind == WindowKind::kButton && isDefault && control->IsShown()) {
-      return control.get();
-    }
+    if (control->IsDefaultButton() && control->IsShown()) return control.get();
   }
   return nullptr;
 }

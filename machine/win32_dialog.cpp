@@ -93,6 +93,7 @@ LRESULT SendToControl(Window* control, UINT message, WPARAM wParam, LPARAM lPara
       if (control->kind == WindowKind::kButton) SetButtonType(control, wParam);
       return 0;
     default:  // EM_SETSEL changes nothing that can be seen here
+      if (control->kind == WindowKind::kDialog) return machine::HandleForDialog(message, wParam);
       return control->kind == WindowKind::kComboBox ? SendToList(control, message, wParam, lParam)
                                                     : 0;
   }

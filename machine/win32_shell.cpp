@@ -1,4 +1,4 @@
-// The shell and other programs: what the program asks for is told to the user, and nothing starts.
+// The shell and other programs: what the program asks for is told to the user, and nothing runs.
 #include <cstring>
 #include <set>
 #include <string>
@@ -36,6 +36,21 @@ class Allocator : public IMalloc {
   virtual ~Allocator() = default;
 };
 
+bool IsProgram(std::string path) {
+  const size_t name = path.find_last_of("\\/:") + 1;
+  if (path.find('.', name) == std::string::npos) path += ".exe";
+  return machine::LocateFile(path).has_value();
+}
+
+// A command line begins with its program, in quotes or up to the first blank that makes it one.
+// Windows also searches directories for a name without a path.
+bool BeginsWithAProgram(const std::string& line) {
+  if (line.starts_with('"')) return IsProgram(line.substr(1, line.find('"', 1) - 1));
+  size_t end = line.find(' ');
+  while (end != std::string::npos && !IsProgram(line.substr(0, end))) end = line.find(' ', end + 1);
+  return end != std::string::npos || IsProgram(line);
+}
+
 }  // namespace
 
 extern "C" {
@@ -51,14 +66,15 @@ HINSTANCE ShellExecuteA(HWND, LPCSTR, LPCSTR file, LPCSTR, LPCSTR, int) {
   return reinterpret_cast<HINSTANCE>(machine::LocateFile(file) ? kStarted : kFileNotFound);
 }
 
-// Every command starts, as far as the program can see: it gets the two handles, which it has to
-// close. No other program exists on this machine.
+// A program that is there starts, as far as the caller can see: it gets the two handles, which it
+// has to close.
 BOOL CreateProcessA(LPCSTR, LPSTR commandLine, LPSECURITY_ATTRIBUTES, LPSECURITY_ATTRIBUTES, BOOL,
                     DWORD, LPVOID, LPCSTR, STARTUPINFOA* startup,
                     PROCESS_INFORMATION* information) {
   if (CallFails("CreateProcessA") || commandLine == nullptr || information == nullptr) return FALSE;
   if (startup == nullptr || startup->cb != sizeof(STARTUPINFOA)) return FALSE;
   machine::TellUser("start " + machine::Quoted(commandLine));
+  if (!BeginsWithAProgram(commandLine)) return FALSE;
   *information = {};
   information->hProcess = machine::OpenProcessHandle();
   information->hThread = machine::OpenProcessHandle();

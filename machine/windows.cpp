@@ -19,6 +19,10 @@ constexpr uint32_t kTabStop = 0x10000;      // WS_TABSTOP
 constexpr int kEditUpdate = 0x400;
 constexpr int kEditChange = 0x300;
 
+constexpr UINT kGetDefaultId = 0x400;        // DM_GETDEFID
+constexpr UINT kSetDefaultId = 0x401;        // DM_SETDEFID
+constexpr LRESULT kHasDefault = 0x534B0000;  // DC_HASDEFID, the answer's upper half
+
 // Stands in the queue for the mouse's messages of one click.
 constexpr UINT kClickMessage = 0x201;  // WM_LBUTTONDOWN
 
@@ -83,6 +87,16 @@ bool CanCancel() {
   return control == nullptr || control->IsEnabled();
 }
 
+// The type goes from the button that has it to the new one, if that is a button.
+void SetDefaultButton(int id) {
+  Window* old = openDialog->Find(openDialog->defaultId);
+  if (old == nullptr || !old->IsDefaultButton()) old = openDialog->FindDefaultButton();
+  if (old != nullptr) old->style &= ~uint32_t{kButtonTypeMask};
+  Window* const button = openDialog->Find(id);
+  if (button != nullptr && button->kind == WindowKind::kButton) button->style |= BS_DEFPUSHBUTTON;
+  openDialog->defaultId = id;
+}
+
 void DestroyDialog() {
   // The lists tell of their entries while the dialog still stands.
   for (const auto& control : openDialog->controls) DeleteItems(*control);
@@ -118,9 +132,19 @@ bool Window::IsOwnerDrawn() const {
   return kind == WindowKind::kComboBox && (style & kListOwnerDrawn) != 0;
 }
 
+bool Window::IsDefaultButton() const {
+  return kind == WindowKind::kButton && (style & kButtonTypeMask) == BS_DEFPUSHBUTTON;
+}
+
 Window* Dialog::Find(int id) const {
   const auto found = std::ranges::find_if(
       controls, [id](const std::unique_ptr<Window>& control) { return control->id == id; });
+  return found != controls.end() ? found->get() : nullptr;
+}
+
+Window* Dialog::FindDefaultButton() const {
+  const auto found = std::ranges::find_if(
+      controls, [](const auto& control) { return control->IsDefaultButton(); });
   return found != controls.end() ? found->get() : nullptr;
 }
 
@@ -153,6 +177,17 @@ INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam) {
   return openDialog->procedure(openDialog->frame.handle, message, wParam, lParam);
 }
 
+LRESULT HandleForDialog(UINT message, WPARAM wParam) {
+  if (openDialog == nullptr || (message != kGetDefaultId && message != kSetDefaultId)) return 0;
+  if (message == kSetDefaultId) {
+    SetDefaultButton(static_cast<int>(wParam));
+    return TRUE;
+  }
+  if (openDialog->defaultId != 0) return openDialog->defaultId | kHasDefault;
+  const Window* const button = openDialog->FindDefaultButton();
+  return button != nullptr ? button->id | kHasDefault : 0;
+}
+
 void PostToQueue(const MSG& message) {
   queue.push_back(message);
 }
@@ -172,7 +207,8 @@ void DispatchToWindow(const MSG& message) {
   const Window* const window = FindWindowByHandle(message.hwnd);
   if (window == nullptr) return;
   if (window->kind == WindowKind::kDialog) {
-    SendToDialog(message.message, message.wParam, message.lParam);
+    const bool isHandled = SendToDialog(message.message, message.wParam, message.lParam) != FALSE;
+    if (!isHandled) HandleForDialog(message.message, message.wParam);
   } else if (message.message == kClickMessage) {
     Click(message.hwnd);
   }

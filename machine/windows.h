@@ -36,6 +36,7 @@ struct Window {
   bool IsShown() const { return (style & WS_VISIBLE) != 0; }
   bool IsEnabled() const { return (style & WS_DISABLED) == 0; }
   bool IsOwnerDrawn() const;
+  bool IsDefaultButton() const;
 };
 
 struct Dialog {
@@ -43,10 +44,12 @@ struct Dialog {
   std::vector<std::unique_ptr<Window>> controls;  // in tab order
   DLGPROC procedure = nullptr;
   HWND focus = nullptr;
+  int defaultId = IDOK;  // what the Enter key presses; 0: the first button of that type
   bool hasEnded = false;
   INT_PTR result = 0;
 
-  Window* Find(int id) const;  // the first control that bears the id now
+  Window* Find(int id) const;         // the first control that bears the id now
+  Window* FindDefaultButton() const;  // the first button of that type
   // The first control that the Tab key reaches; null for none.
   HWND FirstTabStop() const;
   // The control has been hidden or destroyed: Windows gives its focus to the dialog, which gives it
@@ -61,6 +64,9 @@ Window* FindWindowByHandle(HWND handle);
 
 // Calls the dialog's procedure.
 INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam);
+// What the system does with a message that the procedure has not handled, and its answer: it tells
+// and sets the default button. 0 for all other messages.
+LRESULT HandleForDialog(UINT message, WPARAM wParam);
 
 // ---- Messages. First in, first out.
 

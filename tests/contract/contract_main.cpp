@@ -55,39 +55,76 @@ bool IsWine() {
   return GetProcAddress(GetModuleHandleA("ntdll.dll"), "wine_get_version") != nullptr;
 }
 
-void Compare(const std::string& actual, const std::string& expected, const std::string& row,
-             std::source_location where) {
-  if (actual == expected) return;
+void Expect(const Shown& actual, const Shown& expected, const std::string& row,
+            std::source_location where) {
+  if (actual.text == expected.text) return;
   const char* const slash = std::strrchr(where.file_name(), '/');
   failures += std::string(" ") + (slash != nullptr ? slash + 1 : where.file_name()) + ':' +
               std::to_string(where.line()) + (row.empty() ? "" : " [" + row + ']') + " is " +
-              actual + ", not " + expected + ';';
+              actual.text + ", not " + expected.text + ';';
+}
+
+void ExpectEach(std::initializer_list<Shown> actual, std::initializer_list<Shown> expected,
+                const std::string& row, std::source_location where) {
+  if (expected.size() != 1) Expect(expected.size(), actual.size(), "answers", where);
+  const Shown* answer = expected.begin();
+  for (const Shown& one : actual) {
+    Expect(one, *answer, row + " call " + std::to_string(&one - actual.begin() + 1), where);
+    if (answer + 1 != expected.end()) ++answer;
+  }
+}
+
+HANDLE Open(const std::string& name, DWORD access, DWORD share) {
+  return CreateFileA(name.c_str(), access, share, nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL,
+                     nullptr);
+}
+
+HANDLE Create(const std::string& name, DWORD attributes) {
+  return CreateFileA(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
+                     attributes, nullptr);
+}
+
+bool Opens(HANDLE file) {
+  return file != INVALID_HANDLE_VALUE && CloseHandle(file) != FALSE;
+}
+
+std::string Read(HANDLE file, DWORD count) {
+  std::string bytes(count, '?');
+  DWORD done = 99;
+  if (ReadFile(file, bytes.data(), count, &done, nullptr) == FALSE) return "failed";
+  bytes.resize(done);
+  return bytes;
+}
+
+BOOL Write(HANDLE file, const std::string& bytes) {
+  const auto count = static_cast<DWORD>(bytes.size());
+  DWORD done = 99;
+  const BOOL isWritten = WriteFile(file, bytes.data(), count, &done, nullptr);
+  Expect(done, isWritten != FALSE ? count : 0);
+  return isWritten;
 }
 
 void WriteText(const std::string& path, const std::string& bytes) {
-  const HANDLE file =
-      CreateFileA(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
-  DWORD done = 0;
-  Expect(WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr), TRUE,
-         path);
-  CloseHandle(file);
+  const HANDLE file = Create(path);
+  ExpectEach({Write(file, bytes), CloseHandle(file)}, {TRUE}, path);
 }
 
 std::string ReadText(const std::string& path) {
-  const HANDLE file =
-      CreateFileA(path.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
-  if (file == INVALID_HANDLE_VALUE) return "none";
-  std::string bytes(GetFileSize(file, nullptr), '?');
-  DWORD done = 0;
-  ReadFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
+  const HANDLE file = Open(path, GENERIC_READ);
+  const DWORD size = GetFileSize(file, nullptr);
+  const std::string bytes = Read(file, size != INVALID_FILE_SIZE ? size : 0);
   CloseHandle(file);
-  bytes.resize(done);
   return bytes;
 }
 
 }  // namespace contract
 
-int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR, int) {
+// A command line makes this the program that a case starts: it writes the file of that name.
+int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR commandLine, int) {
+  if (*commandLine != '\0') {
+    contract::WriteText(commandLine, "started");
+    return 0;
+  }
   std::vector<contract::Case>& cases = Cases();
   std::ranges::sort(cases,
                     [](const auto& a, const auto& b) { return std::strcmp(a.name, b.name) < 0; });

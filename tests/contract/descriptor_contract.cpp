@@ -1,34 +1,21 @@
 // The runtime's descriptors: what they do differently from the system's handles.
+#include <cstdio>
+
 #include "tests/contract/contract.h"
 
-using contract::Expect;
-using contract::ReadText;
-using contract::WriteText;
-
-namespace {
-
-constexpr int kOwnerMayReadAndWrite = _S_IREAD | _S_IWRITE;
-constexpr int kTextMode = 0x4000;
-constexpr unsigned kDirectoryBit = 0x4000;
-constexpr unsigned kFileBit = 0x8000;
-
-}  // namespace
+namespace contract {
 
 CONTRACT(Descriptors, TextModeAddsCarriageReturns) {
   const char* const name = "C:\\contract\\text";
   const int made = _creat(name, kOwnerMayReadAndWrite);
-  Expect(_write(made, "a\nb\r\n", 5), 5, "the bytes added don't count");
-  Expect(_tell(made), 7);
-  Expect(_setmode(made, _O_BINARY), kTextMode);
-  Expect(_setmode(made, _O_BINARY), _O_BINARY);
-  Expect(_write(made, "c\n", 2), 2);
-  Expect(_write(made, "", 0), 0);
-  Expect(_close(made), 0);
+  // The bytes added don't count.
+  ExpectEach({_write(made, "a\nb\r\n", 5), _tell(made), _setmode(made, _O_BINARY),
+              _setmode(made, _O_BINARY), _write(made, "c\n", 2), _write(made, "", 0), _close(made)},
+             {5, 7, 0x4000, _O_BINARY, 2, 0, 0});
   Expect(ReadText(name), "a\r\nb\r\r\nc\n");
 
   const int binary = _sopen(name, _O_WRONLY | _O_BINARY, _SH_DENYNO);
-  Expect(_write(binary, "\n", 1), 1);
-  Expect(_close(binary), 0);
+  ExpectEach({_write(binary, "\n", 1), _close(binary)}, {1, 0});
   Expect(ReadText(name), "\n\r\nb\r\r\nc\n", "opening cuts nothing");
 }
 
@@ -38,14 +25,12 @@ CONTRACT(Descriptors, MaskWithholdsPermissionsFromANewFile) {
   const int file = _creat(name, kOwnerMayReadAndWrite);
   Expect(_umask(0), kOwnerMayReadAndWrite);
   Expect(GetFileAttributesA(name), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY);
-  Expect(_setmode(file, _O_BINARY), kTextMode);
-  Expect(_write(file, "still", 5), 5);
-  Expect(_lseek(file, 0, FILE_BEGIN), 0);
   char back[8] = {};
-  Expect(_read(file, back, sizeof(back)), 5);
+  ExpectEach({_setmode(file, _O_BINARY), _write(file, "still", 5), _lseek(file, 0, FILE_BEGIN),
+              _read(file, back, sizeof(back))},
+             {0x4000, 5, 0, 5});
   Expect(back, "still");
-  Expect(_read(file, back, sizeof(back)), 0);
-  Expect(_chmod(name, kOwnerMayReadAndWrite), 0);
+  ExpectEach({_read(file, back, sizeof(back)), _chmod(name, kOwnerMayReadAndWrite)}, {0});
   Expect(GetFileAttributesA(name), FILE_ATTRIBUTE_ARCHIVE);
   Expect(_close(file), 0);
   Expect(_chmod("C:\\contract\\absent", kOwnerMayReadAndWrite), -1);
@@ -53,30 +38,22 @@ CONTRACT(Descriptors, MaskWithholdsPermissionsFromANewFile) {
 
 CONTRACT(Descriptors, PositionsAreCutToThirtyTwoBits) {
   const int file = _creat("C:\\contract\\far", kOwnerMayReadAndWrite);
-  Expect(_lseek(file, 10, FILE_BEGIN), 10);
-  Expect(_lseek(file, -11, FILE_CURRENT), -1);
-  Expect(_lseek(file, 0, 7), -1);
-  Expect(_tell(file), 10, "a refused move moves nothing");
-  Expect(_lseek(file, 0, FILE_END), 0);
-  Expect(_lseek(file, INT32_MAX, FILE_BEGIN), INT32_MAX);
-  Expect(_lseek(file, 1, FILE_CURRENT), INT32_MIN);
-  Expect(_tell(file), INT32_MIN);
-  Expect(_close(file), 0);
+  // A refused move moves nothing.
+  ExpectEach({_lseek(file, 10, FILE_BEGIN), _lseek(file, -11, FILE_CURRENT), _lseek(file, 0, 7),
+              _tell(file), _lseek(file, 0, FILE_END), _lseek(file, INT32_MAX, FILE_BEGIN),
+              _lseek(file, 1, FILE_CURRENT), _tell(file), _close(file)},
+             {10, -1, -1, 10, 0, INT32_MAX, INT32_MIN, INT32_MIN, 0});
 }
 
 CONTRACT(Descriptors, ClosedAndUnknownOnesAreRefused) {
-  WriteText("C:\\contract\\open", "x");
-  const int file = _sopen("C:\\contract\\open", _O_RDONLY | _O_BINARY, _SH_DENYNO);
+  const int file = _sopen(kProgram, _O_RDONLY | _O_BINARY, _SH_DENYNO);
   char one = 0;
-  Expect(_write(file, "y", 1), -1, "opened for reading");
-  Expect(_setmode(file, 0), -1);
+  ExpectEach({_write(file, "y", 1), _setmode(file, 0)}, {-1}, "opened for reading, no such mode");
   Expect(_close(file), 0);
   for (const int closed : {file, -1, 99}) {
-    Expect(_close(closed), -1);
-    Expect(_read(closed, &one, 1), -1);
-    Expect(_write(closed, &one, 1), -1);
-    Expect(_lseek(closed, 0, FILE_BEGIN), -1);
-    Expect(_tell(closed), -1);
+    ExpectEach({_close(closed), _read(closed, &one, 1), _write(closed, &one, 1),
+                _lseek(closed, 0, FILE_BEGIN), _tell(closed)},
+               {-1}, std::to_string(closed));
   }
 }
 
@@ -85,25 +62,19 @@ CONTRACT(Descriptors, StatTellsSizeAndKind) {
   CreateDirectoryA("C:\\contract\\kind", nullptr);
   WriteText("C:\\contract\\fixed stat", "");
   _chmod("C:\\contract\\fixed stat", _S_IREAD);
-  const struct {
-    const char* name;
-    unsigned mode;  // 0: it fails
-    int size;
-  } rows[] = {
-      {"C:\\contract\\SIZED", kFileBit | kOwnerMayReadAndWrite, 5},
-      {"C:\\contract\\fixed stat", kFileBit | _S_IREAD, 0},
-      {"C:\\contract\\kind", kDirectoryBit | kOwnerMayReadAndWrite, 0},
-      {"C:\\", kDirectoryBit | kOwnerMayReadAndWrite, 0},
-      {"C:\\contract\\kind\\", 0, 0},
-      {"C:\\contract\\absent", 0, 0},
-      {"", 0, 0},
-  };
-  for (const auto& row : rows) {
+  // Kind and permissions, in octal, and size.
+  const auto told = [](const char* name) -> std::string {
     struct _stat status = {};
-    Expect(_stat(row.name, &status), row.mode != 0 ? 0 : -1, row.name);
-    constexpr unsigned kTold = kFileBit | kDirectoryBit | kOwnerMayReadAndWrite;
-    Expect(row.mode != 0 ? status.st_mode & kTold : 0, row.mode, row.name);
-    Expect(row.mode != 0 ? status.st_size : 0, row.size, row.name);
-  }
+    if (_stat(name, &status) != 0) return "failed";
+    char text[32];
+    std::snprintf(text, sizeof(text), "%o %d", status.st_mode & 0140600u, int{status.st_size});
+    return text;
+  };
+  ExpectEach({told("C:\\contract\\SIZED"), told("C:\\contract\\fixed stat"),
+              told("C:\\contract\\kind"), told("C:\\")},
+             {"100600 5", "100400 0", "40600 0", "40600 0"});
+  ExpectEach({told("C:\\contract\\kind\\"), told("C:\\contract\\absent"), told("")}, {"failed"});
   _chmod("C:\\contract\\fixed stat", kOwnerMayReadAndWrite);
 }
+
+}  // namespace contract

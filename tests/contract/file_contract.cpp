@@ -1,47 +1,15 @@
 // Files and directories: who may open what, positions, and what is refused.
 #include "tests/contract/contract.h"
 
-using contract::Expect;
-using contract::ReadText;
-using contract::WriteText;
-
+namespace contract {
 namespace {
 
 constexpr DWORD kShareNone = 0;
 constexpr DWORD kShareRead = 1;
 constexpr DWORD kShareBoth = 3;
-constexpr int kOwnerMayReadAndWrite = _S_IREAD | _S_IWRITE;
 
-HANDLE Open(const std::string& name, DWORD access, DWORD share = kShareNone) {
-  return CreateFileA(name.c_str(), access, share, nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL,
-                     nullptr);
-}
-
-HANDLE Create(const std::string& name, DWORD attributes = FILE_ATTRIBUTE_NORMAL) {
-  return CreateFileA(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
-                     attributes, nullptr);
-}
-
-// Whether the open works; what it opened is closed again.
-bool Opens(HANDLE handle) {
-  return handle != INVALID_HANDLE_VALUE && CloseHandle(handle) != FALSE;
-}
-
-// What is read, or "failed".
-std::string Read(HANDLE file, DWORD count) {
-  std::string bytes(count, '?');
-  DWORD done = 99;
-  if (ReadFile(file, bytes.data(), count, &done, nullptr) == FALSE) return "failed";
-  bytes.resize(done);
-  return bytes;
-}
-
-BOOL Write(HANDLE file, const std::string& bytes) {
-  DWORD done = 99;
-  const BOOL written =
-      WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
-  Expect(done, written != FALSE ? bytes.size() : 0);
-  return written;
+int OpenDescriptor(const char* name, int access = _O_RDONLY) {
+  return _sopen(name, access | _O_BINARY, _SH_DENYNO);
 }
 
 DWORD Seek(HANDLE file, LONG distance, DWORD method) {
@@ -51,192 +19,167 @@ DWORD Seek(HANDLE file, LONG distance, DWORD method) {
 }  // namespace
 
 CONTRACT(Files, EachOpenerSharesWhatTheOtherDoes) {
-  const struct {
-    DWORD access, share;    // of the first
-    DWORD access2, share2;  // of the second
-    bool opens;
-  } rows[] = {
-      {GENERIC_READ, kShareNone, GENERIC_READ, kShareBoth, false},
-      {GENERIC_READ, kShareBoth, GENERIC_READ, kShareNone, false},
-      {GENERIC_READ, kShareRead, GENERIC_READ, kShareRead, true},
-      {GENERIC_READ, kShareRead, GENERIC_WRITE, kShareBoth, false},
-      {GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareRead, false},
-      {GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareBoth, true},
-  };
-  WriteText("C:\\contract\\shared", "x");
-  for (size_t i = 0; i < std::size(rows); ++i) {
-    const HANDLE first = Open("C:\\contract\\shared", rows[i].access, rows[i].share);
-    const HANDLE second = Open("c:/CONTRACT/Shared", rows[i].access2, rows[i].share2);
-    Expect(Opens(second), rows[i].opens, "row " + std::to_string(i));
+  const char* const name = "C:\\contract\\shared";
+  WriteText(name, "x");
+  const auto shares = [&](DWORD access, DWORD share, DWORD access2, DWORD share2) {
+    const HANDLE first = Open(name, access, share);
+    const bool isShared = Opens(Open("c:/CONTRACT/Shared", access2, share2));
     Expect(CloseHandle(first), TRUE);
-  }
+    return isShared;
+  };
+  ExpectEach({shares(GENERIC_READ, kShareRead, GENERIC_READ, kShareRead),
+              shares(GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareBoth)},
+             {true});
+  ExpectEach({shares(GENERIC_READ, kShareNone, GENERIC_READ, kShareBoth),
+              shares(GENERIC_READ, kShareBoth, GENERIC_READ, kShareNone),
+              shares(GENERIC_READ, kShareRead, GENERIC_WRITE, kShareBoth),
+              shares(GENERIC_WRITE, kShareBoth, GENERIC_READ, kShareRead)},
+             {false});
 
   // Descriptors let everyone read and write, but not delete.
-  const HANDLE exclusive = Open("C:\\contract\\shared", GENERIC_READ);
-  Expect(_sopen("C:\\contract\\shared", _O_RDONLY | _O_BINARY, _SH_DENYNO), -1);
-  Expect(_creat("C:\\contract\\shared", kOwnerMayReadAndWrite), -1);
-  Expect(DeleteFileA("C:\\contract\\shared"), FALSE);
-  CloseHandle(exclusive);
-  const int descriptor = _sopen("C:\\contract\\shared", _O_RDONLY | _O_BINARY, _SH_DENYNO);
-  Expect(Opens(Open("C:\\contract\\shared", GENERIC_READ)), false);
-  Expect(Opens(Open("C:\\contract\\shared", GENERIC_READ, kShareBoth)), true);
-  Expect(DeleteFileA("C:\\contract\\shared"), FALSE);
-  Expect(_close(descriptor), 0);
-  Expect(DeleteFileA("C:\\contract\\shared"), TRUE);
+  const HANDLE exclusive = Open(name, GENERIC_READ);
+  ExpectEach({OpenDescriptor(name), _creat(name, kOwnerMayReadAndWrite), DeleteFileA(name),
+              CloseHandle(exclusive)},
+             {-1, -1, FALSE, TRUE});
+  const int descriptor = OpenDescriptor(name);
+  ExpectEach({Opens(Open(name, GENERIC_READ)), Opens(Open(name, GENERIC_READ, kShareBoth)),
+              DeleteFileA(name), _close(descriptor), DeleteFileA(name)},
+             {false, true, FALSE, 0, TRUE});
 }
 
 CONTRACT(Files, PositionsHaveThirtyTwoBits) {
   const HANDLE file = Create("C:\\contract\\positions");
   Expect(Write(file, "abc"), TRUE);
-  Expect(Seek(file, -1, FILE_BEGIN), INVALID_SET_FILE_POINTER);
-  Expect(Seek(file, -4, FILE_CURRENT), INVALID_SET_FILE_POINTER);
-  Expect(Seek(file, 0, 3), INVALID_SET_FILE_POINTER);
-  Expect(Seek(file, 0, FILE_CURRENT), 3, "a refused move moves nothing");
-  Expect(Seek(file, INT32_MAX, FILE_BEGIN), 0x7FFFFFFF);
-  Expect(Seek(file, INT32_MAX, FILE_CURRENT), 0xFFFFFFFE);
-  Expect(Seek(file, 1, FILE_CURRENT), INVALID_SET_FILE_POINTER);
+  ExpectEach({Seek(file, -1, FILE_BEGIN), Seek(file, -4, FILE_CURRENT), Seek(file, 0, 3)},
+             {INVALID_SET_FILE_POINTER});
+  // A refused move moves nothing.
+  ExpectEach({Seek(file, 0, FILE_CURRENT), Seek(file, INT32_MAX, FILE_BEGIN),
+              Seek(file, INT32_MAX, FILE_CURRENT), Seek(file, 1, FILE_CURRENT)},
+             {3, 0x7FFFFFFF, 0xFFFFFFFE, INVALID_SET_FILE_POINTER});
   LONG high = 1;
-  Expect(SetFilePointer(file, 5, &high, FILE_BEGIN), 5);
-  Expect(high, 1);
-  Expect(Read(file, 4), "", "far behind the end");
-  // Wine gives the lower half.
-  if (!contract::IsWine()) {
-    Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER, "nowhere for the upper half");
-  }
-  Expect(Seek(file, 2, FILE_END), 5);
-  Expect(GetFileSize(file, nullptr), 3, "a move behind the end adds nothing");
-  Expect(Write(file, "z"), TRUE);
-  Expect(Seek(file, 1, FILE_BEGIN), 1);
-  Expect(Read(file, 100), std::string("bc\0\0z", 5));
-  Expect(Read(file, 1), "");
-  Expect(Write(file, ""), TRUE);
-  Expect(CloseHandle(file), TRUE);
-  Expect(CloseHandle(file), FALSE);
-  Expect(Read(file, 1), "failed");
-  Expect(GetFileSize(file, nullptr), INVALID_FILE_SIZE);
-  Expect(Seek(file, 0, FILE_BEGIN), INVALID_SET_FILE_POINTER);
+  ExpectEach({SetFilePointer(file, 5, &high, FILE_BEGIN), high, Read(file, 4)}, {5, 1, ""});
+  // There is nowhere for the upper half; Wine gives the lower one.
+  if (!IsWine()) Expect(Seek(file, 0, FILE_CURRENT), INVALID_SET_FILE_POINTER);
+  // A move behind the end adds nothing.
+  ExpectEach({Seek(file, 2, FILE_END), GetFileSize(file, nullptr), Write(file, "z"),
+              Seek(file, 1, FILE_BEGIN), Read(file, 100), Read(file, 1)},
+             {5, 3, TRUE, 1, std::string("bc\0\0z", 5), ""});
+  ExpectEach({Write(file, ""), CloseHandle(file)}, {TRUE});
+  ExpectEach({CloseHandle(file), Read(file, 1)}, {FALSE, "failed"});
+  ExpectEach({GetFileSize(file, nullptr), Seek(file, 0, FILE_BEGIN)}, {INVALID_FILE_SIZE});
 }
 
-CONTRACT(Files, AccessIsWhatWasAskedFor) {
-  WriteText("C:\\contract\\access", "old");
-  const HANDLE reader = Open("C:\\contract\\access", GENERIC_READ);
-  Expect(Write(reader, "x"), FALSE);
-  CloseHandle(reader);
-  const HANDLE writer = Open("C:\\contract\\access", GENERIC_WRITE);
-  Expect(Read(writer, 1), "failed");
-  Expect(Write(writer, "N"), TRUE);
-  CloseHandle(writer);
-  Expect(ReadText("C:\\contract\\access"), "Nld");
+CONTRACT(Files, OpenGivesTheAccessAskedForAndCreateCuts) {
+  const char* const name = "C:\\contract\\Old.Log";
+  WriteText(name, "long text");
+  WriteText("C:\\contract\\OLD.log", "old");
+  const HANDLE reader = Open(name, GENERIC_READ);
+  ExpectEach({Write(reader, "x"), CloseHandle(reader)}, {FALSE, TRUE});
+  const HANDLE writer = Open(name, GENERIC_WRITE);
+  ExpectEach({Read(writer, 1), Write(writer, "N"), CloseHandle(writer)}, {"failed", TRUE, TRUE});
+  Expect(ReadText(name), "Nld");
 }
 
 CONTRACT(Files, SomeCanBeNeitherOpenedNorMade) {
   WriteText("C:\\contract\\plain", "x");
   CreateDirectoryA("C:\\contract\\folder", nullptr);
+  const char* const copy = "C:\\contract\\copy of it";
   for (const char* name :
        {"C:\\contract\\folder", "C:\\contract\\folder\\", "C:\\", "C:", "",
         "C:\\contract\\absent\\x", "C:\\contract\\plain\\x", "C:\\contract\\plain\\",
         "C:\\contract\\new\\", "C:\\contract\\a*b", "C:\\contract\\a?b", "C:\\contract\\a<b",
         "C:\\contract\\a>b", "C:\\contract\\a|b", "C:\\contract\\a\"b", "C:\\contract\\a\tb",
         "Q:\\x"}) {
-    Expect(Opens(Open(name, GENERIC_READ)), false, name);
-    Expect(Opens(Create(name)), false, name);
-    Expect(_creat(name, kOwnerMayReadAndWrite), -1, name);
-    Expect(_sopen(name, _O_RDONLY | _O_BINARY, _SH_DENYNO), -1, name);
-    Expect(DeleteFileA(name), FALSE, name);
-    Expect(CopyFileA("C:\\contract\\plain", name, FALSE), FALSE, name);
-    Expect(CopyFileA(name, "C:\\contract\\copy of it", FALSE), FALSE, name);
+    ExpectEach({Opens(Open(name, GENERIC_READ)), Opens(Create(name)), DeleteFileA(name),
+                CopyFileA("C:\\contract\\plain", name, FALSE), CopyFileA(name, copy, FALSE)},
+               {FALSE}, name);
+    ExpectEach({_creat(name, kOwnerMayReadAndWrite), OpenDescriptor(name)}, {-1}, name);
   }
-  Expect(Opens(Open("C:\\contract\\absent", GENERIC_WRITE)), false);
-  Expect(CreateFileA(nullptr, GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr),
-         INVALID_HANDLE_VALUE);
-  Expect(GetFileAttributesA("C:\\contract\\absent"), INVALID_FILE_ATTRIBUTES);
-  Expect(GetFileAttributesA("C:\\contract\\copy of it"), INVALID_FILE_ATTRIBUTES);
-}
-
-CONTRACT(Files, CreateCutsAndKeepsTheNameThatIsThere) {
-  WriteText("C:\\contract\\Old.Log", "long text");
-  WriteText("C:\\contract\\OLD.log", "new");
-  Expect(ReadText("C:\\contract\\old.log"), "new");
+  ExpectEach({Open("C:\\contract\\absent", GENERIC_WRITE),
+              CreateFileA(nullptr, GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr)},
+             {INVALID_HANDLE_VALUE});
+  ExpectEach({GetFileAttributesA("C:\\contract\\absent"), GetFileAttributesA(copy)},
+             {INVALID_FILE_ATTRIBUTES});
 }
 
 CONTRACT(Files, ReadOnlyOnesAreNeitherWrittenNorDeleted) {
-  WriteText("C:\\contract\\fixed", "kept");
-  Expect(_chmod("C:\\contract\\fixed", _S_IREAD), 0);
-  Expect(GetFileAttributesA("C:\\contract\\fixed"),
-         FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY);
-  Expect(Opens(Open("C:\\contract\\fixed", GENERIC_READ)), true);
-  Expect(DeleteFileA("C:\\contract\\fixed"), FALSE);
+  const char* const fixed = "C:\\contract\\fixed";
+  WriteText(fixed, "kept");
+  Expect(_chmod(fixed, _S_IREAD), 0);
+  Expect(GetFileAttributesA(fixed), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY);
+  Expect(Opens(Open(fixed, GENERIC_READ)), true);
+  Expect(DeleteFileA(fixed), FALSE);
   // Wine leaves the refusal to the host, which refuses root nothing.
-  if (!contract::IsWine()) {
+  if (!IsWine()) {
     WriteText("C:\\contract\\other", "new");
-    Expect(Opens(Open("C:\\contract\\fixed", GENERIC_WRITE)), false);
-    Expect(Opens(Create("C:\\contract\\fixed")), false);
-    Expect(CopyFileA("C:\\contract\\other", "C:\\contract\\fixed", FALSE), FALSE);
-    Expect(_creat("C:\\contract\\fixed", kOwnerMayReadAndWrite), -1);
-    Expect(_sopen("C:\\contract\\fixed", _O_WRONLY | _O_BINARY, _SH_DENYNO), -1);
+    ExpectEach({Opens(Open(fixed, GENERIC_WRITE)), Opens(Create(fixed)),
+                CopyFileA("C:\\contract\\other", fixed, FALSE)},
+               {FALSE});
+    ExpectEach({_creat(fixed, kOwnerMayReadAndWrite), OpenDescriptor(fixed, _O_WRONLY)}, {-1});
   }
-  Expect(ReadText("C:\\contract\\fixed"), "kept");
-  Expect(_chmod("C:\\contract\\fixed", kOwnerMayReadAndWrite), 0);
-  Expect(DeleteFileA("C:\\contract\\fixed"), TRUE);
-
+  Expect(ReadText(fixed), "kept");
   Expect(Opens(Create("C:\\contract\\made", FILE_ATTRIBUTE_READONLY)), true);
   Expect(DeleteFileA("C:\\contract\\made"), FALSE);
-  Expect(_chmod("C:\\contract\\made", kOwnerMayReadAndWrite), 0);
-  Expect(DeleteFileA("C:\\contract\\made"), TRUE);
-  Expect(DeleteFileA("C:\\contract\\made"), FALSE);
+  for (const char* name : {fixed, "C:\\contract\\made"}) {
+    Expect(_chmod(name, kOwnerMayReadAndWrite), 0, name);
+    Expect(DeleteFileA(name), TRUE, name);
+    Expect(DeleteFileA(name), FALSE, name);
+  }
 }
 
 CONTRACT(Files, CopiesCarryBytesAndAttributes) {
+  const char* const from = "C:\\contract\\from";
+  const char* const there = "C:\\contract\\to";
   const std::string bytes(200000, 'b');
-  WriteText("C:\\contract\\from", bytes);
-  WriteText("C:\\contract\\to", "something else");
-  Expect(CopyFileA("C:\\contract\\from", "C:\\contract\\to", TRUE), FALSE);
-  Expect(ReadText("C:\\contract\\to"), "something else");
-  _chmod("C:\\contract\\from", _S_IREAD);
-  for (const std::string to : {"C:\\contract\\to", "C:\\contract\\new to"}) {
-    Expect(CopyFileA("C:\\contract\\from", to.c_str(), FALSE), TRUE, to);
+  WriteText(from, bytes);
+  WriteText(there, "something else");
+  Expect(CopyFileA(from, there, TRUE), FALSE);
+  Expect(ReadText(there), "something else");
+  _chmod(from, _S_IREAD);
+  for (const char* to : {there, "C:\\contract\\new to"}) {
+    Expect(CopyFileA(from, to, FALSE), TRUE, to);
     Expect(ReadText(to) == bytes, true, to);
     // Wine leaves a file that is there its attributes.
-    if (contract::IsWine() && to == "C:\\contract\\to") continue;
-    Expect(GetFileAttributesA(to.c_str()), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY, to);
-    _chmod(to.c_str(), kOwnerMayReadAndWrite);
+    if (!IsWine() || to != there) {
+      Expect(GetFileAttributesA(to), FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_READONLY, to);
+    }
+    _chmod(to, kOwnerMayReadAndWrite);
   }
-  _chmod("C:\\contract\\from", kOwnerMayReadAndWrite);
-  _chmod("C:\\contract\\to", kOwnerMayReadAndWrite);
-
-  WriteText("C:\\contract\\self", "whole");
-  Expect(CopyFileA("C:\\contract\\self", "C:\\contract\\SELF", FALSE), FALSE);
-  Expect(ReadText("C:\\contract\\self"), "whole");
-  Expect(CopyFileA("C:\\contract\\absent", "C:\\contract\\copy", FALSE), FALSE);
+  _chmod(from, kOwnerMayReadAndWrite);
 
   // The source is opened with sharing, which an exclusive opener of it does not answer.
-  HANDLE holder = Open("C:\\contract\\self", GENERIC_READ, kShareRead);
-  Expect(CopyFileA("C:\\contract\\self", "C:\\contract\\copy", FALSE), TRUE);
-  Expect(CopyFileA("C:\\contract\\from", "C:\\contract\\self", FALSE), FALSE, "held target");
-  CloseHandle(holder);
-  holder = Open("C:\\contract\\self", GENERIC_READ);
-  Expect(CopyFileA("C:\\contract\\self", "C:\\contract\\copy", FALSE), FALSE);
-  CloseHandle(holder);
-  Expect(ReadText("C:\\contract\\self"), "whole");
+  const char* const self = "C:\\contract\\self";
+  const char* const copy = "C:\\contract\\copy";
+  WriteText(self, "whole");
+  HANDLE holder = Open(self, GENERIC_READ, kShareRead);
+  ExpectEach({CopyFileA(self, copy, FALSE), CopyFileA(from, self, FALSE), CloseHandle(holder)},
+             {TRUE, FALSE, TRUE});
+  holder = Open(self, GENERIC_READ);
+  ExpectEach({CopyFileA(self, copy, FALSE), CloseHandle(holder)}, {FALSE, TRUE});
+  ExpectEach({CopyFileA(self, "C:\\contract\\SELF", FALSE),
+              CopyFileA("C:\\contract\\absent", copy, FALSE)},
+             {FALSE});
+  Expect(ReadText(self), "whole");
 }
 
 CONTRACT(Files, DirectoriesComeOneByOneAndGoEmpty) {
-  Expect(CreateDirectoryA("C:\\contract\\A\\b", nullptr), FALSE, "no parent");
-  Expect(CreateDirectoryA("C:\\contract\\A", nullptr), TRUE);
-  Expect(CreateDirectoryA("C:\\contract\\a", nullptr), FALSE, "there already");
-  Expect(CreateDirectoryA("C:\\contract\\a\\b\\", nullptr), TRUE);
+  ExpectEach(
+      {CreateDirectoryA("C:\\contract\\A\\b", nullptr),
+       CreateDirectoryA("C:\\contract\\A", nullptr), CreateDirectoryA("C:\\contract\\a", nullptr),
+       CreateDirectoryA("C:\\contract\\a\\b\\", nullptr)},
+      {FALSE, TRUE, FALSE, TRUE});
   WriteText("C:\\contract\\a\\b\\file", "x");
   for (const char* name : {"C:\\contract\\a\\b\\file", "C:\\contract\\a\\b\\file\\x", "C:\\", "",
                            "Q:\\x", "C:\\contract\\a\\x?y"}) {
-    Expect(CreateDirectoryA(name, nullptr), FALSE, name);
-    Expect(RemoveDirectoryA(name), FALSE, name);
+    ExpectEach({CreateDirectoryA(name, nullptr), RemoveDirectoryA(name)}, {FALSE}, name);
   }
-  Expect(RemoveDirectoryA("C:\\contract\\a"), FALSE);
-  Expect(RemoveDirectoryA("C:\\contract\\a\\b"), FALSE);
-  Expect(RemoveDirectoryA("C:\\contract\\absent"), FALSE);
-  Expect(DeleteFileA("C:\\contract\\a\\b"), FALSE);
-  Expect(DeleteFileA("C:\\contract\\a\\b\\FILE"), TRUE);
-  Expect(RemoveDirectoryA("C:\\contract\\a\\b"), TRUE);
-  Expect(RemoveDirectoryA("C:\\contract\\a\\"), TRUE);
+  ExpectEach({RemoveDirectoryA("C:\\contract\\a"), RemoveDirectoryA("C:\\contract\\a\\b"),
+              RemoveDirectoryA("C:\\contract\\absent"), DeleteFileA("C:\\contract\\a\\b")},
+             {FALSE});
+  ExpectEach({DeleteFileA("C:\\contract\\a\\b\\FILE"), RemoveDirectoryA("C:\\contract\\a\\b"),
+              RemoveDirectoryA("C:\\contract\\a\\")},
+             {TRUE});
   Expect(GetFileAttributesA("C:\\contract\\a"), INVALID_FILE_ATTRIBUTES);
 }
+
+}  // namespace contract

@@ -1,23 +1,10 @@
 // Messages: what is sent, posted and polled, what a click and a change of text bring.
-#include <string>
 #include <vector>
 
 #include "tests/contract/standing_dialog.h"
 
-using contract::Expect;
-using contract::IsStep;
-using contract::kLastStep;
-using contract::kNextStep;
-using contract::kStep;
-using contract::RunDialog;
-using contract::RunStanding;
-
+namespace contract {
 namespace {
-
-constexpr UINT kButtonDown = 0x201;
-constexpr UINT kButtonUp = 0x202;
-constexpr int kEditChange = 0x300;
-constexpr int kEditUpdate = 0x400;
 
 // The next posted step, taken out of the queue; others are dispatched on the way. 0 for none.
 MSG TakeStep() {
@@ -31,6 +18,8 @@ MSG TakeStep() {
 }
 
 void PostClick(HWND control) {
+  constexpr UINT kButtonDown = 0x201;
+  constexpr UINT kButtonUp = 0x202;
   PostMessageA(control, kButtonDown, 1, 0x00020002);
   PostMessageA(control, kButtonUp, 0, 0x00020002);
 }
@@ -41,8 +30,7 @@ CONTRACT(Messages, SentMessageAnswersNothingOfTheHandlers) {
   RunDialog([](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
     if (message == WM_INITDIALOG) {
       // What a handler returns tells only whether it has handled the message.
-      Expect(SendMessageA(dialog, kStep, 1, 0), 0);
-      Expect(SendMessageA(dialog, WM_COMMAND, 77, 0), 0);
+      ExpectEach({SendMessageA(dialog, kStep, 1, 0), SendMessageA(dialog, WM_COMMAND, 77, 0)}, {0});
       EndDialog(dialog, 1);
     }
     return message == kStep || (message == WM_COMMAND && LOWORD(wParam) == 77) ? 5 : FALSE;
@@ -52,17 +40,13 @@ CONTRACT(Messages, SentMessageAnswersNothingOfTheHandlers) {
 CONTRACT(Messages, PostedMessagesComeInTheirOrder) {
   std::vector<UINT> order;
   RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
-    if (message == WM_INITDIALOG) {
-      Expect(PostMessageA(dialog, kStep, 1, 2), TRUE);
-      Expect(PostMessageA(dialog, kNextStep, 0, 0), TRUE);
-    }
     if (IsStep(message)) order.push_back(message);
     if (message == kStep) {
-      Expect(wParam, 1);
-      Expect(lParam, 2);
-      PostMessageA(dialog, kLastStep, 0, 0);
+      ExpectEach({PostMessageA(dialog, kNextStep, 1, 2), PostMessageA(dialog, kLastStep, 0, 0)},
+                 {TRUE});
       Expect(order.size(), 1, "none runs inside the call");
     }
+    if (message == kNextStep) Expect(wParam * 10 + static_cast<WPARAM>(lParam), 12);
     if (message == kLastStep) {
       EndDialog(dialog, 1);
       PostMessageA(dialog, kStep, 0, 0);  // too late: the loop has ended
@@ -75,36 +59,28 @@ CONTRACT(Messages, PostedMessagesComeInTheirOrder) {
 CONTRACT(Messages, PolledMessagesAreThoseOfWindowsThatStand) {
   RunStanding([](HWND dialog) {
     const HWND gone = GetDlgItem(dialog, 9);
-    Expect(PostMessageA(gone, kStep, 0, 0), TRUE);
-    Expect(PostMessageA(dialog, kNextStep, 3, 4), TRUE);
-    Expect(PostMessageA(nullptr, kLastStep, 0, 0), TRUE, "of the thread");
+    ExpectEach({PostMessageA(gone, kStep, 0, 0), PostMessageA(dialog, kNextStep, 3, 4),
+                PostMessageA(nullptr, kLastStep, 0, 0)},
+               {TRUE}, "the last is the thread's own");
     DestroyWindow(gone);
     Expect(PostMessageA(gone, kStep, 0, 0), FALSE);
-    MSG message = TakeStep();
-    Expect(message.message, kNextStep);
-    Expect(message.hwnd, dialog);
-    Expect(message.wParam, 3);
-    Expect(message.lParam, 4);
-    message = TakeStep();
-    Expect(message.message, kLastStep);
-    Expect(message.hwnd, nullptr);
-    Expect(DispatchMessageA(&message), 0);
-    Expect(TakeStep().message, 0);
+    const MSG own = TakeStep();
+    ExpectEach({own.message, own.hwnd, own.wParam, own.lParam}, {kNextStep, dialog, 3, 4});
+    const MSG nobodys = TakeStep();
+    ExpectEach({nobodys.message, nobodys.hwnd}, {kLastStep, nullptr});
+    ExpectEach({DispatchMessageA(&nobodys), TakeStep().message}, {0});
   });
 }
 
 CONTRACT(Messages, EndInsideANestedHandlerWaitsForTheOuterOne) {
   bool isOuterDone = false;
   const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
-    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
     if (message == kStep) {
-      PostMessageA(dialog, kNextStep, 0, 0);
-      PostMessageA(dialog, kLastStep, 0, 0);
+      for (const UINT step : {kNextStep, kLastStep}) PostMessageA(dialog, step, 0, 0);
       const MSG next = TakeStep();
       Expect(next.message, kNextStep);
       DispatchMessageA(&next);
-      Expect(IsWindow(dialog), TRUE);
-      Expect(GetDlgItem(dialog, 10) != nullptr, true);
+      Expect(IsWindow(dialog) && GetDlgItem(dialog, 10) != nullptr, true);
       isOuterDone = true;
     }
     if (message == kNextStep) EndDialog(dialog, 7);
@@ -116,21 +92,17 @@ CONTRACT(Messages, EndInsideANestedHandlerWaitsForTheOuterOne) {
 }
 
 CONTRACT(Messages, ClickGivesTheIdOfThatMoment) {
-  std::vector<int> commands;
+  std::string commands;
   RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
-    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
     if (message == kStep) {
-      // Only the last can be clicked on: a text without SS_NOTIFY, disabled, hidden, renumbered.
+      // The first has no SS_NOTIFY; the others have been renumbered.
       SetWindowLongA(GetDlgItem(dialog, 11), GWL_ID, 21);
-      const HWND notified = GetDlgItem(dialog, 9);
-      SetWindowLongA(notified, GWL_ID, 20);
-      PostClick(GetDlgItem(dialog, 9));
-      PostClick(GetDlgItem(dialog, 21));
-      PostClick(notified);
+      SetWindowLongA(GetDlgItem(dialog, 9), GWL_ID, 20);
+      for (const int id : {9, 21, 20}) PostClick(GetDlgItem(dialog, id));
       PostMessageA(dialog, kLastStep, 0, 0);
     }
     if (message == WM_COMMAND && HIWORD(wParam) == 0) {
-      commands.push_back(LOWORD(wParam));
+      commands += std::to_string(LOWORD(wParam)) + ' ';
       Expect(reinterpret_cast<HWND>(lParam), GetDlgItem(dialog, LOWORD(wParam)));
       const HWND button = GetDlgItem(dialog, 21);
       if (LOWORD(wParam) == 21) Expect(SetFocus(button), button, "the click has moved it there");
@@ -138,15 +110,16 @@ CONTRACT(Messages, ClickGivesTheIdOfThatMoment) {
     if (message == kLastStep) EndDialog(dialog, 1);
     return FALSE;
   });
-  Expect(commands == std::vector<int>{21, 20}, true);
+  Expect(commands, "21 20 ");
 }
 
 CONTRACT(Messages, EditFieldTellsOfEveryChange) {
-  std::vector<int> notices;
+  std::string notices;
   RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-    const bool isNotice = message == WM_COMMAND && LOWORD(wParam) == 10;
-    if (isNotice && HIWORD(wParam) >= kEditChange) notices.push_back(HIWORD(wParam));
-    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
+    const bool isOfFocus = HIWORD(wParam) < 0x300;
+    if (message == WM_COMMAND && LOWORD(wParam) == 10 && !isOfFocus) {
+      notices += std::to_string(HIWORD(wParam)) + ' ';
+    }
     if (message == kStep) {
       SetWindowTextA(GetDlgItem(dialog, 10), "by program");
       SetWindowTextA(GetDlgItem(dialog, 11), "a button");
@@ -155,5 +128,7 @@ CONTRACT(Messages, EditFieldTellsOfEveryChange) {
     }
     return FALSE;
   });
-  Expect(notices == std::vector<int>{kEditUpdate, kEditChange}, true);
+  Expect(notices, "1024 768 ");  // EN_UPDATE, EN_CHANGE
 }
+
+}  // namespace contract

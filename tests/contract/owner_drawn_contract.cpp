@@ -1,48 +1,25 @@
 // Controls that the dialog draws itself: a list and a text.
 #include <algorithm>
-#include <string>
 #include <vector>
 
 #include "tests/contract/standing_dialog.h"
 
-using contract::Expect;
-using contract::kStep;
-using contract::RunDialog;
-using contract::RunStanding;
+namespace contract {
 
 CONTRACT(List, GivesBackWhatItWasGiven) {
   RunStanding([](HWND dialog) {
-    const HWND list = GetDlgItem(dialog, 14);
-    const struct {
-      UINT message;
-      WPARAM wParam;
-      LPARAM lParam;
-      LRESULT result;
-    } rows[] = {
-        {CB_GETCOUNT, 0, 0, 0},
-        {CB_GETCURSEL, 0, 0, CB_ERR},
-        {CB_GETITEMDATA, 0, 0, CB_ERR},
-        {CB_SETCURSEL, 0, 0, CB_ERR},
-        {CB_ADDSTRING, 0, 1000, 0},
-        {CB_ADDSTRING, 0, 900, 1},
-        {CB_GETCOUNT, 0, 0, 2},
-        {CB_GETITEMDATA, 1, 0, 900},
-        {CB_SETCURSEL, 1, 0, 1},
-        {CB_GETCURSEL, 0, 0, 1},
-        {CB_SETCURSEL, 2, 0, CB_ERR},
-        {CB_SETCURSEL, 0, 0, 0},
-        {CB_SETCURSEL, static_cast<WPARAM>(-1), 0, CB_ERR},
-        {CB_GETCURSEL, 0, 0, CB_ERR},
-        {CB_GETITEMDATA, 2, 0, CB_ERR},
-        {CB_GETITEMDATA, static_cast<WPARAM>(-1), 0, CB_ERR},
-        {CB_SETITEMDATA, 2, 5, CB_ERR},
-        {CB_SETITEMDATA, 0, 5, TRUE},
-        {CB_GETITEMDATA, 0, 0, 5},
+    const auto send = [&](UINT message, int wParam = 0, LPARAM lParam = 0) {
+      return SendMessageA(GetDlgItem(dialog, 14), message, static_cast<WPARAM>(wParam), lParam);
     };
-    for (size_t i = 0; i < std::size(rows); ++i) {
-      Expect(SendMessageA(list, rows[i].message, rows[i].wParam, rows[i].lParam), rows[i].result,
-             "row " + std::to_string(i));
-    }
+    ExpectEach({send(CB_GETCURSEL), send(CB_GETITEMDATA), send(CB_SETCURSEL)}, {CB_ERR});
+    ExpectEach({send(CB_GETCOUNT), send(CB_ADDSTRING, 0, 1000), send(CB_ADDSTRING, 0, 900),
+                send(CB_GETCOUNT), send(CB_GETITEMDATA, 1), send(CB_SETCURSEL, 1),
+                send(CB_GETCURSEL), send(CB_SETCURSEL, 2), send(CB_SETCURSEL, 0)},
+               {0, 0, 1, 2, 900, 1, 1, CB_ERR, 0});
+    ExpectEach({send(CB_SETCURSEL, -1), send(CB_GETCURSEL), send(CB_GETITEMDATA, 2),
+                send(CB_GETITEMDATA, -1), send(CB_SETITEMDATA, 2, 5)},
+               {CB_ERR});
+    ExpectEach({send(CB_SETITEMDATA, 0, 5), send(CB_GETITEMDATA)}, {TRUE, 5});
     Expect(SendMessageA(GetDlgItem(dialog, 11), CB_GETCOUNT, 0, 0), 0, "a button");
   });
 }
@@ -61,9 +38,8 @@ CONTRACT(List, TellsOfEveryEntryThatGoes) {
     }
     if (message == WM_DELETEITEM) {
       const auto& deleted = *reinterpret_cast<const DELETEITEMSTRUCT*>(lParam);
-      Expect(wParam, 14);
+      ExpectEach({wParam, deleted.CtlID}, {14});
       Expect(deleted.CtlType, ODT_COMBOBOX);
-      Expect(deleted.CtlID, 14);
       Expect(IsWindow(deleted.hwndItem), TRUE);
       order += std::to_string(deleted.itemID) + " " + std::to_string(deleted.itemData) + ";";
     }
@@ -76,24 +52,23 @@ CONTRACT(Drawing, ControlsDrawThemselvesWhenNothingWaits) {
   std::vector<int> drawn;
   bool isStepDone = false;
   RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
-    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
     if (message == kStep) isStepDone = true;
     if (message == WM_DRAWITEM) {
       Expect(isStepDone, true);
       const auto& item = *reinterpret_cast<const DRAWITEMSTRUCT*>(lParam);
-      Expect(wParam, item.CtlID);
-      Expect(item.hwndItem, GetDlgItem(dialog, static_cast<int>(item.CtlID)));
+      const int id = static_cast<int>(item.CtlID);
+      Expect(wParam, id);
+      Expect(item.hwndItem, GetDlgItem(dialog, id));
       Expect(item.hDC != nullptr, true);
       Expect(item.rcItem.right > item.rcItem.left && item.rcItem.bottom > item.rcItem.top, true);
-      if (item.CtlID == 14) {
-        Expect(item.CtlType, ODT_COMBOBOX);
-        Expect(item.itemID, UINT32_MAX, "nothing is selected");
-      }
-      if (item.CtlID == 13) Expect(item.CtlType, 5);
-      drawn.push_back(static_cast<int>(item.CtlID));
+      Expect(item.CtlType, id == 14 ? ODT_COMBOBOX : 5);
+      if (id == 14) Expect(item.itemID, UINT32_MAX, "nothing is selected");
+      drawn.push_back(id);
       const bool hasAll = std::ranges::count(drawn, 13) != 0 && std::ranges::count(drawn, 14) != 0;
       if (hasAll) EndDialog(dialog, 1);
     }
     return message == WM_DRAWITEM;
   });
 }
+
+}  // namespace contract

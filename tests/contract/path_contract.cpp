@@ -3,32 +3,13 @@
 
 #include "tests/contract/contract.h"
 
-using contract::Expect;
-using contract::ReadText;
-using contract::WriteText;
-
-namespace {
-
-HANDLE Create(const std::string& name) {
-  return CreateFileA(name.c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0,
-                     nullptr);
-}
-
-bool CanBeMade(const std::string& name) {
-  const HANDLE file = Create(name);
-  return file != INVALID_HANDLE_VALUE && CloseHandle(file) != FALSE;
-}
-
-}  // namespace
+namespace contract {
 
 CONTRACT(Paths, NamesLeadToTheirFiles) {
   CreateDirectoryA("C:\\contract\\Dir", nullptr);
   WriteText("C:\\contract\\Dir\\Read Me.TXT", "x");
   WriteText("C:\\contract\\caf\xE9", "x");
-  const struct {
-    DWORD attributes;
-    std::vector<std::string> names;
-  } rows[] = {
+  const std::pair<DWORD, std::vector<const char*>> rows[] = {
       {FILE_ATTRIBUTE_DIRECTORY,
        {"C:\\contract\\Dir", "C:\\contract\\Dir\\", "C:", "\\contract\\dir",
         "C:\\contract\\absent\\..\\dir", "C:\\..\\..\\contract\\dir", "C:\\contract\\dir. ",
@@ -63,11 +44,9 @@ CONTRACT(Paths, NamesLeadToTheirFiles) {
         "",
         "C:\\contract\\CONSOLE",
         "C:\\contract\\COM0",
-        "C:\\contract\\nul\\x"}},
-  };
+        "C:\\contract\\nul\\x"}}};
   for (const auto& [attributes, names] : rows) {
-    for (const std::string& name : names)
-      Expect(GetFileAttributesA(name.c_str()), attributes, name);
+    for (const char* name : names) Expect(GetFileAttributesA(name), attributes, name);
   }
   Expect(GetFileAttributesA("C:\\") & FILE_ATTRIBUTE_DIRECTORY, FILE_ATTRIBUTE_DIRECTORY);
   Expect(GetFileAttributesA(nullptr), INVALID_FILE_ATTRIBUTES);
@@ -75,9 +54,9 @@ CONTRACT(Paths, NamesLeadToTheirFiles) {
   // The end of a name falls away when it is made too.
   WriteText("C:\\contract\\end. ", "x");
   Expect(ReadText("C:\\contract\\end"), "x");
-  Expect(DeleteFileA("C:\\contract\\END.. "), TRUE);
-  Expect(CreateDirectoryA("C:\\contract\\tail ", nullptr), TRUE);
-  Expect(RemoveDirectoryA("C:\\contract\\tail"), TRUE);
+  ExpectEach({DeleteFileA("C:\\contract\\END.. "), CreateDirectoryA("C:\\contract\\tail ", nullptr),
+              RemoveDirectoryA("C:\\contract\\tail")},
+             {TRUE});
 }
 
 // Names of devices are no names of files: the null device takes and forgets what is written.
@@ -92,7 +71,7 @@ CONTRACT(Paths, NullDeviceIsOpenedForAName) {
   Expect(done, 0);
   Expect(CloseHandle(device), TRUE);
   // Wine makes a directory of that name.
-  if (!contract::IsWine()) Expect(CreateDirectoryA("C:\\contract\\nul", nullptr), FALSE);
+  if (!IsWine()) Expect(CreateDirectoryA("C:\\contract\\nul", nullptr), FALSE);
   Expect(DeleteFileA("C:\\contract\\nul"), FALSE);
 }
 
@@ -103,13 +82,15 @@ CONTRACT(Paths, PathsOf260CharactersAreTooLong) {
   };
   Expect(CreateDirectoryA(path(247).c_str(), nullptr), TRUE);
   Expect(GetFileAttributesA(path(247).c_str()), FILE_ATTRIBUTE_DIRECTORY);
-  Expect(RemoveDirectoryA(path(247).c_str()), TRUE);
-  Expect(CanBeMade(path(259)), true);
-  Expect(CopyFileA(path(259).c_str(), path(258).c_str(), FALSE), TRUE);
-  Expect(DeleteFileA(path(259).c_str()), TRUE);
+  ExpectEach(
+      {RemoveDirectoryA(path(247).c_str()), Opens(Create(path(259))),
+       CopyFileA(path(259).c_str(), path(258).c_str(), FALSE), DeleteFileA(path(259).c_str())},
+      {TRUE});
   // Wine has no limits of its own.
-  if (contract::IsWine()) return;
-  Expect(CreateDirectoryA(path(248).c_str(), nullptr), FALSE);
-  Expect(CanBeMade(path(260)), false);
-  Expect(CopyFileA(path(258).c_str(), path(260).c_str(), FALSE), FALSE);
+  if (IsWine()) return;
+  ExpectEach({CreateDirectoryA(path(248).c_str(), nullptr), Opens(Create(path(260))),
+              CopyFileA(path(258).c_str(), path(260).c_str(), FALSE)},
+             {FALSE});
 }
+
+}  // namespace contract

@@ -1,46 +1,38 @@
 // The registry: rights, sizes, and what a key or a value that is not there answers.
-#include <cstring>
+#include <algorithm>
 
 #include "tests/contract/contract.h"
 
-using contract::Expect;
-
+namespace contract {
 namespace {
 
 constexpr LSTATUS kErrorBadPathname = 161;
 constexpr LSTATUS kErrorKeyDeleted = 1018;
 const HKEY kMachine = HKEY_LOCAL_MACHINE;
 
-HKEY Make(HKEY parent, const std::string& path, REGSAM access = KEY_ALL_ACCESS) {
-  HKEY key = nullptr;
-  Expect(RegCreateKeyExA(parent, path.c_str(), 0, nullptr, REG_OPTION_NON_VOLATILE, access, nullptr,
-                         &key, nullptr),
-         ERROR_SUCCESS, path);
-  return key;
-}
-
-// A key of the case, closed at its end.
+// A key of the case, made with its parents, closed at its end.
 class CaseKey {
  public:
-  explicit CaseKey(const std::string& below = "", REGSAM access = KEY_ALL_ACCESS)
-      : key_(Make(kMachine, contract::kKey + below, access)) {}
+  explicit CaseKey(const std::string& below = "", REGSAM access = KEY_ALL_ACCESS,
+                   HKEY root = kMachine) {
+    const std::string path = root == kMachine ? kKey + below : below;
+    Expect(RegCreateKeyExA(root, path.c_str(), 0, nullptr, REG_OPTION_NON_VOLATILE, access, nullptr,
+                           &key_, nullptr),
+           ERROR_SUCCESS, path);
+  }
   ~CaseKey() { RegCloseKey(key_); }
   CaseKey(const CaseKey&) = delete;
   CaseKey& operator=(const CaseKey&) = delete;
   operator HKEY() const { return key_; }
 
  private:
-  HKEY key_;
+  HKEY key_ = nullptr;
 };
 
-std::string Below(const char* path) {
-  return std::string(contract::kKey) + path;
-}
-
 // Status of an open that is closed again at once.
-LSTATUS Open(HKEY parent, const std::string& path) {
+LSTATUS OpenKey(HKEY parent, const char* path) {
   HKEY key = nullptr;
-  const LSTATUS status = RegOpenKeyExA(parent, path.c_str(), 0, KEY_READ, &key);
+  const LSTATUS status = RegOpenKeyExA(parent, path, 0, KEY_READ, &key);
   if (status == ERROR_SUCCESS) RegCloseKey(key);
   return status;
 }
@@ -49,168 +41,146 @@ LSTATUS Set(HKEY key, const char* name, const char* bytes, DWORD size, DWORD typ
   return RegSetValueExA(key, name, 0, type, reinterpret_cast<const BYTE*>(bytes), size);
 }
 
+// Status; type and size, where they are told; the bytes, a NUL as a full stop.
+std::string Query(HKEY key, const char* name, DWORD room = 16) {
+  char data[16] = {};
+  DWORD type = 0;
+  DWORD size = room;
+  const LSTATUS status =
+      RegQueryValueExA(key, name, nullptr, &type, reinterpret_cast<BYTE*>(data), &size);
+  std::string told = std::to_string(status);
+  if (status != ERROR_SUCCESS && status != ERROR_MORE_DATA) return told;
+  told += " type " + std::to_string(type) + " size " + std::to_string(size);
+  if (status != ERROR_SUCCESS) return told;
+  std::replace(data, data + size, '\0', '.');
+  return told + ' ' + std::string(data, size);
+}
+
+// Status, and the name where it is told.
+std::string Enumerate(HKEY key, DWORD index, DWORD room = 8) {
+  char name[8] = "";
+  const LSTATUS status = RegEnumKeyA(key, index, name, room);
+  return status == ERROR_SUCCESS ? name : std::to_string(status);
+}
+
 }  // namespace
 
 CONTRACT(Registry, PathsAreMadeWholeAndFoundInAnyCase) {
-  DWORD disposition = 0;
+  const std::string path = std::string(kKey) + "\\Made\\Whole";
   HKEY key = nullptr;
-  const std::string path = Below("\\Made\\Whole");
   for (const DWORD expected : {1u, 2u}) {  // made, opened
-    Expect(RegCreateKeyExA(kMachine, path.c_str(), 0, nullptr, 0, KEY_READ, nullptr, &key,
-                           &disposition),
-           ERROR_SUCCESS);
+    DWORD disposition = 0;
+    ExpectEach({RegCreateKeyExA(kMachine, path.c_str(), 0, nullptr, 0, KEY_READ, nullptr, &key,
+                                &disposition),
+                OpenKey(key, ""), RegCloseKey(key)},
+               {ERROR_SUCCESS});
     Expect(disposition, expected);
-    Expect(Open(key, ""), ERROR_SUCCESS);
-    Expect(RegCloseKey(key), ERROR_SUCCESS);
   }
-  Expect(Open(kMachine, "software\\zEB\\CONTRACT\\made"), ERROR_SUCCESS);
-  Expect(Open(kMachine, path + "\\"), ERROR_SUCCESS);
-  Expect(Open(kMachine, Below("\\Made\\\\Whole")), ERROR_SUCCESS);
-  Expect(Open(kMachine, Below("\\Other")), ERROR_FILE_NOT_FOUND);
-  Expect(Open(kMachine, Below("\\Other\\Below")), ERROR_FILE_NOT_FOUND);
-  Expect(Open(kMachine, "\\" + path), kErrorBadPathname);
-  Expect(Open(kMachine, ""), ERROR_SUCCESS);
-  Expect(RegOpenKeyExA(kMachine, nullptr, 0, KEY_READ, &key), ERROR_SUCCESS);
-  RegCloseKey(key);
+  const CaseKey made;
+  ExpectEach({OpenKey(kMachine, "software\\zEB\\CONTRACT\\made"), OpenKey(made, "Made\\Whole\\"),
+              OpenKey(made, "made\\\\Whole"), OpenKey(made, ""), OpenKey(kMachine, nullptr)},
+             {ERROR_SUCCESS});
+  ExpectEach({OpenKey(made, "Other"), OpenKey(made, "Other\\Below")}, {ERROR_FILE_NOT_FOUND});
+  Expect(OpenKey(kMachine, ("\\" + path).c_str()), kErrorBadPathname);
 }
 
 CONTRACT(Registry, ClassesAreKeysOfTheMachine) {
-  RegCloseKey(Make(HKEY_CLASSES_ROOT, "contract.test"));
-  Expect(Open(kMachine, "SOFTWARE\\Classes\\contract.test"), ERROR_SUCCESS);
+  const char* const path = "SOFTWARE\\Classes\\contract.test";
+  const CaseKey key("contract.test", KEY_READ, HKEY_CLASSES_ROOT);
+  Expect(OpenKey(kMachine, path), ERROR_SUCCESS);
   Expect(RegDeleteKeyA(HKEY_CLASSES_ROOT, "contract.test"), ERROR_SUCCESS);
-  Expect(Open(kMachine, "SOFTWARE\\Classes\\contract.test"), ERROR_FILE_NOT_FOUND);
+  Expect(OpenKey(kMachine, path), ERROR_FILE_NOT_FOUND);
 }
 
 CONTRACT(Registry, SizesAreThoseOfTheBytesStored) {
   const CaseKey key;
-  // The NT family also stores a NUL that it finds behind the bytes: here none is.
-  Expect(Set(key, "v", "C:\\x!", 4), ERROR_SUCCESS);
-  DWORD type = 0;
-  DWORD size = 99;
-  Expect(RegQueryValueExA(key, "V", nullptr, &type, nullptr, &size), ERROR_SUCCESS);
-  Expect(type, REG_SZ);
-  Expect(size, 4);
-  Expect(RegQueryValueExA(key, "v", nullptr, &type, nullptr, nullptr), ERROR_SUCCESS);
-
-  const struct {
-    DWORD room;
-    LSTATUS status;
-  } rows[] = {{0, ERROR_MORE_DATA}, {3, ERROR_MORE_DATA}, {4, ERROR_SUCCESS}, {8, ERROR_SUCCESS}};
-  for (const auto& row : rows) {
-    char data[8] = {};
-    size = row.room;
-    Expect(RegQueryValueExA(key, "v", nullptr, nullptr, reinterpret_cast<BYTE*>(data), &size),
-           row.status, std::to_string(row.room));
-    Expect(size, 4, std::to_string(row.room));
-    if (row.status == ERROR_SUCCESS) Expect(std::string(data, 4), "C:\\x");
-  }
+  Expect(Query(key, nullptr), "2");
+  // The NT family also stores a NUL that it finds behind the bytes: in the first none is.
+  ExpectEach({Set(key, "v", "C:\\x!", 4), Set(key, "whole", "C:\\x", 5),
+              Set(key, "empty", nullptr, 0, REG_EXPAND_SZ), Set(key, "raw", "\1\0\2", 3, 3),
+              Set(key, nullptr, "default", 8)},
+             {ERROR_SUCCESS});
+  ExpectEach({Query(key, "v", 0), Query(key, "v", 3)}, {"234 type 1 size 4"});
+  ExpectEach({Query(key, "V", 4), Query(key, "v", 8)}, {"0 type 1 size 4 C:\\x"});
+  ExpectEach({Query(key, "whole"), Query(key, "empty"), Query(key, "raw"), Query(key, ""),
+              Query(key, "absent")},
+             {"0 type 1 size 5 C:\\x.", "0 type 2 size 0 ", "0 type 3 size 3 \1.\2",
+              "0 type 1 size 8 default.", "2"});
   BYTE data[8];
-  size = sizeof(data);
-  Expect(Set(key, "whole", "C:\\x", 5), ERROR_SUCCESS);
-  Expect(RegQueryValueExA(key, "whole", nullptr, nullptr, data, &size), ERROR_SUCCESS);
-  Expect(size, 5);
-  Expect(Set(key, "v", nullptr, 0, REG_EXPAND_SZ), ERROR_SUCCESS);
-  Expect(RegQueryValueExA(key, "v", nullptr, &type, data, &size), ERROR_SUCCESS);
-  Expect(size, 0);
-  Expect(type, REG_EXPAND_SZ);
-  size = sizeof(data);
-  Expect(Set(key, "raw", "\1\0\2", 3, 3), ERROR_SUCCESS);
-  Expect(RegQueryValueExA(key, "raw", nullptr, &type, data, &size), ERROR_SUCCESS);
-  Expect(std::string(reinterpret_cast<char*>(data), size), std::string("\1\0\2", 3));
-  Expect(RegQueryValueExA(key, "v", nullptr, nullptr, data, nullptr), ERROR_INVALID_PARAMETER);
-  Expect(RegQueryValueExA(key, "v", &type, nullptr, data, &size), ERROR_INVALID_PARAMETER);
-  Expect(RegQueryValueExA(key, "absent", nullptr, nullptr, data, &size), ERROR_FILE_NOT_FOUND);
-  Expect(RegQueryValueExA(key, nullptr, nullptr, nullptr, nullptr, &size), ERROR_FILE_NOT_FOUND);
-  Expect(Set(key, nullptr, "default", 8), ERROR_SUCCESS);
-  Expect(RegQueryValueExA(key, "", nullptr, nullptr, nullptr, &size), ERROR_SUCCESS);
-  Expect(size, 8);
+  DWORD type = 0;
+  DWORD size = 0;
+  ExpectEach({RegQueryValueExA(key, "v", nullptr, &type, nullptr, nullptr),
+              RegQueryValueExA(key, "v", nullptr, nullptr, nullptr, &size)},
+             {ERROR_SUCCESS});
+  Expect(size, 4);
+  ExpectEach({RegQueryValueExA(key, "v", nullptr, nullptr, data, nullptr),
+              RegQueryValueExA(key, "v", &type, nullptr, data, &size)},
+             {ERROR_INVALID_PARAMETER});
 }
 
 CONTRACT(Registry, DefaultValueGetsANulWhereThereIsRoom) {
   const CaseKey key;
-  RegCloseKey(Make(key, "none"));
-  RegCloseKey(Make(key, "given"));
+  const CaseKey none("\\none");
   const CaseKey given("\\given");
   Expect(Set(given, nullptr, "page!", 4), ERROR_SUCCESS);
-  const struct {
-    const char* subkey;
-    LONG room;
-    LSTATUS status;
-    LONG size;
-    const char* text;
-  } rows[] = {
-      {"given", 8, ERROR_SUCCESS, 4, "page"},   {"given", 5, ERROR_SUCCESS, 4, "page"},
-      {"given", 4, ERROR_SUCCESS, 4, "pagere"}, {"given", 3, ERROR_MORE_DATA, 4, nullptr},
-      {"none", 8, ERROR_SUCCESS, 1, ""},        {"absent", 8, ERROR_FILE_NOT_FOUND, 8, nullptr},
-  };
-  for (const auto& row : rows) {
-    const std::string name = row.subkey + std::to_string(row.room);
+  // Status, size and what is in the buffer.
+  const auto told = [&](const char* subkey, LONG room) {
     char data[8] = "before";
-    LONG size = row.room;
-    Expect(RegQueryValueA(key, row.subkey, data, &size), row.status, name);
-    if (row.status != ERROR_FILE_NOT_FOUND) Expect(size, row.size, name);
-    if (row.text != nullptr) Expect(data, row.text, name);
-  }
+    LONG size = room;
+    const LSTATUS status = RegQueryValueA(key, subkey, data, &size);
+    if (status != ERROR_SUCCESS) data[0] = '\0';
+    return std::to_string(status) + ' ' + std::to_string(size) + ' ' + data;
+  };
+  ExpectEach({told("given", 8), told("given", 5)}, {"0 4 page"});
+  ExpectEach({told("given", 4), told("given", 3), told("none", 8)},
+             {"0 4 pagere", "234 4 ", "0 1 "});
+  Expect(told("absent", 8).substr(0, 2), "2 ");
   LONG size = 0;
   Expect(RegQueryValueA(given, nullptr, nullptr, &size), ERROR_SUCCESS);
   Expect(size, 4);
 }
 
 CONTRACT(Registry, RightsAreThoseOfTheHandle) {
-  RegCloseKey(Make(kMachine, Below("\\B")));
+  const CaseKey below("\\B");
   const CaseKey reader("", KEY_READ);
   const CaseKey writer("", KEY_WRITE);
-  char name[8];
-  DWORD size = 0;
-  Expect(Set(reader, "v", "x", 2), ERROR_ACCESS_DENIED);
-  Expect(Set(writer, "v", "x", 2), ERROR_SUCCESS);
-  Expect(RegQueryValueExA(writer, "v", nullptr, nullptr, nullptr, &size), ERROR_ACCESS_DENIED);
-  Expect(RegEnumKeyA(writer, 0, name, sizeof(name)), ERROR_ACCESS_DENIED);
-  Expect(RegDeleteValueA(reader, "v"), ERROR_ACCESS_DENIED);
-  Expect(RegQueryValueExA(reader, "v", nullptr, nullptr, nullptr, &size), ERROR_SUCCESS);
-  Expect(RegDeleteValueA(writer, "V"), ERROR_SUCCESS);
-  Expect(RegDeleteValueA(writer, "v"), ERROR_FILE_NOT_FOUND);
+  ExpectEach({Set(writer, "v", "x", 2), Query(writer, "v"), Enumerate(writer, 0)}, {0, "5", "5"});
+  ExpectEach({Set(reader, "v", "y", 2), RegDeleteValueA(reader, "v")}, {ERROR_ACCESS_DENIED});
+  Expect(Query(reader, "v"), "0 type 1 size 2 x.");
+  ExpectEach({RegDeleteValueA(writer, "V"), RegDeleteValueA(writer, "v")},
+             {ERROR_SUCCESS, ERROR_FILE_NOT_FOUND});
   Expect(RegDeleteKeyA(reader, "B"), ERROR_SUCCESS, "goes by the rights of the key below");
 }
 
 CONTRACT(Registry, ListedNamesNeedRoomForTheirNul) {
   const CaseKey key;
-  for (const char* name : {"Aa", "Mmmm"}) RegCloseKey(Make(key, name));
-  char name[8] = "";
-  Expect(RegEnumKeyA(key, 0, name, 3), ERROR_SUCCESS);
-  Expect(name, "Aa");
-  Expect(RegEnumKeyA(key, 0, name, 2), ERROR_MORE_DATA);
-  Expect(RegEnumKeyA(key, 1, name, 4), ERROR_MORE_DATA);
-  Expect(RegEnumKeyA(key, 1, name, 5), ERROR_SUCCESS);
-  Expect(name, "Mmmm");
-  Expect(RegEnumKeyA(key, 2, name, sizeof(name)), ERROR_NO_MORE_ITEMS);
-  Expect(RegDeleteKeyA(key, "Aa"), ERROR_SUCCESS);
-  Expect(RegEnumKeyA(key, 0, name, sizeof(name)), ERROR_SUCCESS);
-  Expect(name, "Mmmm");
+  const CaseKey first("\\Aa");
+  const CaseKey second("\\Mmmm");
+  ExpectEach({Enumerate(key, 0, 3), Enumerate(key, 0, 2), Enumerate(key, 1, 4),
+              Enumerate(key, 1, 5), Enumerate(key, 2), RegDeleteKeyA(key, "Aa"), Enumerate(key, 0)},
+             {"Aa", "234", "234", "Mmmm", "259", ERROR_SUCCESS, "Mmmm"});
 }
 
 CONTRACT(Registry, KeyWithSubkeysStays) {
-  RegCloseKey(Make(kMachine, Below("\\A\\B\\C")));
+  const CaseKey key;
   const CaseKey inner("\\A\\B\\C");
-  Expect(RegDeleteKeyA(kMachine, nullptr), ERROR_INVALID_PARAMETER);
-  Expect(RegDeleteKeyA(kMachine, Below("\\A").c_str()), ERROR_ACCESS_DENIED);
-  Expect(Open(inner, ""), ERROR_SUCCESS);
-  Expect(RegDeleteKeyA(kMachine, Below("\\A\\B\\c").c_str()), ERROR_SUCCESS);
-  Expect(RegDeleteKeyA(kMachine, Below("\\A\\B\\c").c_str()), ERROR_FILE_NOT_FOUND);
-
+  ExpectEach({RegDeleteKeyA(kMachine, nullptr), RegDeleteKeyA(key, "A"), OpenKey(inner, ""),
+              RegDeleteKeyA(key, "A\\B\\c"), RegDeleteKeyA(key, "A\\B\\c")},
+             {ERROR_INVALID_PARAMETER, ERROR_ACCESS_DENIED, 0, 0, ERROR_FILE_NOT_FOUND});
   // The handle outlives its key, and a key made anew is another one.
-  RegCloseKey(Make(kMachine, Below("\\A\\B\\C")));
+  const CaseKey anew("\\A\\B\\C");
   Expect(Set(inner, "v", "x", 2), kErrorKeyDeleted);
-  DWORD size = 0;
-  Expect(RegQueryValueExA(inner, "v", nullptr, nullptr, nullptr, &size), kErrorKeyDeleted);
+  Expect(Query(inner, "v"), std::to_string(kErrorKeyDeleted));
 }
 
 CONTRACT(Registry, ClosedHandlesAreRefused) {
-  const HKEY key = Make(kMachine, contract::kKey);
-  Expect(RegCloseKey(key), ERROR_SUCCESS);
-  Expect(RegCloseKey(key), ERROR_INVALID_HANDLE);
-  Expect(Set(key, "v", "x", 2), ERROR_INVALID_HANDLE);
-  Expect(Open(nullptr, "SOFTWARE"), ERROR_INVALID_HANDLE);
-  Expect(RegCloseKey(nullptr), ERROR_INVALID_HANDLE);
-  Expect(RegCloseKey(kMachine), ERROR_SUCCESS);
+  HKEY key = nullptr;
+  ExpectEach({RegOpenKeyExA(kMachine, "SOFTWARE", 0, KEY_READ, &key), RegCloseKey(key),
+              RegCloseKey(kMachine)},
+             {ERROR_SUCCESS});
+  ExpectEach(
+      {RegCloseKey(key), RegCloseKey(nullptr), Set(key, "v", "x", 2), OpenKey(nullptr, "SOFTWARE")},
+      {ERROR_INVALID_HANDLE});
 }
+
+}  // namespace contract

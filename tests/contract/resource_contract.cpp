@@ -6,13 +6,10 @@
 #include "platform/procedure.h"
 #include "tests/contract/contract.h"
 
-using contract::Expect;
-
+namespace contract {
 namespace {
 
 constexpr UINT kText = 7;  // "Moriv"
-constexpr COLORREF kInvalidColor = 0xFFFFFFFF;
-const char* const kProgram = "C:\\contract\\seam_contract.exe";
 
 struct VersionLibrary {
   HMODULE module = LoadLibraryA("version.dll");
@@ -27,94 +24,67 @@ struct VersionLibrary {
 }  // namespace
 
 CONTRACT(Strings, AreCutToTheBuffer) {
-  const HINSTANCE module = GetModuleHandleA(nullptr);
-  const struct {
-    UINT id;
-    int size;
-    int length;
-    const char* text;
-  } rows[] = {
-      {kText, 16, 5, "Moriv"},
-      {kText, 6, 5, "Moriv"},
-      {kText, 5, 4, "Mori"},
-      {kText, 2, 1, "M"},
-      {kText, 1, 0, ""},
-      {kText, 0, -1, "before"},
-      {kText + 1, 16, 0, ""},
-      {999, 16, 0, ""},
-      {999, 1, 0, ""},
-      {65535, 16, 0, ""},
-      {0x10000 + kText, 16, 5, "Moriv"},
-  };
-  for (const auto& row : rows) {
-    const std::string name = std::to_string(row.id) + " in " + std::to_string(row.size);
+  const auto load = [](UINT id, int size) {
     char buffer[16] = "before";
-    Expect(LoadStringA(module, row.id, buffer, row.size), row.length, name);
-    Expect(buffer, row.text, name);
-  }
+    const int length = LoadStringA(GetModuleHandleA(nullptr), id, buffer, size);
+    return std::to_string(length) + ' ' + buffer;
+  };
+  ExpectEach({load(kText, 16), load(kText, 6), load(0x10000 + kText, 16)}, {"5 Moriv"});
+  ExpectEach({load(kText, 5), load(kText, 2), load(kText, 1), load(kText, 0)},
+             {"4 Mori", "1 M", "0 ", "-1 before"});
+  ExpectEach({load(kText + 1, 16), load(999, 16), load(999, 1), load(65535, 16)}, {"0 "});
 }
 
 CONTRACT(Versions, SizeTellsWhetherThereIsAny) {
   const VersionLibrary version;
-  contract::WriteText("C:\\contract\\text file", "MZ");
+  WriteText("C:\\contract\\text file", "MZ");
   DWORD handle = 99;
-  Expect(version.getSize(kProgram, &handle) != 0, true);
-  Expect(handle, 0);
+  char data[64] = {};
+  ExpectEach({version.getSize(kProgram, &handle) != 0, handle}, {TRUE, 0});
   for (const char* name : {"C:\\contract\\text file", "C:\\contract\\absent", "C:\\contract", ""}) {
-    Expect(version.getSize(name, &handle), 0, name);
-    char data[64] = {};
-    Expect(version.getInfo(name, 0, sizeof(data), data), FALSE, name);
+    ExpectEach({version.getSize(name, &handle), version.getInfo(name, 0, sizeof(data), data)}, {0},
+               name);
   }
 }
 
 CONTRACT(Versions, PathsNameTheirValues) {
   const VersionLibrary version;
-  const DWORD size = version.getSize(kProgram, nullptr);
-  std::vector<char> data(size);
-  Expect(version.getInfo(kProgram, 0, size, data.data()), TRUE);
-  const struct {
-    const char* path;
-    BOOL found;
-    UINT length;
-  } rows[] = {
-      {"\\", TRUE, 52},
-      {"\\VarFileInfo\\Translation", TRUE, 4},
-      {"\\varFILEinfo\\TRANSLATION", TRUE, 4},
-      {"\\StringFileInfo\\040c04b0\\FileVersion", TRUE, 6},
-      {"\\stringfileinfo\\040C04B0\\fileversion", TRUE, 6},
-      {"StringFileInfo\\040c04b0\\FileVersion", TRUE, 6},
-      {"\\StringFileInfo\\040c04b0\\FileVersion\\", TRUE, 6},
-      {"\\StringFileInfo\\040c04b0\\FileVersion\\x", FALSE, 0},
-      {"\\StringFileInfo\\040c04b0\\Absent", FALSE, 0},
-      {"\\StringFileInfo\\040c04b\\FileVersion", FALSE, 0},
-      {"\\StringFileInfo\\040904b0\\FileVersion", FALSE, 0},
-      {"\\Absent", FALSE, 0},
-  };
-  for (const auto& row : rows) {
+  std::vector<char> data(version.getSize(kProgram, nullptr));
+  Expect(version.getInfo(kProgram, 0, static_cast<DWORD>(data.size()), data.data()), TRUE);
+  // Length and text of the value, or "none".
+  const auto told = [&](const char* path) {
     void* value = nullptr;
     UINT length = 0;
-    const BOOL found = version.query(data.data(), row.path, &value, &length);
-    Expect(found, row.found, row.path);
-    if (found == FALSE) continue;
-    Expect(length, row.length, row.path);
-    if (row.length == 6) Expect(static_cast<const char*>(value), "4.1.7", row.path);
-    if (row.length == 4) Expect(std::memcmp(value, "\x0C\x04\xB0\x04", 4), 0, row.path);
-  }
+    if (version.query(data.data(), path, &value, &length) == FALSE) return std::string("none");
+    // A text's length counts its NUL.
+    return std::to_string(length) + ' ' + std::string(static_cast<char*>(value), length).c_str();
+  };
+  ExpectEach({told("\\StringFileInfo\\040c04b0\\FileVersion"),
+              told("\\stringfileinfo\\040C04B0\\fileversion"),
+              told("StringFileInfo\\040c04b0\\FileVersion"),
+              told("\\StringFileInfo\\040c04b0\\FileVersion\\")},
+             {"6 4.1.7"});
+  ExpectEach({told("\\VarFileInfo\\Translation"), told("\\varFILEinfo\\TRANSLATION")},
+             {"4 \x0C\x04\xB0\x04"});
+  Expect(told("\\").substr(0, 3), "52 ");
+  ExpectEach(
+      {told("\\StringFileInfo\\040c04b0\\FileVersion\\x"),
+       told("\\StringFileInfo\\040c04b0\\Absent"), told("\\StringFileInfo\\040c04b\\FileVersion"),
+       told("\\StringFileInfo\\040904b0\\FileVersion"), told("\\Absent")},
+      {"none"});
 }
 
 CONTRACT(Graphics, BitmapTellsItsSize) {
   const HINSTANCE module = GetModuleHandleA(nullptr);
   const HBITMAP flag = LoadBitmapA(module, MAKEINTRESOURCEA(120));
   BITMAP size = {};
-  Expect(GetObjectA(flag, sizeof(size) - 1, &size), 0);
   Expect(GetObjectA(flag, sizeof(size), &size), sizeof(size));
-  Expect(size.bmWidth, 26);
-  Expect(size.bmHeight, 15);
-  Expect(GetObjectA(nullptr, sizeof(size), &size), 0);
-  Expect(LoadBitmapA(module, MAKEINTRESOURCEA(999)), nullptr);
+  ExpectEach({size.bmWidth, size.bmHeight}, {26, 15});
+  ExpectEach({GetObjectA(flag, sizeof(size) - 1, &size), GetObjectA(nullptr, sizeof(size), &size),
+              LoadBitmapA(module, MAKEINTRESOURCEA(999))},
+             {0});
   Expect(DeleteObject(flag), TRUE);
-  Expect(DeleteObject(flag), FALSE);
-  Expect(GetObjectA(flag, sizeof(size), &size), 0);
+  ExpectEach({DeleteObject(flag), GetObjectA(flag, sizeof(size), &size)}, {0});
 }
 
 CONTRACT(Graphics, ContextHoldsOneObjectOfAKind) {
@@ -125,31 +95,24 @@ CONTRACT(Graphics, ContextHoldsOneObjectOfAKind) {
   const HFONT font = CreateFontA(14, 0, 0, 0, 400, 1, 1, 0, 0, 0, 0, 0, 0, "");
   const HGDIOBJ stock = SelectObject(dc, first);
   Expect(stock != nullptr, true);
-  Expect(SelectObject(dc, second), first);
-  Expect(SelectObject(dc, font) != nullptr, true);
-  Expect(DeleteObject(first), TRUE);
-  Expect(SelectObject(dc, first), nullptr);
-  Expect(SelectObject(dc, stock), second);
-  Expect(SelectObject(dc, nullptr), nullptr);
-  Expect(DeleteObject(second), TRUE);
-
-  Expect(SetTextColor(dc, 0xFF0000), 0);
-  Expect(SetTextColor(dc, 0), 0xFF0000);
-  Expect(SetBkColor(dc, 0x6400), 0xFFFFFF);
+  ExpectEach({SelectObject(dc, second), SelectObject(dc, font) != nullptr, DeleteObject(first),
+              SelectObject(dc, first), SelectObject(dc, stock), SelectObject(dc, nullptr),
+              DeleteObject(second)},
+             {first, TRUE, TRUE, nullptr, second, nullptr, TRUE});
+  ExpectEach({SetTextColor(dc, 0xFF0000), SetTextColor(dc, 0), SetBkColor(dc, 0x6400)},
+             {0, 0xFF0000, 0xFFFFFF});
   RECT area = {0, 0, 50, 20};
-  Expect(PatBlt(dc, 0, 0, 1, 1, PATCOPY), TRUE);
-  Expect(BitBlt(dc, 0, 0, 1, 1, screen, 0, 0, SRCCOPY), TRUE);
-  Expect(DrawTextA(dc, "text", 4, &area, DT_VCENTER | DT_SINGLELINE) > 0, true);
-  Expect(DrawFocusRect(dc, &area), TRUE);
-
-  Expect(ReleaseDC(nullptr, screen), 1);
-  Expect(DeleteDC(dc), TRUE);
-  Expect(DeleteDC(dc), FALSE);
-  Expect(DeleteObject(font), TRUE, "no longer selected");
-  Expect(SelectObject(dc, stock), nullptr);
-  Expect(SetTextColor(dc, 0), kInvalidColor);
-  Expect(SetBkColor(dc, 0), kInvalidColor);
-  Expect(PatBlt(dc, 0, 0, 1, 1, PATCOPY), FALSE);
-  Expect(DeleteObject(nullptr), FALSE);
+  ExpectEach(
+      {PatBlt(dc, 0, 0, 1, 1, PATCOPY), BitBlt(dc, 0, 0, 1, 1, screen, 0, 0, SRCCOPY),
+       DrawTextA(dc, "text", 4, &area, DT_VCENTER | DT_SINGLELINE) > 0, DrawFocusRect(dc, &area)},
+      {TRUE});
+  ExpectEach({ReleaseDC(nullptr, screen), DeleteDC(dc), DeleteObject(font)}, {TRUE});
+  ExpectEach({DeleteDC(dc), SelectObject(dc, stock), PatBlt(dc, 0, 0, 1, 1, PATCOPY),
+              BitBlt(dc, 0, 0, 1, 1, screen, 0, 0, SRCCOPY),
+              DrawTextA(dc, "text", 4, &area, DT_SINGLELINE), DeleteObject(nullptr)},
+             {0}, "of a context that is gone");
+  ExpectEach({SetTextColor(dc, 0), SetBkColor(dc, 0)}, {0xFFFFFFFF});
   Expect(GetSysColor(COLOR_WINDOW) != GetSysColor(COLOR_HIGHLIGHT), true);
 }
+
+}  // namespace contract

@@ -1,7 +1,8 @@
 #!/usr/bin/python3
 """Runs the contract of the system, seam_contract, in one world: on a fresh stand-in machine, or in the
-Wine prefix that the scenarios have. Prints what it prints. Exit status 0 when every case holds, 1 when
-one doesn't, 77 when the host can't have the world or MORIV_WINE=none leaves it out."""
+Wine prefix that the scenarios have. Prints what it prints. Exit status 0 when every case holds and every
+function of the seam has one, 1 otherwise, 77 when the host can't have the world or MORIV_WINE=none
+leaves it out."""
 
 import argparse
 import fcntl
@@ -17,6 +18,7 @@ ROOT = HERE.parent.parent
 TOOL = ROOT / 'tools' / 'wine'
 LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
 TIME_LIMIT = 240  # seconds
+WITHOUT_CASE = {'WinMain'}  # the program's own, which the system calls
 
 
 def main():
@@ -24,9 +26,26 @@ def main():
     parser.add_argument('world', choices=['stand-in', 'wine64', 'wine32'])
     parser.add_argument('--native', type=Path, default=ROOT / 'build' / 'native')
     options = parser.parse_args()
+    missing = functions_without_case()
+    if missing:
+        print('no case calls ' + ', '.join(missing))
+        return 1
     if options.world == 'stand-in':
         return run_native(options.native)
     return run_under_wine(options.world[len('wine'):])
+
+
+def functions_without_case():
+    seam = without_comments(ROOT / 'src' / 'platform' / 'win32.h')
+    functions = re.findall(r'(\w+)\(', seam[seam.index('extern "C" {'):])
+    cases = '\n'.join(without_comments(source) for source in HERE.glob('*_contract.cpp'))
+    # Called, looked up by name, or called through a list of addresses.
+    called = set(re.findall(r'\w+(?=\()|(?<=")\w+(?=")|(?<=&)\w+(?=[,}])', cases))
+    return [name for name in functions if name not in called | WITHOUT_CASE]
+
+
+def without_comments(source):
+    return re.sub(r'//.*', '', source.read_text())
 
 
 def run_native(build):

@@ -8,6 +8,7 @@ namespace {
 Handler current;
 
 INT_PTR CALLBACK CallHandler(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
+  if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
   return current(dialog, message, wParam, lParam);
 }
 
@@ -22,12 +23,9 @@ INT_PTR RunDialog(Handler handler) {
 
 void RunStanding(const std::function<void(HWND dialog)>& check) {
   const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
-    if (message == WM_INITDIALOG) PostMessageA(dialog, kStep, 0, 0);
-    if (message == kStep) {
-      check(dialog);
-      EndDialog(dialog, 5);
-    }
-    return FALSE;
+    if (message != kStep) return FALSE;
+    check(dialog);
+    return EndDialog(dialog, 5);
   });
   Expect(result, 5);
 }

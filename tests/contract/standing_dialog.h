@@ -8,7 +8,7 @@
 
 namespace contract {
 
-// Messages that cases post.
+// Messages that are posted: the first by the dialog itself, when it is made.
 inline constexpr UINT kStep = 0x8001;
 inline constexpr UINT kNextStep = 0x8002;
 inline constexpr UINT kLastStep = 0x8003;
@@ -17,6 +17,10 @@ inline constexpr LPARAM kData = 77;  // what WM_INITDIALOG brings
 
 inline bool IsStep(UINT message) {
   return message == kStep || message == kNextStep || message == kLastStep;
+}
+
+inline uint32_t StyleOf(HWND window) {
+  return static_cast<uint32_t>(GetWindowLongA(window, GWL_STYLE));
 }
 
 using Handler = std::function<INT_PTR(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam)>;
