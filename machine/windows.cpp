@@ -207,8 +207,7 @@ void DispatchToWindow(const MSG& message) {
   const Window* const window = FindWindowByHandle(message.hwnd);
   if (window == nullptr) return;
   if (window->kind == WindowKind::kDialog) {
-    const bool isHandled = SendToDialog(message.message, message.wParam, message.lParam) != FALSE;
-    if (!isHandled) HandleForDialog(message.message, message.wParam);
+    SendToDialog(message.message, message.wParam, message.lParam);
   } else if (message.message == kClickMessage) {
     Click(message.hwnd);
   }

@@ -64,8 +64,10 @@ Window* FindWindowByHandle(HWND handle);
 
 // Calls the dialog's procedure.
 INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam);
-// What the system does with a message that the procedure has not handled, and its answer: it tells
-// and sets the default button. 0 for all other messages.
+// What the system does with a message sent that the procedure has not handled, and its answer: it
+// tells and sets the default button. 0 for all other messages. Windows does the same with one that
+// was posted, also with a private message of that number; here a program's posted messages are its
+// own.
 LRESULT HandleForDialog(UINT message, WPARAM wParam);
 
 // ---- Messages. First in, first out.

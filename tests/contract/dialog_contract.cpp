@@ -143,9 +143,7 @@ CONTRACT(DefaultButton, IsThatOfTheIdAndElseOfTheType) {
     Expect(told(dialog), "01 1 21323");
     Expect(SendMessageA(dialog, kSetDefault, 11, 0), TRUE);
     Expect(told(dialog), "10 11 21323");
-    PostMessageA(dialog, kSetDefault, 0, 0);
-    MSG posted = {};
-    while (PeekMessageA(&posted, nullptr, 0, 0, PM_REMOVE) != FALSE) DispatchMessageA(&posted);
+    Expect(SendMessageA(dialog, kSetDefault, 0, 0), TRUE);
     Expect(told(dialog), "00 0 0");
     for (const HWND button : {second, first}) {
       SendMessageA(button, BM_SETSTYLE, BS_DEFPUSHBUTTON, TRUE);
