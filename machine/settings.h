@@ -13,8 +13,8 @@
 namespace machine {
 
 // One line of [faults]. `fail` makes calls fail, `short` makes them move fewer bytes than they were
-// asked to; `stop` ends the process at the call. Both of the last two (tests alone ask for that): it
-// ends when part of the bytes went through.
+// asked to; `stop` ends the process at the call. Both of the last two (tests alone ask for that):
+// it ends when part of the bytes went through.
 struct Fault {
   std::string function;     // a function of the seam, by its Win32 name
   int call = 1;             // counted from 1
