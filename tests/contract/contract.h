@@ -35,9 +35,11 @@ struct Shown {
   template <typename Value>
   Shown(const Value& value) {
     if constexpr (std::is_null_pointer_v<Value>) {
-      text = "0";
+      text += '0';
     } else if constexpr (std::convertible_to<Value, std::string>) {
-      text = '"' + std::string(value) + '"';
+      text += '"';
+      text += std::string(value);
+      text += '"';
     } else if constexpr (std::is_pointer_v<Value>) {
       text = std::to_string(reinterpret_cast<intptr_t>(value));
     } else {

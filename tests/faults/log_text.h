@@ -3,6 +3,7 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 struct LogLine {
@@ -11,4 +12,4 @@ struct LogLine {
 };
 
 // The events of a log of one block; nullopt when a byte of it is out of form.
-std::optional<std::vector<LogLine>> ReadLog(const std::string& log);
+std::optional<std::vector<LogLine>> ReadLog(std::string_view log);
