@@ -1,15 +1,40 @@
-// Versions of files, and their comparison. What a version text means is held against a second
-// reading of the rules in tests/fuzz/version_fuzz.cpp.
+// Versions of files, and their comparison.
 #include "engine/file_version.h"
 
 #include <array>
+#include <utility>
 
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
 
 namespace {
 
-FileRecord Record(const char* name, const std::array<int16_t, 3>& version) {
+using Version = std::array<int16_t, 3>;
+
+TEST(VersionText, EverySeparatorClosesANumber) {
+  const std::pair<const char*, Version> rows[] = {
+      {"4.1.7.0.3", {4, 1, 0}},
+      {"4,1,7,2", {4, 1, 7}},
+      {"3, 44, 6, 2", {3, 0, 0}},
+      {"4.1", {4, 0, 1}},
+      {"4", {0, 0, 4}},
+      {"", {-1, -1, -1}},
+      {"v4-1-7b", {0, 1, 7}},
+      {"\t4.+1.-7", {4, 1, 0}},
+      {"65535.2.3", {2, 0, 3}},  // the first number stays open
+      {"40000.1.7", {-25536, 1, 7}},
+      {"123456789012345678.1.2", {static_cast<int16_t>(123456789012345 & 0xFFFF), 1, 2}}};
+  for (const auto& [text, version] : rows) {
+    Version fields = {};
+    EXPECT_EQ(ParseVersionText(text, fields.data()), *text != '\0' ? StatusOk : StatusNoVersion);
+    EXPECT_EQ(fields, version) << text;
+  }
+  Version fields = {};
+  EXPECT_EQ(ParseVersionText(nullptr, fields.data()), StatusBadArgument);
+  EXPECT_EQ(ParseVersionText("1", nullptr), StatusBadArgument);
+}
+
+FileRecord Record(const char* name, const Version& version) {
   FileRecord record = {};
   (void)CopyText(record.fileName, name);
   record.versionFirst = version[0];
@@ -21,7 +46,7 @@ FileRecord Record(const char* name, const std::array<int16_t, 3>& version) {
 TEST(RecordComparisons, TheFirstDifferenceDecides) {
   const struct {
     const char* name;
-    std::array<int16_t, 3> version;
+    Version version;
     RecordComparison comparison;
   } rows[] = {
       {"a", {4, 1, 7}, ComparisonEqual},         {"a", {3, 9, 9}, ComparisonFirstGreater},

@@ -3,13 +3,51 @@
 #include <algorithm>
 #include <string_view>
 
-#include "log/event_log.h"
+#include "core/status.h"
 #include "tests/faults/log_text.h"
-#include "tests/support/silent_exit_codes.h"
 
 namespace {
 
 using Complaints = std::vector<std::string>;
+
+struct ExitCodeRow {
+  StatusCode code;
+  unsigned works;                   // Work that can give it
+  std::vector<const char*> events;  // one of these tells the reason
+};
+
+const ExitCodeRow kExitCodes[] = {
+    {0, kHelp, {}},
+    {StatusOk, kInstall | kRemoval, {}},
+    {StatusRemovalProgramFailed, kInstall, {"Error installing Uninstall file"}},
+    {StatusNotRegistered, kInstall, {"Couldn't register Moriv"}},
+    {StatusBadPackage,
+     kInstall | kRemoval,
+     {"Cannot initialize Data File", "Error opening Data File", "Error preparing",
+      "Invalide or abscent"}},
+    {StatusNoMemory,
+     kInstall | kRemoval,
+     {"Cannot allocate memory", "Error while constructing", "Cannot create destination file"}},
+    {StatusSeekFailed, kInstall | kRemoval, {"Error preparing"}},
+    {StatusBadRecord, kInstall | kRemoval, {"Cannot read next install file"}},
+    {StatusReadFailed,
+     kInstall | kRemoval,
+     {"Error reading Data File", "Cannot create destination file"}},
+    {StatusNoSystemDir, kInstall | kRemoval, {"Error while constructing"}},
+    {StatusDeleteFailed, kInstall, {"Error deleting file"}},
+    {StatusCreateDirFailed, kInstall, {"Cannot create the file path"}},
+    {StatusCreateFileFailed, kInstall, {"Cannot create destination file"}},
+    {StatusExpandFailed, kInstall, {"Cannot create destination file"}},
+    {StatusCopyFailed, kInstall, {"Error copying"}},
+    {StatusServicesRemain, kRemoval, {"Cannot unsitall"}},
+};
+
+const ExitCodeRow* FindRow(const FaultyRun& run) {
+  const auto row = std::ranges::find_if(kExitCodes, [&](const ExitCodeRow& candidate) {
+    return candidate.code == run.report.code && (candidate.works & run.kind.work) != 0;
+  });
+  return row != std::end(kExitCodes) ? row : nullptr;
+}
 
 bool IsDialog(const RunKind& kind) {
   return !kind.workButtons.empty();
@@ -21,13 +59,12 @@ bool IsOneOf(std::string_view name, std::initializer_list<std::string_view> name
 
 // ---- Exit code and log
 
-bool IsExitCode(const RunKind& kind, StatusCode code) {
-  if (IsDialog(kind)) {
-    return code == StatusOk || code == StatusCancelled || code == StatusDialogAborted;
-  }
-  if (kind.work == kHelp) return code == 0;
-  if (kind.work == kRemoval && code > StatusOk) return false;
-  return IsSilentExitCode(code);
+void JudgeCode(const FaultyRun& run, Complaints* complaints) {
+  const StatusCode code = run.report.code;
+  const bool isKnown = IsDialog(run.kind) ? code == StatusOk || code == StatusCancelled ||
+                                                code == StatusDialogAborted
+                                          : FindRow(run) != nullptr;
+  if (!isKnown) complaints->emplace_back("no exit code of this run");
 }
 
 // A log that has no name, no memory or no directory or can't be made in either way is left out, and
@@ -38,13 +75,14 @@ bool CanLackLog(const FaultyRun& run) {
                  {kAllocation, "LoadStringA", "GetWindowsDirectoryA", "_creat", "DialogBoxParamA"});
 }
 
-bool TellsReason(StatusCode code, const LogLine& line) {
-  for (uint32_t event = 0; event <= EventSpaceNeeded; ++event) {
-    if (IsReasonFor(code, event) && line.text.starts_with(EventText(event))) {
-      return line.severity != 'i';
-    }
-  }
-  return false;
+bool TellsReason(const FaultyRun& run, const std::vector<LogLine>& lines) {
+  const ExitCodeRow* const row = FindRow(run);
+  if (row == nullptr || row->events.empty()) return true;
+  return std::ranges::any_of(lines, [row](const LogLine& line) {
+    return line.severity != 'i' && std::ranges::any_of(row->events, [&](const char* event) {
+             return line.text.starts_with(event);
+           });
+  });
 }
 
 bool HasRightEvents(const FaultyRun& run, const std::vector<LogLine>& lines) {
@@ -60,10 +98,7 @@ bool HasRightEvents(const FaultyRun& run, const std::vector<LogLine>& lines) {
   // A silent run gives up at its fatal event.
   const bool endsFatally = !lines.empty() && lines.back().severity == 'f';
   if (fatal != (EndedWell(run.report.code) ? 0 : 1) || (fatal == 1 && !endsFatally)) return false;
-  const StatusCode code = run.report.code;
-  return code == StatusOk || code == 0 || std::ranges::any_of(lines, [code](const LogLine& line) {
-           return TellsReason(code, line);
-         });
+  return TellsReason(run, lines);
 }
 
 void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
@@ -167,7 +202,7 @@ std::vector<std::string> JudgeRun(const FaultyRun& run) {
     const int leaked = run.report.leakedBlocks;
     if (!open.empty()) complaints.push_back("open: " + open);
     if (leaked != 0) complaints.push_back(std::to_string(leaked) + " blocks leaked");
-    if (!IsExitCode(run.kind, run.report.code)) complaints.emplace_back("no exit code of this run");
+    JudgeCode(run, &complaints);
     for (const char* path : {kLogPath, kReportPath}) JudgeLog(run, path, &complaints);
   }
   JudgeMachine(run, &complaints);

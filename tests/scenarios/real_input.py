@@ -16,6 +16,7 @@ FILES = 48
 BYTES = 40_000_000  # at least
 
 INSTALL_DIR = r'C:\Program Files\Moriv'
+LIBRARY = INSTALL_DIR + r'\library'
 
 
 def missing():
@@ -46,30 +47,49 @@ def _strip_libraries(folder):
     return sorted(file.name for file in chosen)
 
 
+def _targets(index):
+    """A destination and the directories that it stands for: most files go into the installation
+    directory, some below it, some to both."""
+    if index % 7 == 0:
+        return r'%INSTALL_DIR%;%INSTALL_DIR%\library', [INSTALL_DIR, LIBRARY]
+    if index % 4 == 0:
+        return r'%INSTALL_DIR%\library', [LIBRARY]
+    return '%INSTALL_DIR%', [INSTALL_DIR]
+
+
 def _text(names):
     """The scenario, line by line, as it would stand in a file."""
-    targets = [f'{INSTALL_DIR}\\{name}' for name in names]
-    installed = [*(f'File copied correctly :  {target}' for target in targets),
-                 'Moriv registered in the system registry ',
+    image = ['given image C:\\Setup.exe']
+    copied, deleted, new, gone = [], [], [], []
+    for index, name in enumerate(names):
+        destination, directories = _targets(index)
+        image.append(f'  {name} = real {name} -> {destination}')
+        for directory in directories:
+            copied.append(f'File copied correctly :  {directory}\\{name}')
+            deleted.append(f'Deleteting file :  {directory}\\{name}')
+            if directory != INSTALL_DIR:
+                deleted.append(f'Removing Directory :  {directory}')
+            new.append(f'  + {directory}\\{name} = original {name}')
+            gone.append(f'  - {directory}\\{name}')
+    installed = [*copied, 'Moriv registered in the system registry ',
                  r'Uninstall file is installed correctly :  C:\windows\MorivRmv.exe']
     removed = ['Found a registered version of Moriv ', 'Unistalling Moriv from the system ',
-               *(f'Deleteting file :  {target}' for target in targets),
-               f'Removing Directory :  {INSTALL_DIR}',
+               *deleted, f'Removing Directory :  {INSTALL_DIR}',
                'Moriv registration removed from the registry ']
+    product = [r'  + [SOFTWARE\Zeb]', r'  + [SOFTWARE\Zeb\Moriv]',
+               r'  + "InstallDir"="C:\\Program Files\\Moriv"', '  + "Language"="FR"',
+               r'  + [SOFTWARE\Zeb\Moriv\Services]']
     command = [r'    [SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce]',
                r'  + "MorivCommand"="C:\\windows\\system32\\rundll32.exe'
                r' setupapi.dll,InstallHinfSection Uninstall 132 C:\\windows\\Moriv.INF"']
     return [
-        'given image C:\\Setup.exe', *(f'  {name} = real {name} -> %INSTALL_DIR%' for name in names),
+        *image,
         r'run C:\Setup.exe /s', 'exit 1', 'log', *_numbered(installed),
-        'files', f'  + {INSTALL_DIR}\\',
-        *(f'  + {target} = original {name}' for target, name in zip(targets, names)),
+        'files', f'  + {INSTALL_DIR}\\', f'  + {LIBRARY}\\', *new,
         r'  + C:\windows\MorivRmv.exe = removal program of C:\Setup.exe in French',
-        'registry', r'  + [SOFTWARE\Zeb]', r'  + [SOFTWARE\Zeb\Moriv]',
-        r'  + "InstallDir"="C:\\Program Files\\Moriv"', '  + "Language"="FR"',
-        r'  + [SOFTWARE\Zeb\Moriv\Services]',
+        'registry', *product,
         r'run C:\windows\MorivRmv.exe /s', 'exit 1', 'log', *_numbered(removed),
-        'files', f'  - {INSTALL_DIR}\\', *(f'  - {target}' for target in targets),
+        'files', f'  - {INSTALL_DIR}\\', f'  - {LIBRARY}\\', *gone,
         r'  + C:\windows\Moriv.INF = the INF file',
         'registry', *command,
         r'  - [SOFTWARE\Zeb\Moriv]', r'  - [SOFTWARE\Zeb\Moriv\Services]',
