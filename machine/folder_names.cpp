@@ -1,4 +1,6 @@
-// A thousand files installed into one folder would otherwise be a thousand readings of it.
+// A thousand files installed into one folder would be a thousand readings of it, each longer than
+// the one before: so a large folder is read once and watched. A small one is not, since the host
+// takes milliseconds to end a watch.
 #include "machine/folder_names.h"
 
 #include <dirent.h>
@@ -20,6 +22,8 @@ namespace {
 
 constexpr uint32_t kCame = IN_CREATE | IN_MOVED_TO;
 constexpr uint32_t kWent = IN_DELETE | IN_MOVED_FROM;
+
+constexpr size_t kLargeFolder = 100;  // names
 
 // Host spellings below the name in upper case, in the code page.
 using Names = std::map<std::string, std::set<std::string>, std::less<>>;
@@ -91,6 +95,10 @@ std::string FirstSpelling(const Names& names, const std::string& upperCase) {
 
 std::string FindSpelling(const fs::path& folder, std::string_view name) {
   const std::string upperCase = UpperCase(std::string(name));
+  if (watched.empty()) {
+    const Names names = ReadNames(folder);
+    if (names.size() < kLargeFolder) return FirstSpelling(names, upperCase);
+  }
   TakeChanges();
   if (notifier < 0) notifier = inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
   // The number is that of the folder itself: whatever its path, and the same each time.

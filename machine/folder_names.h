@@ -11,8 +11,8 @@ namespace machine {
 // the answer as the host spells it. Of several the first in byte order, so that the answer does not
 // hang on the host's order. Empty for nothing, and for a folder that can't be read.
 //
-// A folder is read once. From then on the host tells of each change in it, whoever makes it; where
-// the host can't, the folder is read every time.
+// A large folder is read once. From then on the host tells of each change in it, whoever makes it;
+// where the host can't, the folder is read every time, as small ones are.
 std::string FindSpelling(const std::filesystem::path& folder, std::string_view name);
 
 // Forgets all folders: another machine, with another code page, may come.

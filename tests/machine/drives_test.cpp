@@ -51,8 +51,7 @@ TEST(Drives, HostsFilesOfImpossibleNamesAreOutOfReach) {
     EXPECT_FALSE(Locate(path).has_value()) << path;
 }
 
-TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
-  TestMachine pc;
+void ExpectChangesAreSeen(TestMachine& pc) {
   const auto exists = [](const char* path) { return Locate(path)->exists; };
   pc.Write("drive_c/dir/One", "x");
   EXPECT_TRUE(exists("C:\\DIR\\ONE"));
@@ -72,6 +71,17 @@ TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
   pc.Write("drive_c/old/Five", "x");
   EXPECT_FALSE(exists("C:\\OLD\\ONE"));
   EXPECT_TRUE(exists("C:\\OLD\\FIVE"));
+}
+
+TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
+  TestMachine pc;
+  ExpectChangesAreSeen(pc);
+}
+
+TEST(Drives, ChangesInALargeFolderAreSeenToo) {
+  TestMachine pc;
+  for (int i = 0; i < 200; ++i) pc.Write("drive_c/dir/" + std::to_string(i), "x");
+  ExpectChangesAreSeen(pc);
 }
 
 TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
