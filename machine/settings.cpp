@@ -144,6 +144,9 @@ struct SettingRow {
   TakeValue take;
 };
 
+// A path of 259 characters fits, in any encoding.
+constexpr int kMaxLine = 2000;
+
 constexpr std::string_view kDirectoryForm = "a path like C:\\windows";
 constexpr std::string_view kBytesForm = "a number of bytes";
 
@@ -275,6 +278,8 @@ bool ReadSettings(const std::filesystem::path& file, Settings* settings, std::st
     return false;
   }
 
+  ini_max_line = kMaxLine;
+  ini_allow_multiline = false;  // an indented line is a line of its own
   SettingsParse parse;
   parse.file = stream.get();
   const int badLine = ini_parse_stream(ReadIniLine, &parse, TakeSetting, &parse);

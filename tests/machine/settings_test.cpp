@@ -91,8 +91,11 @@ TEST(Settings, MistakesNameTheirLineAndTheirKey) {
     EXPECT_TRUE(error.starts_with(std::string("machine.ini") + row.error)) << error;
   }
   Settings settings;
-  EXPECT_EQ(Parse("[system]\nwindows = C:\\" + std::string(300, 'w'), &settings),
+  EXPECT_EQ(Parse("[system]\nwindows = C:\\" + std::string(3000, 'w'), &settings),
             "machine.ini:2: line too long");
+  const std::string longest = "C:\\" + std::string(256, 'w');
+  EXPECT_EQ(Parse("[system]\n  platform = 9x\n  windows = " + longest, &settings), "");
+  EXPECT_EQ(settings.windowsDirectory, longest);
 }
 
 // The list of names must follow the header, or faults could not be set on a new function.
