@@ -121,6 +121,13 @@ RunReport* SharedReport() {
 
 }  // namespace
 
+// Asked by AddressSanitizer at its start. Of the blocks that are freed it keeps few: each run is a
+// fork, which would have to copy the tables of all that memory.
+extern "C" const char* __asan_default_options();
+extern "C" const char* __asan_default_options() {
+  return "quarantine_size_mb=1";
+}
+
 std::string Describe(const Injection& injection) {
   return injection.function + " " + std::to_string(injection.call) +
          (injection.fromThenOn ? " on" : "") + (injection.isShort ? " short" : "") +
