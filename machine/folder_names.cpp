@@ -23,7 +23,7 @@ namespace {
 constexpr uint32_t kCame = IN_CREATE | IN_MOVED_TO;
 constexpr uint32_t kWent = IN_DELETE | IN_MOVED_FROM;
 
-constexpr size_t kLargeFolder = 100;  // names
+constexpr size_t kLargeFolder = 150;  // names
 
 // Host spellings below the name in upper case, in the code page.
 using Names = std::map<std::string, std::set<std::string>, std::less<>>;
@@ -51,13 +51,27 @@ struct FolderClose {
   void operator()(DIR* folder) const { closedir(folder); }
 };
 
+template <typename Visit>
+void ForEachName(const fs::path& folder, Visit visit) {
+  const std::unique_ptr<DIR, FolderClose> open(opendir(folder.c_str()));
+  while (const dirent* const entry = open ? readdir(open.get()) : nullptr) visit(entry->d_name);
+}
+
 Names ReadNames(const fs::path& folder) {
   Names names;
-  const std::unique_ptr<DIR, FolderClose> open(opendir(folder.c_str()));
-  while (const dirent* const entry = open ? readdir(open.get()) : nullptr) {
-    Add(names, entry->d_name);
-  }
+  ForEachName(folder, [&names](const char* spelling) { Add(names, spelling); });
   return names;
+}
+
+// As FindSpelling, by reading the folder; counts its names.
+std::string Search(const fs::path& folder, std::string_view name, size_t* count) {
+  std::string found;
+  ForEachName(folder, [&](const char* spelling) {
+    ++*count;
+    if (!EqualNoCase(FromUtf8(spelling), name)) return;
+    if (found.empty() || spelling < found) found = spelling;
+  });
+  return found;
 }
 
 void TakeChange(const inotify_event& change) {
@@ -94,11 +108,12 @@ std::string FirstSpelling(const Names& names, const std::string& upperCase) {
 }  // namespace
 
 std::string FindSpelling(const fs::path& folder, std::string_view name) {
-  const std::string upperCase = UpperCase(std::string(name));
   if (watched.empty()) {
-    const Names names = ReadNames(folder);
-    if (names.size() < kLargeFolder) return FirstSpelling(names, upperCase);
+    size_t count = 0;
+    const std::string spelling = Search(folder, name, &count);
+    if (count < kLargeFolder) return spelling;
   }
+  const std::string upperCase = UpperCase(std::string(name));
   TakeChanges();
   if (notifier < 0) notifier = inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
   // The number is that of the folder itself: whatever its path, and the same each time.

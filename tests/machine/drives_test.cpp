@@ -80,7 +80,7 @@ TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
 
 TEST(Drives, ChangesInALargeFolderAreSeenToo) {
   TestMachine pc;
-  for (int i = 0; i < 200; ++i) pc.Write("drive_c/dir/" + std::to_string(i), "x");
+  for (int i = 0; i < 300; ++i) pc.Write("drive_c/dir/" + std::to_string(i), "x");
   ExpectChangesAreSeen(pc);
 }
 
