@@ -110,7 +110,7 @@ std::string FirstSpelling(const Names& names, const std::string& upperCase) {
 std::string FindSpelling(const fs::path& folder, std::string_view name) {
   if (watched.empty()) {
     size_t count = 0;
-    const std::string spelling = Search(folder, name, &count);
+    std::string spelling = Search(folder, name, &count);
     if (count < kLargeFolder) return spelling;
   }
   const std::string upperCase = UpperCase(std::string(name));
