@@ -104,7 +104,7 @@ char32_t TakeCharacter(std::string_view* utf8) {
 }
 
 char ByteOf(const CodePage& page, char32_t character) {
-  if (character < 0x80) return static_cast<char>(character);
+  if (character < 0x80) return static_cast<char>(character);  // the same in every page
   const auto found = page.bytes.find(character);
   return found != page.bytes.end() ? static_cast<char>(found->second) : '?';
 }

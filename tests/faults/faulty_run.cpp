@@ -121,11 +121,11 @@ RunReport* SharedReport() {
 
 }  // namespace
 
-// Asked by AddressSanitizer at its start. Of the blocks that are freed it keeps few: each run is a
-// fork, which would have to copy the tables of all that memory.
+// Asked by AddressSanitizer at its start. It keeps the freed blocks of a run, but not those of all
+// runs before: each run is a fork, which would have to copy the tables of all that memory.
 extern "C" const char* __asan_default_options();
 extern "C" const char* __asan_default_options() {
-  return "quarantine_size_mb=1";
+  return "quarantine_size_mb=8";
 }
 
 std::string Describe(const Injection& injection) {
