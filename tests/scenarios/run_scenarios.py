@@ -42,7 +42,7 @@ def main():
         (options.work / f'{kind}.{options.world}.count').write_text(f'{kind}: {line}\n')
 
     def play_all(world, tools, images):
-        return run_all(world, choose_scenarios(options, tools), tools, images)
+        return run_all(world, choose_scenarios(options, tools), tools, images, options.fail_fast)
 
     return in_world(options, play_all, tell)
 
@@ -85,6 +85,7 @@ def read_options():
     parser = argparse.ArgumentParser(description=__doc__)
     parser.add_argument('names', nargs='*', metavar='NAME', help='scenarios to play; without, all')
     parser.add_argument('--world', choices=['stand-in', 'wine64', 'wine32'], default='stand-in')
+    parser.add_argument('--fail-fast', action='store_true', help='end at the first failure')
     parser.add_argument('--real-input', action='store_true',
                         help='play one large scenario of real programs instead of the files')
     for build in ('native', 'win32', 'win64'):
@@ -109,7 +110,7 @@ def choose_scenarios(options, tools):
     return [parse(file.stem, file.read_text(encoding='utf-8'), file.name) for file in files]
 
 
-def run_all(world, scenarios, tools, images):
+def run_all(world, scenarios, tools, images, fail_fast):
     """Prints one line a scenario; gives the number of failures and the counts."""
     mine = [s for s in scenarios if not s.only or world.name.lower().startswith(s.only.lower())]
     failures = 0
@@ -117,6 +118,9 @@ def run_all(world, scenarios, tools, images):
         for report in pool.map(lambda s: run_one(world, s, tools, images), mine):
             print(report, flush=True)
             failures += not report.startswith('ok ')
+            if failures and fail_fast:
+                pool.shutdown(cancel_futures=True)
+                break
     for scenario in scenarios:
         if scenario not in mine:
             print(f'skipped {scenario.name}: only {scenario.only}: {scenario.reason}')
