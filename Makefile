@@ -4,7 +4,8 @@ PRESETS := native win32 win64
 BENCH_PRESETS := bench bench-win32 bench-win64
 CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check bench fuzz screenshots win32-emulated dist clean bootstrap \
+.PHONY: all demo demo-dialog test check bench fuzz mutate screenshots win32-emulated dist clean \
+  bootstrap \
   $(PRESETS)
 
 all: $(PRESETS)
@@ -43,6 +44,12 @@ bench:
 MINUTES := 5
 fuzz: bootstrap
 	@tools/fuzz $(MINUTES) $(TARGET)
+
+# Small faults in src/, one at a time: which tests notice, and which faults nobody does. The tool's
+# options: make mutate MUTATE='-n 50 src/engine'
+MUTATE := -n 300
+mutate: all
+	@tools/mutate $(MUTATE)
 
 # Every page in five languages, from the real program under Wine, into docs/screenshots/.
 screenshots: all
