@@ -6,24 +6,21 @@
 #include <string>
 
 #include "machine/code_page.h"
+#include "machine/drives.h"
 #include "machine/machine.h"
 #include "machine/scripted_user.h"
-#include "platform/win32.h"
+#include "platform/entry.h"
 
 namespace {
 
 constexpr int kUnusableMachineStatus = 2;
 constexpr int kOpenObjectsStatus = 3;
 constexpr int kFirstSoftCode = 100001;
-constexpr int kShowNormally = 1;
 
-// The arguments joined by one blank each, nothing quoted.
-std::string JoinArguments(int count, char** arguments) {
-  std::string line;
-  for (int i = 1; i < count; ++i) {
-    if (i > 1) line += ' ';
-    line += arguments[i];
-  }
+// The program's name in quotes, then the arguments, a blank before each and nothing quoted.
+std::string JoinCommandLine(int count, char** arguments) {
+  std::string line = '"' + machine::ImagePath() + '"';
+  for (int i = 1; i < count; ++i) line += ' ' + machine::FromUtf8(arguments[i]);
   return line;
 }
 
@@ -48,8 +45,8 @@ int main(int argc, char** argv) {
     std::fprintf(stderr, "%s\n", error.c_str());
     return kUnusableMachineStatus;
   }
-  std::string commandLine = machine::FromUtf8(JoinArguments(argc, argv));
-  const int code = WinMain(nullptr, nullptr, commandLine.data(), kShowNormally);
+  machine::CurrentSettings().commandLine = JoinCommandLine(argc, argv);
+  const int code = RunProgram();
   machine::EndUser();
   const std::string open = machine::Stop();
 

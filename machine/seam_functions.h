@@ -32,6 +32,8 @@ inline constexpr std::string_view kSeamFunctions[] = {
     "GetModuleFileNameA",
     "GetModuleHandleA",
     "GetSystemDirectoryA",
+    "GetCommandLineA",
+    "SetErrorMode",
     "GetWindowsDirectoryA",
     "GetVersionExA",
     "GetSystemDefaultLangID",

@@ -42,6 +42,7 @@ struct Settings {
       disks;  // by upper-case drive letter; a drive without one has the defaults
   bool hasGetDiskFreeSpaceEx = true;
   std::vector<Fault> faults;
+  std::string commandLine;  // of the program that runs, with its name; no setting of the file
 };
 
 // Reads a machine.ini. A missing file leaves the defaults. On bad input (an unknown section or key,

@@ -6,6 +6,7 @@
 #include <memory>
 #include <new>
 #include <string>
+#include <utility>
 
 #include "machine/faults.h"
 #include "machine/machine.h"
@@ -37,6 +38,16 @@ UINT GiveDirectory(const std::string& path, LPSTR buffer, UINT size) {
 }  // namespace
 
 extern "C" {
+
+LPSTR GetCommandLineA() {
+  return machine::CurrentSettings().commandLine.data();
+}
+
+// There are no boxes of the system's to keep away here.
+UINT SetErrorMode(UINT mode) {
+  static UINT current = 0;
+  return std::exchange(current, mode);
+}
 
 UINT GetSystemDirectoryA(LPSTR buffer, UINT size) {
   if (machine::CallFails("GetSystemDirectoryA")) return 0;

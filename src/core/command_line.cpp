@@ -46,6 +46,15 @@ bool TakePath(const char* text, const char* prefix, char (&path)[kPathSize]) {
 
 }  // namespace
 
+const char* SkipProgramName(const char* commandLine) {
+  if (commandLine == nullptr) return nullptr;
+  const bool isQuoted = *commandLine == '"';
+  const char* rest = isQuoted ? commandLine + 1 : commandLine;
+  rest += strcspn(rest, isQuoted ? "\"" : " \t");
+  if (isQuoted && *rest == '"') ++rest;
+  return rest + strspn(rest, " \t");
+}
+
 void ApplyOption(const char* text, SetupRequest* request) {
   if (IsMissingOrEmpty(text) || request == nullptr) return;
   for (const OptionRow& row : kOptions) {

@@ -7,6 +7,11 @@
 
 #include "core/context.h"
 
+// The text behind the program's name in a process's whole command line. A name in quotes ends at the
+// closing quote, another one at the first blank or tab; blanks and tabs behind it are skipped.
+// Returns null for null.
+const char* SkipProgramName(const char* commandLine);
+
 // Applies each option of the line to the request, from left to right. An option text of 260
 // characters or more has no effect: half a path is worse than none. Returns 1 when the line was
 // walked, 0 when an argument is null or the line holds no marker.

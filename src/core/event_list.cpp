@@ -7,7 +7,9 @@
 namespace {
 
 void SetEventText(EventEntry* entry, const char* text) {
-  const size_t length = strnlen(text, kEventTextSize - 1);
+  const void* const end = memchr(text, '\0', kEventTextSize - 1);
+  const size_t length = end != nullptr ? static_cast<size_t>(static_cast<const char*>(end) - text)
+                                       : kEventTextSize - 1;
   memcpy(entry->text, text, length);
   entry->text[length] = '\0';
 }

@@ -1,5 +1,7 @@
-// The program's entry. Everything else is in the library beside it, so that tests link the same
-// code.
+// What a process does before and around the run. Everything else is in the library beside it, so
+// that tests link the same code.
+#include "platform/entry.h"
+
 #include "core/command_line.h"
 #include "core/driver.h"
 #include "platform/procedure.h"
@@ -8,9 +10,9 @@
 namespace {
 
 // A library that lies beside the program, in a folder of downloads perhaps, must not be loaded for
-// one of the system's. The libraries of the import table can't be replaced that way, since Windows
-// knows them all; but those load others by their bare names. Unread: a system without the function,
-// or one that refuses, is served as it always was.
+// one of the system's. Of the libraries of the import table the system takes its own anyway; but
+// those load others by their bare names. Unread: a system without the function, or one that
+// refuses, is served as it always was.
 void LoadLibrariesFromSystemDirectory() {
   const auto setDirectories = FindProcedure<decltype(&SetDefaultDllDirectories)>(
       GetModuleHandleA("kernel32.dll"), "SetDefaultDllDirectories");
@@ -19,11 +21,14 @@ void LoadLibrariesFromSystemDirectory() {
 
 }  // namespace
 
-// Of the four arguments only the command line, the text behind the program's name, is read.
-int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR commandLine, int) {
+int RunProgram() {
   LoadLibrariesFromSystemDirectory();
+  // Nobody may be there to answer a box of the system's about an empty drive; the call fails.
+  SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX);
   SetupRequest request = {};
   request.language = kLanguageNone;
-  if (ParseCommandLine(commandLine, &request) == 0) request.options = kDefaultOptions;
+  if (ParseCommandLine(SkipProgramName(GetCommandLineA()), &request) == 0) {
+    request.options = kDefaultOptions;
+  }
   return RunSetup(request);
 }

@@ -73,7 +73,6 @@ typedef void* HBRUSH;
 typedef void* HFONT;
 typedef void* HBITMAP;
 
-#define WINAPI
 #define CALLBACK
 #define TRUE     1
 #define FALSE    0
@@ -150,6 +149,8 @@ struct OSVERSIONINFOA {
 typedef OSVERSIONINFOA* LPOSVERSIONINFOA;
 
 inline constexpr DWORD LOAD_LIBRARY_SEARCH_SYSTEM32 = 0x800;
+inline constexpr UINT SEM_FAILCRITICALERRORS = 0x0001;
+inline constexpr UINT SEM_NOOPENFILEERRORBOX = 0x8000;
 
 struct SYSTEMTIME {
   WORD wYear;
@@ -385,6 +386,8 @@ int _stat(const char* name, struct _stat* status);
 DWORD GetModuleFileNameA(HMODULE module, LPSTR buffer, DWORD size);
 HMODULE GetModuleHandleA(LPCSTR name);
 UINT GetSystemDirectoryA(LPSTR buffer, UINT size);
+LPSTR GetCommandLineA(void);
+UINT SetErrorMode(UINT mode);
 UINT GetWindowsDirectoryA(LPSTR buffer, UINT size);
 BOOL GetVersionExA(LPOSVERSIONINFOA info);
 LANGID GetSystemDefaultLangID();
@@ -472,8 +475,6 @@ BOOL GetDiskFreeSpaceExA(LPCSTR root, PULARGE_INTEGER freeToCaller, PULARGE_INTE
 DWORD GetFileVersionInfoSizeA(LPCSTR name, LPDWORD handle);
 BOOL GetFileVersionInfoA(LPCSTR name, DWORD handle, DWORD size, LPVOID data);
 BOOL VerQueryValueA(LPCVOID data, LPCSTR path, LPVOID* value, PUINT length);
-
-int WINAPI WinMain(HINSTANCE instance, HINSTANCE previous, LPSTR commandLine, int show);
 
 }  // extern "C"
 
