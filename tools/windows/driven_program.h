@@ -3,6 +3,7 @@
 
 #include <windows.h>
 // After windows.h.
+#include <functional>
 #include <string>
 
 inline constexpr DWORD kStepTime = 20;   // milliseconds between two looks
@@ -19,5 +20,11 @@ void WaitForPicture(const std::string& name);
 
 bool StartProgram(const char* path, std::string commandLine);
 const PROCESS_INFORMATION& DrivenProcess();
+
+// Calls `use` with the address, in the program's own memory, of a copy of these bytes.
+void WithCopyInProgram(const void* bytes, size_t size, const std::function<void(void*)>& use);
+// Has the program load a library, as anything does that runs in it and knows a library's name.
+void LoadLibraryInProgram(const std::string& name);
+
 bool HasEnded();
 int ExitCodeOfProgram();
