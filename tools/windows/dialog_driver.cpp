@@ -225,8 +225,11 @@ std::string SkipWords(const char* text, int count) {
 int main(int argc, char** argv) {
   if (argc < 4 || !OpenReport(argv[2])) return 2;
   ReadScript(argv[1]);
-  ReadPictures(argv[3]);
-  if (!StartProgram(argv[3], SkipWords(GetCommandLineA(), 3))) Fail("can't start the program");
+  const auto isDrawn = [](const Line& line) { return line.verb == "show-drawn"; };
+  if (std::ranges::any_of(script, isDrawn)) ReadPictures(argv[3]);
+  if (!StartProgram(argv[3], SkipWords(GetCommandLineA(), 3))) {
+    Fail("can't start the program: " + std::to_string(GetLastError()));
+  }
   Play();
   Print("exit code: " + std::to_string(ExitCodeOfProgram()));
   return 0;

@@ -30,8 +30,12 @@ void Fail(const std::string& what) {
   std::exit(1);
 }
 
+void LetDraw() {
+  Sleep(10 * kStepTime);
+}
+
 void WaitForPicture(const std::string& name) {
-  Sleep(10 * kStepTime);  // until all is drawn
+  LetDraw();
   Print("picture " + name);
   for (int look = 0; look < kMostLooks; ++look) {
     if (GetFileAttributesA((reportPath + "." + name).c_str()) != INVALID_FILE_ATTRIBUTES) return;

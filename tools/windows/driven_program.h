@@ -15,6 +15,8 @@ bool OpenReport(const char* path);
 void Print(const std::string& line);
 // Ends the program and the driver, with a last line that says why.
 [[noreturn]] void Fail(const std::string& what);
+// Gives the program the time to draw what it has to.
+void LetDraw();
 // Lets somebody outside take a picture of the display: the file REPORT.NAME tells that it is taken.
 void WaitForPicture(const std::string& name);
 

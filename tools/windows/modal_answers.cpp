@@ -76,7 +76,7 @@ std::string DescribeLook(HWND box) {
   for (const HWND child : ChildrenOf(box)) {
     const LONG style = GetWindowLongA(child, GWL_STYLE);
     if (ClassOf(child) == "Static") {
-      if ((style & SS_TYPEMASK) == SS_ICON && IsShown(child)) icon = SeenIcon(child);
+      if ((style & SS_TYPEMASK) == SS_ICON && Ask(child, STM_GETICON) != 0) icon = SeenIcon(child);
       continue;
     }
     const auto index = static_cast<size_t>(GetDlgCtrlID(child) - IDOK);

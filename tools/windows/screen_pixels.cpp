@@ -3,9 +3,11 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
+#include <iterator>
 #include <map>
 
 #include "tools/windows/dialog_view.h"
+#include "tools/windows/driven_program.h"
 
 namespace {
 
@@ -56,15 +58,15 @@ Pixels OnScreen(HWND window) {
   return pixels;
 }
 
-// Draws on a bitmap of the screen's kind.
-template <typename Draw>
-Pixels Drawn(int width, int height, Draw draw) {
+// The icon as a control of this size in a box shows it.
+Pixels DrawnIcon(LPCSTR icon, RECT area) {
   const HDC screen = GetDC(nullptr);
   const HDC dc = CreateCompatibleDC(screen);
-  const HBITMAP bitmap = CreateCompatibleBitmap(screen, width, height);
+  const HBITMAP bitmap = CreateCompatibleBitmap(screen, area.right, area.bottom);
   SelectObject(dc, bitmap);
-  draw(dc);
-  Pixels pixels = Copy(dc, {0, 0, width, height});
+  FillRect(dc, &area, GetSysColorBrush(COLOR_BTNFACE));
+  DrawIcon(dc, 0, 0, LoadIconA(nullptr, icon));
+  Pixels pixels = Copy(dc, area);
   DeleteDC(dc);
   DeleteObject(bitmap);
   ReleaseDC(nullptr, screen);
@@ -157,6 +159,7 @@ void ReadPictures(const char* program) {
 }
 
 std::vector<std::string> DescribeDrawn(HWND dialog) {
+  LetDraw();
   std::vector<std::string> lines;
   for (const HWND control : ChildrenOf(dialog)) {
     if (std::string line = Describe(control); !line.empty()) lines.push_back(line);
@@ -172,14 +175,10 @@ std::string SeenIcon(HWND control) {
                 {IDI_QUESTION, "question"},
                 {IDI_EXCLAMATION, "warning"},
                 {IDI_ASTERISK, "information"}};
+  LetDraw();
   const Pixels seen = OnScreen(control);
-  const RECT area = {0, 0, seen.width, seen.height};
   for (const auto& [icon, name] : kIcons) {
-    const Pixels drawn = Drawn(seen.width, seen.height, [&](HDC dc) {
-      FillRect(dc, &area, GetSysColorBrush(COLOR_BTNFACE));
-      DrawIcon(dc, 0, 0, LoadIconA(nullptr, icon));
-    });
-    if (drawn.colors == seen.colors) return name;
+    if (DrawnIcon(icon, {0, 0, seen.width, seen.height}).colors == seen.colors) return name;
   }
   return "unknown";
 }
