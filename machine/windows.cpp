@@ -207,7 +207,9 @@ void DispatchToWindow(const MSG& message) {
   const Window* const window = FindWindowByHandle(message.hwnd);
   if (window == nullptr) return;
   if (window->kind == WindowKind::kDialog) {
-    SendToDialog(message.message, message.wParam, message.lParam);
+    if (SendToDialog(message.message, message.wParam, message.lParam) == FALSE) {
+      HandleForDialog(message.message, message.wParam);
+    }
   } else if (message.message == kClickMessage) {
     Click(message.hwnd);
   }

@@ -75,10 +75,9 @@ Window* FindWindowByHandle(HWND handle);
 
 // Calls the dialog's procedure.
 INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam);
-// What the system does with a message sent that the procedure has not handled, and its answer: it
-// tells and sets the default button. 0 for all other messages. Windows does the same with one that
-// was posted, also with a private message of that number; here a program's posted messages are its
-// own.
+// What the system does with a message, sent or posted, that the procedure has not handled, and its
+// answer: it tells and sets the default button. 0 for all other messages. A private message of the
+// program's that has the number of one of these two is taken for it.
 LRESULT HandleForDialog(UINT message, WPARAM wParam);
 inline constexpr UINT kGetDefaultId = 0x400;  // DM_GETDEFID
 // Takes the default button's looks from the button that has them to this one; null for none.
