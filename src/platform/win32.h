@@ -175,6 +175,7 @@ typedef SYSTEMTIME* LPSYSTEMTIME;
 #define WM_COMMAND                 0x0111u
 #define EM_SETSEL                  0x00B1u
 #define BM_SETSTYLE                0x00F4u
+#define DM_SETDEFID                0x0401u
 #define CB_ADDSTRING               0x0143u
 #define CB_GETCOUNT                0x0146u
 #define CB_GETCURSEL               0x0147u

@@ -38,6 +38,7 @@ void Renumber(int id, int newId) {
 }
 
 void MakeDefault(int id) {
+  SendMessageA(wizardState.window, DM_SETDEFID, static_cast<WPARAM>(id), 0);
   SendMessageA(Control(id), BM_SETSTYLE, BS_DEFPUSHBUTTON, TRUE);
 }
 

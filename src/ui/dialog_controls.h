@@ -16,7 +16,8 @@ void Renumber(int id, int newId);
 void SetText(int id, uint32_t catalogId, const SetupContext& context);
 void SetTitle(uint32_t catalogId, const SetupContext& context);
 
-// Gives a button the looks of the default one, which Enter presses.
+// Makes a button the default one, which Enter presses: by the dialog's default id and by its looks,
+// since systems go by either.
 void MakeDefault(int id);
 
 // The edit field of the installation directory.
