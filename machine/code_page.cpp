@@ -109,6 +109,21 @@ char ByteOf(const CodePage& page, char32_t character) {
   return found != page.bytes.end() ? static_cast<char>(found->second) : '?';
 }
 
+// Windows takes the plain letter for an accented one that a European page lacks: of U+00C0 to
+// U+00FF. The Hebrew and the Baltic page have none of that.
+char LetterOf(const CodePage& page, char16_t character) {
+  constexpr std::string_view kLetters =
+      "AAAAAA?CEEEEIIII?NOOOOO?OUUUUY??aaaaaa?ceeeeiiii?nooooo?ouuuuy?y";
+  constexpr char16_t kFirst = 0xC0;
+  constexpr int kLastEuropeanPage = 1254;
+  const bool hasLetter = character >= kFirst && character - kFirst < 0x40;
+  const bool isMissing = !page.bytes.contains(character);
+  if (isMissing && hasLetter && CurrentSettings().codePage <= kLastEuropeanPage) {
+    return kLetters[character - kFirst];
+  }
+  return ByteOf(page, character);
+}
+
 }  // namespace
 
 std::string ToUtf8(std::string_view ansi) {
@@ -128,7 +143,7 @@ std::string FromUtf8(std::string_view utf8) {
 std::string FromUtf16(std::u16string_view text) {
   const CodePage& page = CurrentCodePage();
   std::string ansi;
-  for (const char16_t unit : text) ansi.push_back(ByteOf(page, unit));
+  for (const char16_t unit : text) ansi.push_back(LetterOf(page, unit));
   return ansi;
 }
 

@@ -6,26 +6,31 @@
 #include <optional>
 #include <utility>
 
-#include "machine/code_page.h"
 #include "machine/executable_resources.h"
 #include "machine/faults.h"
 #include "machine/open_objects.h"
+#include "machine/scripted_user.h"
 
 using machine::CallFails;
 using machine::ObjectKind;
 
 namespace {
 
+// The system's colours that differ from PC to PC, as 0x00BBGGRR.
+constexpr COLORREF kFaceColor = 0xC8D0D4;  // of a dialog
+constexpr COLORREF kHighlightColor = 0x6A240A;
+
 struct GraphicsObject {
   ObjectKind kind = ObjectKind::kBrush;
   std::string description;  // for the record of what was drawn with it
+  int resource = 0;         // of a bitmap
   LONG width = 0;           // of a bitmap, in pixels
   LONG height = 0;
   int timesSelected = 0;
 };
 
 struct DeviceContext {
-  std::vector<std::string>* record = nullptr;  // null: nobody looks at what is drawn
+  machine::Drawing* record = nullptr;  // null: nobody looks at what is drawn
   std::map<ObjectKind, HGDIOBJ> selected;
   COLORREF textColor = 0;
   COLORREF backgroundColor = 0xFFFFFF;
@@ -84,17 +89,22 @@ bool CloseContext(HDC dc) {
   return true;
 }
 
-std::string Hexadecimal(uint32_t number) {
+std::string ColorName(COLORREF color) {
+  if (color == kFaceColor) return "face";
+  if (color == kHighlightColor) return "highlight";
   char text[16];
-  std::snprintf(text, sizeof(text), "%06X", number);
+  std::snprintf(text, sizeof(text), "%02X%02X%02X", color & 0xFF, color >> 8 & 0xFF,
+                color >> 16 & 0xFF);
   return text;
 }
 
-// What is selected for a kind, in words.
-std::string Selected(const DeviceContext& context, ObjectKind kind) {
+// What is selected for a kind; null for none of the program's.
+const GraphicsObject* Selected(const DeviceContext& context, ObjectKind kind) {
   const auto found = context.selected.find(kind);
-  const GraphicsObject* const object =
-      found != context.selected.end() ? FindObject(found->second) : nullptr;
+  return found != context.selected.end() ? FindObject(found->second) : nullptr;
+}
+
+std::string Describe(const GraphicsObject* object) {
   return object != nullptr ? object->description : "none";
 }
 
@@ -104,22 +114,29 @@ std::string Place(LONG x, LONG y, LONG width, LONG height) {
 }
 
 void Record(DeviceContext* context, const std::string& line) {
-  if (context->record != nullptr) context->record->push_back(line);
+  if (context->record != nullptr) context->record->calls.push_back(line);
 }
 
 }  // namespace
 
 namespace machine {
 
-HDC BeginDrawing(Window* control) {
-  control->drawing.clear();
+HDC BeginDrawing(Drawing* drawing) {
+  *drawing = {};
   const HDC dc = NewContext();
-  contexts[dc].record = &control->drawing;
+  contexts[dc].record = drawing;
+  contexts[dc].backgroundColor = kFaceColor;
   return dc;
 }
 
 void EndDrawing(HDC dc) {
   CloseContext(dc);
+}
+
+std::string DescribeFont(HGDIOBJ font) {
+  if (font == nullptr) return "none";
+  const GraphicsObject* const object = FindObject(font);
+  return object != nullptr ? object->description : "gone";
 }
 
 }  // namespace machine
@@ -134,7 +151,8 @@ HBITMAP LoadBitmapA(HINSTANCE, LPCSTR id) {
   const auto bytes = machine::OwnResource(kBitmapType, number);
   if (!bytes || bytes->size() < 40) return nullptr;
   GraphicsObject bitmap = {.kind = ObjectKind::kBitmap,
-                           .description = "bitmap " + std::to_string(number)};
+                           .description = "picture " + std::to_string(number),
+                           .resource = number};
   std::memcpy(&bitmap.width, bytes->data() + 4, sizeof(bitmap.width));
   std::memcpy(&bitmap.height, bytes->data() + 8, sizeof(bitmap.height));
   if (bitmap.width <= 0 || bitmap.height <= 0) return nullptr;
@@ -156,19 +174,23 @@ int GetObjectA(HGDIOBJ handle, int size, LPVOID record) {
   return sizeof(bitmap);
 }
 
-HFONT CreateFontA(int height, int, int, int, int weight, DWORD italic, DWORD underline, DWORD,
-                  DWORD, DWORD, DWORD, DWORD, DWORD, LPCSTR face) {
+// What a font of this program has no need of shows only that it is there.
+HFONT CreateFontA(int height, int width, int escapement, int orientation, int weight, DWORD italic,
+                  DWORD underline, DWORD strikeOut, DWORD charSet, DWORD outPrecision,
+                  DWORD clipPrecision, DWORD quality, DWORD pitch, LPCSTR face) {
   if (CallFails("CreateFontA")) return nullptr;
-  return NewObject({.kind = ObjectKind::kFont,
-                    .description = std::string("font \"") + (face != nullptr ? face : "") + "\" " +
-                                   std::to_string(height) + " " + std::to_string(weight) +
-                                   (italic != 0 ? " italic" : "") +
-                                   (underline != 0 ? " underline" : "")});
+  const bool hasMore = (width | escapement | orientation) != 0 ||
+                       (strikeOut | charSet | outPrecision | clipPrecision | quality | pitch) != 0;
+  return NewObject(
+      {.kind = ObjectKind::kFont,
+       .description = machine::Quoted(face != nullptr ? face : "") + " " + std::to_string(height) +
+                      " " + std::to_string(weight) + (italic != 0 ? " italic" : "") +
+                      (underline != 0 ? " underlined" : "") + (hasMore ? " and more" : "")});
 }
 
 HBRUSH CreateSolidBrush(COLORREF color) {
   if (CallFails("CreateSolidBrush")) return nullptr;
-  return NewObject({.kind = ObjectKind::kBrush, .description = "brush " + Hexadecimal(color)});
+  return NewObject({.kind = ObjectKind::kBrush, .description = ColorName(color)});
 }
 
 // An object that is selected somewhere can't be deleted.
@@ -229,7 +251,7 @@ DWORD GetSysColor(int index) {
     case COLOR_HIGHLIGHTTEXT:
       return 0xFFFFFF;
     case COLOR_HIGHLIGHT:
-      return 0x6A240A;
+      return kHighlightColor;
     default:
       return 0;
   }
@@ -250,8 +272,8 @@ COLORREF SetBkColor(HDC dc, COLORREF color) {
 BOOL PatBlt(HDC dc, int x, int y, int width, int height, DWORD) {
   DeviceContext* const context = FindContext(dc);
   if (CallFails("PatBlt") || context == nullptr) return FALSE;
-  Record(context,
-         "fill " + Place(x, y, width, height) + " " + Selected(*context, ObjectKind::kBrush));
+  Record(context, "fill " + Place(x, y, width, height) + " " +
+                      Describe(Selected(*context, ObjectKind::kBrush)));
   return TRUE;
 }
 
@@ -259,8 +281,9 @@ BOOL BitBlt(HDC dc, int x, int y, int width, int height, HDC source, int, int, D
   DeviceContext* const context = FindContext(dc);
   const DeviceContext* const from = FindContext(source);
   if (CallFails("BitBlt") || context == nullptr || from == nullptr) return FALSE;
-  Record(context,
-         "copy " + Place(x, y, width, height) + " " + Selected(*from, ObjectKind::kBitmap));
+  const GraphicsObject* const bitmap = Selected(*from, ObjectKind::kBitmap);
+  Record(context, Describe(bitmap) + " " + Place(x, y, width, height));
+  if (context->record != nullptr && bitmap != nullptr) context->record->picture = bitmap->resource;
   return TRUE;
 }
 
@@ -270,12 +293,12 @@ int DrawTextA(HDC dc, LPCSTR text, int length, LPRECT rectangle, UINT format) {
     return 0;
   const std::string bytes =
       length < 0 ? std::string(text) : std::string(text, static_cast<size_t>(length));
-  Record(context, "text \"" + machine::ToUtf8(bytes) + "\" " +
-                      Place(rectangle->left, rectangle->top, rectangle->right - rectangle->left,
-                            rectangle->bottom - rectangle->top) +
-                      " format " + std::to_string(format) + " color " +
-                      Hexadecimal(context->textColor) + " on " +
-                      Hexadecimal(context->backgroundColor));
+  const std::string colors =
+      ColorName(context->textColor) + " on " + ColorName(context->backgroundColor);
+  Record(context, "text " + machine::Quoted(bytes) + " " + std::to_string(rectangle->left) + "," +
+                      std::to_string(rectangle->top) + " format " + std::to_string(format) + " " +
+                      colors);
+  if (context->record != nullptr) context->record->colors = colors;
   return rectangle->bottom - rectangle->top;
 }
 

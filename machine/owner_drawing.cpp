@@ -21,19 +21,38 @@ void DescribeField(const Window& list, DRAWITEMSTRUCT* item) {
   item->rcItem.bottom = static_cast<LONG>(list.itemHeight);
 }
 
-void DrawControl(Window* control) {
-  control->needsDrawing = false;
+// An entry of the open list.
+void DescribeEntry(const Window& list, int entry, DRAWITEMSTRUCT* item) {
+  item->CtlType = ODT_COMBOBOX;
+  item->itemID = static_cast<UINT>(entry);
+  if (entry == list.selection) item->itemState |= ODS_SELECTED | ODS_FOCUS;
+  item->itemData = list.items[static_cast<size_t>(entry)];
+  item->rcItem.top = static_cast<LONG>(list.itemHeight) * entry;
+  item->rcItem.bottom = item->rcItem.top + static_cast<LONG>(list.itemHeight);
+}
+
+DRAWITEMSTRUCT DescribeControl(const Window& control) {
   DRAWITEMSTRUCT item = {};
   item.CtlType = kStaticType;
-  item.CtlID = static_cast<UINT>(control->id);
+  item.CtlID = static_cast<UINT>(control.id);
   item.itemAction = kDrawEntire;
-  item.itemState = control->IsEnabled() ? 0 : kDisabledState;
-  item.hwndItem = control->handle;
-  item.rcItem = {0, 0, control->width, control->height};
-  if (control->kind == WindowKind::kComboBox) DescribeField(*control, &item);
-  item.hDC = BeginDrawing(control);
+  item.itemState = control.IsEnabled() ? 0 : kDisabledState;
+  item.hwndItem = control.handle;
+  item.rcItem = {0, 0, control.width, control.height};
+  return item;
+}
+
+void Draw(DRAWITEMSTRUCT item, Drawing* drawing) {
+  item.hDC = BeginDrawing(drawing);
   SendToDialog(WM_DRAWITEM, item.CtlID, reinterpret_cast<LPARAM>(&item));
   EndDrawing(item.hDC);
+}
+
+void DrawControl(Window* control) {
+  control->needsDrawing = false;
+  DRAWITEMSTRUCT item = DescribeControl(*control);
+  if (control->kind == WindowKind::kComboBox) DescribeField(*control, &item);
+  Draw(item, &control->drawing);
 }
 
 }  // namespace
@@ -55,6 +74,16 @@ void DrawControls() {
       DrawControl(control);
     }
   }
+}
+
+std::vector<Drawing> DrawEntries(const Window& list) {
+  std::vector<Drawing> drawings(list.items.size());
+  for (size_t entry = 0; entry < drawings.size(); ++entry) {
+    DRAWITEMSTRUCT item = DescribeControl(list);
+    DescribeEntry(list, static_cast<int>(entry), &item);
+    Draw(item, &drawings[entry]);
+  }
+  return drawings;
 }
 
 void DeleteItems(const Window& control) {

@@ -12,6 +12,10 @@ void MeasureItems(Window* control);
 // Lets every owner-drawn control that is shown and has changed draw itself.
 void DrawControls();
 
+// Lets each entry of an owner-drawn list draw itself, as when the list is opened. None for another
+// control.
+std::vector<Drawing> DrawEntries(const Window& list);
+
 // Tells of each entry of a list that goes, the last one first.
 void DeleteItems(const Window& control);
 

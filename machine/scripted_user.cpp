@@ -10,8 +10,10 @@
 #include <vector>
 
 #include "machine/code_page.h"
+#include "machine/dialog_keys.h"
 #include "machine/owner_drawing.h"
 #include "machine/registry_store.h"
+#include "machine/shown_dialog.h"
 #include "machine/user_script.h"
 #include "machine/windows.h"
 
@@ -26,47 +28,6 @@ struct User {
 };
 
 std::optional<User> user;
-
-// ---- Showing
-
-std::string Shown(const Window& control) {
-  std::string line = std::to_string(control.id) + " " + control.className + " " +
-                     (control.IsShown() ? "shown " : "hidden ") +
-                     (control.IsEnabled() ? "enabled " : "disabled ");
-  if (control.kind != WindowKind::kComboBox) {
-    return line + Quoted(control.hasPicture ? "" : control.text);
-  }
-  if (control.selection < 0) return line + "none";
-  return line + "selected " + std::to_string(control.selection) + " of " +
-         std::to_string(control.items.size());
-}
-
-std::string IdOrNone(const Window* window) {
-  return window != nullptr ? std::to_string(window->id) : "none";
-}
-
-const Window* DefaultButton(const Dialog& dialog) {
-  for (const auto& control : dialog.controls) {
-    if (control->IsDefaultButton() && control->IsShown()) return control.get();
-  }
-  return nullptr;
-}
-
-// The whole dialog, or the one control of that id.
-void ShowDialog(int id = 0) {
-  const Dialog& dialog = *OpenDialog();
-  if (id != 0) {
-    const Window* const control = dialog.Find(id);
-    TellUser(control != nullptr ? Shown(*control) : std::to_string(id) + " absent");
-    return;
-  }
-  TellUser("dialog " + Quoted(dialog.frame.text) + " focus " +
-           IdOrNone(FindWindowByHandle(dialog.focus)) + " default " +
-           IdOrNone(DefaultButton(dialog)));
-  for (const auto& control : dialog.controls) TellUser(Shown(*control));
-}
-
-// ---- Acting
 
 [[noreturn]] void Fail(const std::string& what) {
   constexpr int kUnfitScriptStatus = 2;
@@ -109,6 +70,10 @@ void Type(const UserLine& line) {
   TypeText(control, FromUtf8(line.detail));
 }
 
+void UseKeyboard(const UserLine& line) {
+  if (!PressKey(line.detail)) Fail(line.place + ": nothing that takes the key has the focus");
+}
+
 void MakeRegistryKey(const std::string& path) {
   MakeKey(LocalMachine(), FromUtf8(path));
   SaveRegistry();
@@ -117,6 +82,8 @@ void MakeRegistryKey(const std::string& path) {
 // What is done at once, whatever the dialog is at.
 void ActBesideTheDialog(const UserLine& line) {
   if (line.verb == UserVerb::kShow) ShowDialog(line.control);
+  if (line.verb == UserVerb::kShowFocus) ShowFocus();
+  if (line.verb == UserVerb::kShowDrawn) ShowDrawn();
   if (line.verb == UserVerb::kKey) MakeRegistryKey(line.detail);
 }
 
@@ -131,6 +98,9 @@ void Act(const UserLine& line) {
       break;
     case UserVerb::kType:
       Type(line);
+      break;
+    case UserVerb::kKeyboard:
+      UseKeyboard(line);
       break;
     case UserVerb::kEscape:
     case UserVerb::kEscapeDuring:
@@ -162,6 +132,7 @@ void ActDuringStep(const UserLine& line) {
       PostCancel();
       break;
     case UserVerb::kType:
+    case UserVerb::kKeyboard:
       Fail(line.place + ": nothing that a user does during a step");
     default:
       ActBesideTheDialog(line);
@@ -263,10 +234,15 @@ void UserAtPoll() {
   PostDuring();
 }
 
-int AnswerBox(const std::string& caption, const std::string& text, UINT type) {
+int AnswerBox(const std::string& caption, const std::string& text, UINT type,
+              const std::string& look) {
   const std::string box = "box " + Quoted(caption) + " " + Quoted(text);
+  const auto tell = [&](const std::string& answer) {
+    TellUser(box + " " + answer);
+    if (user->script.showsBoxes) TellUser("box-look " + look);
+  };
   if ((type & MB_YESNO) == 0) {
-    TellUser(box + " ok");
+    tell("ok");
     return IDOK;
   }
   if (user->turn) return IDYES;
@@ -277,7 +253,7 @@ int AnswerBox(const std::string& caption, const std::string& text, UINT type) {
     PostDuring();
     DispatchAll();
   }
-  TellUser(box + " " + answer.detail);
+  tell(answer.detail);
   return answer.detail == "yes" ? IDYES : IDNO;
 }
 

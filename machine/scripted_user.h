@@ -33,7 +33,9 @@ void TakeUserTurn();
 void UserAtPoll();
 
 // The user's answer to a message box, given at once or when all that was posted is dispatched.
-int AnswerBox(const std::string& caption, const std::string& text, UINT type);
+// `look` is shown to a user who looks at that too.
+int AnswerBox(const std::string& caption, const std::string& text, UINT type,
+              const std::string& look);
 
 // What the user picks in a folder picker; false for none.
 bool PickFolder(const std::string& prompt, std::string* path);

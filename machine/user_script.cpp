@@ -4,11 +4,13 @@
 #include <cstdlib>
 #include <fstream>
 
+#include "machine/dialog_keys.h"
+
 namespace machine {
 namespace {
 
 // What stands behind a verb.
-enum class Operand { kNone, kControl, kPerhapsControl, kControlAndText, kYesOrNo, kText };
+enum class Operand { kNone, kControl, kPerhapsControl, kControlAndText, kYesOrNo, kKey, kText };
 
 struct VerbForm {
   const char* name;
@@ -27,6 +29,10 @@ constexpr VerbForm kVerbs[] = {
     {"escape", UserVerb::kEscape, Operand::kNone},
     {"close", UserVerb::kClose, Operand::kNone},
     {"show", UserVerb::kShow, Operand::kPerhapsControl},
+    {"show-focus", UserVerb::kShowFocus, Operand::kNone},
+    {"show-drawn", UserVerb::kShowDrawn, Operand::kNone},
+    {"show-boxes", UserVerb::kShowBoxes, Operand::kNone},
+    {"keyboard", UserVerb::kKeyboard, Operand::kKey},
     {"key", UserVerb::kKey, Operand::kText},
     {"answer", UserVerb::kAnswer, Operand::kYesOrNo},
     {"answer-late", UserVerb::kAnswerLate, Operand::kYesOrNo},
@@ -66,6 +72,9 @@ bool TakeOperand(Operand operand, std::string text, UserLine* line) {
     case Operand::kYesOrNo:
       line->detail = text;
       return text == "yes" || text == "no";
+    case Operand::kKey:
+      line->detail = text;
+      return IsKey(text);
     case Operand::kText:
       line->detail = text;
       return !text.empty();
@@ -95,7 +104,11 @@ bool Sort(const UserLine& line, UserScript* script) {
   const bool isQueued = IsAnswer(line.verb) || line.verb == UserVerb::kPick;
   if (line.poll > 0) {
     script->atPolls.push_back(line);
-    return !isQueued;
+    return !isQueued && line.verb != UserVerb::kShowBoxes;
+  }
+  if (line.verb == UserVerb::kShowBoxes) {
+    script->showsBoxes = true;
+    return true;
   }
   std::deque<UserLine>& queue = IsAnswer(line.verb)            ? script->answers
                                 : line.verb == UserVerb::kPick ? script->picks

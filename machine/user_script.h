@@ -20,6 +20,10 @@ enum class UserVerb {
   kEscape,
   kClose,
   kShow,
+  kShowFocus,
+  kShowDrawn,
+  kShowBoxes,
+  kKeyboard,
   kKey,
   kAnswer,
   kAnswerLate,
@@ -30,7 +34,7 @@ struct UserLine {
   std::string place;  // "FILE:LINE: TEXT", for messages
   UserVerb verb = UserVerb::kWait;
   int control = 0;     // id, of the verbs that name a control; 0 for a "show" of the whole dialog
-  std::string detail;  // UTF-8: what is typed or waited for, the path, "yes", "no", "none"
+  std::string detail;  // UTF-8: what is typed or waited for, the key, the path, "yes", "no", "none"
   int poll = 0;        // of a line that belongs to the n-th poll of the run; 0 for the others
 };
 
@@ -45,6 +49,7 @@ struct UserScript {
   std::deque<UserLine> answers;
   std::deque<UserLine> picks;
   std::vector<UserLine> atPolls;
+  bool showsBoxes = false;  // how they look, too
 };
 
 // nullopt, with "FILE:LINE: what" in `error`, for a line that is none.

@@ -79,6 +79,13 @@ void SetButtonType(Window* button, WPARAM type) {
       (button->style & ~kButtonTypeMask) | (static_cast<uint32_t>(type) & kButtonTypeMask);
 }
 
+// A negative end is that of the text.
+void Select(Window* edit, WPARAM start, LPARAM end) {
+  const size_t size = edit->text.size();
+  edit->selectionEnd = end < 0 ? size : std::min(static_cast<size_t>(end), size);
+  edit->selectionStart = std::min(static_cast<size_t>(start), edit->selectionEnd);
+}
+
 LRESULT SendToControl(Window* control, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
     case WM_SETTEXT:
@@ -87,12 +94,16 @@ LRESULT SendToControl(Window* control, UINT message, WPARAM wParam, LPARAM lPara
     case WM_GETTEXT:
       return GetText(*control, wParam, reinterpret_cast<char*>(lParam));
     case WM_SETFONT:
+      control->font = reinterpret_cast<HGDIOBJ>(wParam);
       control->needsDrawing = true;
       return 0;
     case BM_SETSTYLE:
       if (control->kind == WindowKind::kButton) SetButtonType(control, wParam);
       return 0;
-    default:  // EM_SETSEL changes nothing that can be seen here
+    case EM_SETSEL:
+      Select(control, wParam, lParam);
+      return 0;
+    default:
       if (control->kind == WindowKind::kDialog) return machine::HandleForDialog(message, wParam);
       return control->kind == WindowKind::kComboBox ? SendToList(control, message, wParam, lParam)
                                                     : 0;

@@ -2,6 +2,7 @@
 #include <cstdio>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "machine/code_page.h"
 #include "machine/faults.h"
@@ -36,6 +37,23 @@ Button DefaultButton(UINT type) {
   return kButtons[kind][exists ? index : 0];
 }
 
+// "ICON BUTTONS default BUTTON", the buttons joined by hyphens.
+std::string DescribeLook(UINT type) {
+  constexpr const char* kIcons[] = {"none", "error", "question", "warning", "information"};
+  constexpr const char* kNames[] = {"none",  "ok",     "cancel", "abort",
+                                    "retry", "ignore", "yes",    "no"};
+  const UINT kind = type & 0xF;
+  const UINT icon = type >> 4 & 0xF;
+  std::string look = icon < std::size(kIcons) ? kIcons[icon] : "none";
+  char separator = ' ';
+  for (const Button button : kButtons[kind < std::size(kButtons) ? kind : 0]) {
+    if (button == kNone) continue;
+    look += std::exchange(separator, '-');
+    look += kNames[button];
+  }
+  return look.append(" default ").append(kNames[DefaultButton(type)]);
+}
+
 std::string TerminalText(std::string_view text) {
   std::string lines;
   for (size_t at = 0; at < text.size(); ++at) {
@@ -55,7 +73,9 @@ int MessageBoxA(HWND, LPCSTR text, LPCSTR caption, UINT type) {
   if (machine::CallFails("MessageBoxA")) return 0;
   const std::string shownCaption = caption != nullptr ? caption : "Error";
   const std::string shownText = text != nullptr ? text : "";
-  if (machine::HasUser()) return machine::AnswerBox(shownCaption, shownText, type);
+  if (machine::HasUser()) {
+    return machine::AnswerBox(shownCaption, shownText, type, DescribeLook(type));
+  }
   std::printf("[%s]\n%s\n", TerminalText(shownCaption).c_str(), TerminalText(shownText).c_str());
   std::fflush(stdout);
   return DefaultButton(type);

@@ -19,7 +19,6 @@ constexpr uint32_t kTabStop = 0x10000;      // WS_TABSTOP
 constexpr int kEditUpdate = 0x400;
 constexpr int kEditChange = 0x300;
 
-constexpr UINT kGetDefaultId = 0x400;        // DM_GETDEFID
 constexpr UINT kSetDefaultId = 0x401;        // DM_SETDEFID
 constexpr LRESULT kHasDefault = 0x534B0000;  // DC_HASDEFID, the answer's upper half
 
@@ -71,11 +70,6 @@ std::unique_ptr<Window> MakeControl(const TemplateItem& item, WindowKind kind) {
   return control;
 }
 
-void Command(int id, int notification, HWND control) {
-  const DWORD word = static_cast<WORD>(id) | static_cast<DWORD>(notification) << 16;
-  SendToDialog(WM_COMMAND, word, reinterpret_cast<LPARAM>(control));
-}
-
 HWND CancelControl() {
   const Window* const control = openDialog->Find(IDCANCEL);
   return control != nullptr ? control->handle : nullptr;
@@ -85,16 +79,6 @@ HWND CancelControl() {
 bool CanCancel() {
   const Window* const control = openDialog->Find(IDCANCEL);
   return control == nullptr || control->IsEnabled();
-}
-
-// The type goes from the button that has it to the new one, if that is a button.
-void SetDefaultButton(int id) {
-  Window* old = openDialog->Find(openDialog->defaultId);
-  if (old == nullptr || !old->IsDefaultButton()) old = openDialog->FindDefaultButton();
-  if (old != nullptr) old->style &= ~uint32_t{kButtonTypeMask};
-  Window* const button = openDialog->Find(id);
-  if (button != nullptr && button->kind == WindowKind::kButton) button->style |= BS_DEFPUSHBUTTON;
-  openDialog->defaultId = id;
 }
 
 void DestroyDialog() {
@@ -148,11 +132,18 @@ Window* Dialog::FindDefaultButton() const {
   return found != controls.end() ? found->get() : nullptr;
 }
 
+std::vector<Window*> Dialog::TabStops() const {
+  std::vector<Window*> stops;
+  for (const auto& control : controls) {
+    const bool isStop = (control->style & kTabStop) != 0;
+    if (isStop && control->IsShown() && control->IsEnabled()) stops.push_back(control.get());
+  }
+  return stops;
+}
+
 HWND Dialog::FirstTabStop() const {
-  const auto found = std::ranges::find_if(controls, [](const std::unique_ptr<Window>& control) {
-    return (control->style & kTabStop) != 0 && control->IsShown() && control->IsEnabled();
-  });
-  return found != controls.end() ? (*found)->handle : nullptr;
+  const std::vector<Window*> stops = TabStops();
+  return stops.empty() ? nullptr : stops.front()->handle;
 }
 
 void Dialog::TakeFocusFrom(HWND control) {
@@ -180,12 +171,21 @@ INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam) {
 LRESULT HandleForDialog(UINT message, WPARAM wParam) {
   if (openDialog == nullptr || (message != kGetDefaultId && message != kSetDefaultId)) return 0;
   if (message == kSetDefaultId) {
-    SetDefaultButton(static_cast<int>(wParam));
+    const int id = static_cast<int>(wParam);
+    GiveDefaultLook(openDialog->Find(id));
+    openDialog->defaultId = id;
     return TRUE;
   }
   if (openDialog->defaultId != 0) return openDialog->defaultId | kHasDefault;
   const Window* const button = openDialog->FindDefaultButton();
   return button != nullptr ? button->id | kHasDefault : 0;
+}
+
+void GiveDefaultLook(Window* button) {
+  Window* old = openDialog->Find(openDialog->defaultId);
+  if (old == nullptr || !old->IsDefaultButton()) old = openDialog->FindDefaultButton();
+  if (old != nullptr) old->style &= ~uint32_t{kButtonTypeMask};
+  if (button != nullptr && button->kind == WindowKind::kButton) button->style |= BS_DEFPUSHBUTTON;
 }
 
 void PostToQueue(const MSG& message) {
@@ -226,11 +226,12 @@ void Click(HWND handle) {
   if (!openDialog->frame.IsEnabled()) return;
   if (control->kind == WindowKind::kButton) {
     openDialog->focus = handle;
-    Command(control->id, 0, handle);
+    SendCommand(control->id, 0, handle);
   } else if (control->kind == WindowKind::kStatic && (control->style & kStaticNotify) != 0) {
-    Command(control->id, STN_CLICKED, handle);
+    SendCommand(control->id, STN_CLICKED, handle);
   } else if (control->kind == WindowKind::kEdit) {
     openDialog->focus = handle;
+    control->selectionStart = control->selectionEnd = control->text.size();
   }
 }
 
@@ -242,7 +243,7 @@ void PostClick(HWND control) {
 }
 
 void SendCancel() {
-  if (CanCancel()) Command(IDCANCEL, 0, CancelControl());
+  if (CanCancel()) SendCommand(IDCANCEL, 0, CancelControl());
 }
 
 void PostCancel() {
@@ -255,14 +256,20 @@ void PostCancel() {
   PostToQueue(message);
 }
 
-void TypeText(Window* edit, const std::string& text) {
+void TypeText(Window* edit, const std::string& text, size_t caret) {
   edit->text = text;
+  edit->selectionStart = edit->selectionEnd = caret;
   const HWND handle = edit->handle;
   // The first notice can renumber or destroy the field.
   for (const int notice : {kEditUpdate, kEditChange}) {
     const Window* const told = FindWindowByHandle(handle);
-    if (told != nullptr) Command(told->id, notice, handle);
+    if (told != nullptr) SendCommand(told->id, notice, handle);
   }
+}
+
+void SendCommand(int id, int notification, HWND control) {
+  const DWORD word = static_cast<WORD>(id) | static_cast<DWORD>(notification) << 16;
+  SendToDialog(WM_COMMAND, word, reinterpret_cast<LPARAM>(control));
 }
 
 INT_PTR RunDialog(const DialogTemplate& dialogTemplate, DLGPROC procedure, LPARAM data) {

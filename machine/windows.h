@@ -17,6 +17,14 @@ inline constexpr uint32_t kStaticTypeMask = 0x1F;
 
 enum class WindowKind { kDialog, kStatic, kEdit, kButton, kComboBox };
 
+// What was drawn on an owner-drawn control or entry. Colours are RRGGBB, or the word for one of the
+// system's that differs from PC to PC: "face", "highlight".
+struct Drawing {
+  std::vector<std::string> calls;  // in their order, as drawing.h has them
+  std::string colors;              // of the last text: "RRGGBB on RRGGBB"; "" for none
+  int picture = 0;                 // the last one's resource; 0 for none
+};
+
 struct Window {
   HWND handle = nullptr;
   WindowKind kind = WindowKind::kStatic;
@@ -27,11 +35,14 @@ struct Window {
   bool hasPicture = false;
   LONG width = 0;  // in pixels, as the height
   LONG height = 0;
+  HGDIOBJ font = nullptr;     // that the program gave it
+  size_t selectionStart = 0;  // in the text of an edit field; what is typed replaces the selection
+  size_t selectionEnd = 0;
   std::vector<ULONG_PTR> items;  // of an owner-drawn list: what the program gave for each
   int selection = -1;
-  UINT itemHeight = 0;               // of an owner-drawn list: as the program has measured it
-  bool needsDrawing = false;         // of an owner-drawn control
-  std::vector<std::string> drawing;  // the calls of its last drawing
+  UINT itemHeight = 0;        // of an owner-drawn list: as the program has measured it
+  bool needsDrawing = false;  // of an owner-drawn control
+  Drawing drawing;            // its last one
 
   bool IsShown() const { return (style & WS_VISIBLE) != 0; }
   bool IsEnabled() const { return (style & WS_DISABLED) == 0; }
@@ -48,10 +59,10 @@ struct Dialog {
   bool hasEnded = false;
   INT_PTR result = 0;
 
-  Window* Find(int id) const;         // the first control that bears the id now
-  Window* FindDefaultButton() const;  // the first button of that type
-  // The first control that the Tab key reaches; null for none.
-  HWND FirstTabStop() const;
+  Window* Find(int id) const;             // the first control that bears the id now
+  Window* FindDefaultButton() const;      // the first button of that type
+  std::vector<Window*> TabStops() const;  // the controls that the Tab key reaches now
+  HWND FirstTabStop() const;              // null for none
   // The control has been hidden or destroyed: Windows gives its focus to the dialog, which gives it
   // to the first control that the Tab key reaches.
   void TakeFocusFrom(HWND control);
@@ -69,6 +80,9 @@ INT_PTR SendToDialog(UINT message, WPARAM wParam, LPARAM lParam);
 // was posted, also with a private message of that number; here a program's posted messages are its
 // own.
 LRESULT HandleForDialog(UINT message, WPARAM wParam);
+inline constexpr UINT kGetDefaultId = 0x400;  // DM_GETDEFID
+// Takes the default button's looks from the button that has them to this one; null for none.
+void GiveDefaultLook(Window* button);
 
 // ---- Messages. First in, first out.
 
@@ -93,8 +107,10 @@ void PostClick(HWND control);
 // Command 2, also when no control bears that id.
 void SendCancel();
 void PostCancel();
-// Puts a text in an edit field, with its notices to the dialog.
-void TypeText(Window* edit, const std::string& text);
+// Puts a text in an edit field, the caret at this place in it, and tells the dialog of the change.
+void TypeText(Window* edit, const std::string& text, size_t caret = 0);
+// A control's notice to the dialog; 0 is a button's click.
+void SendCommand(int id, int notification, HWND control);
 
 // Runs a dialog to its end, and gives the result. -1 when one is open already, or for a control of
 // a class that is none of the four.

@@ -68,6 +68,7 @@ TEST_F(ScriptedUser, ScriptThatDoesNotFitTheRunEndsTheProcess) {
       {"press 11\n", "user.txt:1: press 11: no user could click"},
       {"press 12\n", "user.txt:1: press 12: no user could click"},
       {"type 11 text\n", "user.txt:1: type 11 text: no user could click"},
+      {"keyboard \"text\"\n", "user.txt:1: keyboard \"text\": nothing that takes the key has"},
       {"type 10 text\n", "user.txt:1: type 10 text: not an edit field"},
   };
   for (const auto& row : rows) EXPECT_EXIT(Play(row.script), ExitedWithCode(2), row.message);

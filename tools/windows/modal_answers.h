@@ -6,7 +6,7 @@
 #include <deque>
 #include <string>
 
-#include "tests/windows/dialog_view.h"
+#include "tools/windows/dialog_view.h"
 
 // A line of the user's script.
 struct Line {
@@ -19,6 +19,7 @@ struct ModalAnswers {
   std::deque<Line> answers;
   std::deque<Line> picks;
   std::deque<Line> pictures;  // to be taken of the next box; none need be left
+  bool showsBoxes = false;    // how they look, too
 
   // Takes a line that belongs here; false for any other.
   bool Take(const Line& line);

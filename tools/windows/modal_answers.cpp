@@ -1,12 +1,13 @@
-#include "tests/windows/modal_answers.h"
+#include "tools/windows/modal_answers.h"
 
 // After windows.h.
 #include <shlobj.h>
 
+#include <iterator>
 #include <vector>
 
-#include "tests/windows/driven_program.h"
-#include "tests/windows/foreign_process.h"
+#include "tools/windows/driven_program.h"
+#include "tools/windows/screen_pixels.h"
 
 namespace {
 
@@ -16,6 +17,14 @@ Line TakeFirst(std::deque<Line>* lines) {
   Line line = lines->front();
   lines->pop_front();
   return line;
+}
+
+// The prompt of a picker or the text of a box; the box's icon has none.
+std::wstring ReadStatic(HWND modal) {
+  for (const HWND child : ChildrenOf(modal)) {
+    if (ClassOf(child) == "Static" && !TextOf(child).empty()) return TextOf(child);
+  }
+  return L"";
 }
 
 void PressButton(HWND window, int id) {
@@ -45,49 +54,63 @@ BOOL CALLBACK FindTree(HWND window, LPARAM data) {
 // The picker takes the path from its own memory.
 void SelectFolder(HWND picker, const std::string& path) {
   const std::wstring text = Wide(path);
-  WithCopyIn(DrivenProcess().hProcess, text.c_str(), (text.size() + 1) * sizeof(wchar_t),
-             [picker](void* place) {
-               Ask(picker, BFFM_SETSELECTIONW, TRUE, reinterpret_cast<LPARAM>(place));
-             });
+  WithCopyInProgram(text.c_str(), (text.size() + 1) * sizeof(wchar_t), [picker](void* place) {
+    Ask(picker, BFFM_SETSELECTIONW, TRUE, reinterpret_cast<LPARAM>(place));
+  });
 }
 
 void AnswerPicker(HWND picker, std::deque<Line>* picks) {
   if (picks->empty()) Fail("no answer to the folder picker");
   const std::string pick = TakeFirst(picks).rest;
-  std::wstring prompt;
-  for (HWND child = GetWindow(picker, GW_CHILD); child != nullptr && prompt.empty();
-       child = GetWindow(child, GW_HWNDNEXT)) {
-    if (ClassOf(child) == "Static") prompt = TextOf(child);
-  }
-  Print("picker " + Quoted(prompt) + " " + pick);
+  Print("picker " + Quoted(ReadStatic(picker)) + " " + pick);
   if (pick != "none") SelectFolder(picker, pick);
   PressButton(picker, pick == "none" ? IDCANCEL : IDOK);
+}
+
+// "ICON BUTTONS default BUTTON", the buttons joined by hyphens.
+std::string DescribeLook(HWND box) {
+  constexpr const char* kNames[] = {"ok", "cancel", "abort", "retry", "ignore", "yes", "no"};
+  std::string icon = "none";
+  std::string buttons;
+  std::string standard = "none";
+  for (const HWND child : ChildrenOf(box)) {
+    const LONG style = GetWindowLongA(child, GWL_STYLE);
+    if (ClassOf(child) == "Static") {
+      if ((style & SS_TYPEMASK) == SS_ICON && Ask(child, STM_GETICON) != 0) icon = SeenIcon(child);
+      continue;
+    }
+    const auto index = static_cast<size_t>(GetDlgCtrlID(child) - IDOK);
+    const std::string name = index < std::size(kNames) ? kNames[index] : "other";
+    buttons += (buttons.empty() ? "" : "-") + name;
+    if ((style & BS_TYPEMASK) == BS_DEFPUSHBUTTON) standard = name;
+  }
+  return icon + " " + buttons + " default " + standard;
 }
 
 void AnswerBox(const ProgramWindows& windows, ModalAnswers* script) {
   const HWND box = windows.modal;
   if (!script->pictures.empty()) WaitForPicture(TakeFirst(&script->pictures).rest);
-  std::wstring text;
-  for (HWND child = GetWindow(box, GW_CHILD); child != nullptr;
-       child = GetWindow(child, GW_HWNDNEXT)) {
-    if (ClassOf(child) == "Static" && !TextOf(child).empty()) text = TextOf(child);
-  }
-  const std::string shown = "box " + Quoted(TextOf(box)) + " " + Quoted(text) + " ";
+  const std::string shown = "box " + Quoted(TextOf(box)) + " " + Quoted(ReadStatic(box)) + " ";
+  const auto tell = [&](const std::string& answer) {
+    Print(shown + answer);
+    if (script->showsBoxes) Print("box-look " + DescribeLook(box));
+  };
   if (GetDlgItem(box, IDYES) == nullptr) {
-    Print(shown + "ok");
+    tell("ok");
     PressButton(box, GetDlgItem(box, IDOK) != nullptr ? IDOK : IDCANCEL);
     return;
   }
   if (script->answers.empty()) Fail("no answer to " + shown);
   const Line answer = TakeFirst(&script->answers);
   if (answer.verb == "answer-late" && windows.dialog != nullptr) WaitForQuiet(windows.dialog);
-  Print(shown + answer.rest);
+  tell(answer.rest);
   PressButton(box, answer.rest == "yes" ? IDYES : IDNO);
 }
 
 }  // namespace
 
 bool ModalAnswers::Take(const Line& line) {
+  if (line.verb == "show-boxes") return showsBoxes = true;
   std::deque<Line>* const queue = line.verb == "answer" || line.verb == "answer-late" ? &answers
                                   : line.verb == "pick"                               ? &picks
                                   : line.verb == "picture-box"                        ? &pictures

@@ -3,9 +3,13 @@
 #pragma once
 
 #include <windows.h>
+// After windows.h.
+#include <string>
 
 // A click in the middle of the control's place. What lies there is found out when the program takes
 // the message: on a hidden or disabled control it has no effect.
 void Click(HWND control);
 
-void PressKey(WORD key);
+// With the Shift key held down or not.
+void PressKey(WORD key, bool isShifted = false);
+void TypeKeys(const std::wstring& text);

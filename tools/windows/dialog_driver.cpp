@@ -7,13 +7,13 @@
 // it is. OUTPUT is a file, made anew, in UTF-8; its last line is "exit code: N", or one that begins
 // with "failed: " when the script doesn't fit the run.
 //
-// "at-poll" is the stand-in's alone. A line that begins a step and the lines "...-during" behind it
-// reach the program's queue while its thread stands still, so that nothing comes between them.
-// "until-during TEXT" lets it run until the message area has this text: the pass has come so far,
-// and what follows meets its next polls. "until-file PATH" waits for a file that another program
-// writes. Three lines more are for tools/screenshots: "picture NAME"
-// prints itself and waits until the file OUTPUT.NAME is there; "picture-during NAME" does so at
-// once behind the line before it, "picture-box NAME" when the next box stands.
+// "at-poll" is the stand-in's alone, and of what "show-drawn" prints all but the "seen" lines. A
+// line that begins a step and the lines "...-during" behind it reach the program's queue while its
+// thread stands still, so that nothing comes between them. "until-during TEXT" lets it run until
+// the message area has this text: what follows meets the pass's next polls. "until-file PATH" waits
+// for a file that another program writes. Three lines more are for tools/screenshots: "picture
+// NAME" prints itself and waits until the file OUTPUT.NAME is there; "picture-during NAME" does so
+// at once behind the line before it, "picture-box NAME" when the next box stands.
 #include <windows.h>
 // After windows.h.
 #include <algorithm>
@@ -23,11 +23,11 @@
 #include <string>
 #include <vector>
 
-#include "tests/windows/dialog_view.h"
-#include "tests/windows/driven_program.h"
-#include "tests/windows/foreign_process.h"
-#include "tests/windows/modal_answers.h"
-#include "tests/windows/user_input.h"
+#include "tools/windows/dialog_view.h"
+#include "tools/windows/driven_program.h"
+#include "tools/windows/modal_answers.h"
+#include "tools/windows/screen_pixels.h"
+#include "tools/windows/user_input.h"
 
 namespace {
 
@@ -100,6 +100,27 @@ HWND Clickable(HWND dialog, const std::string& id) {
   return control;
 }
 
+void RequireFocusOn(HWND dialog, const char* className) {
+  const HWND focus = FocusOf(dialog);
+  if (focus == nullptr || ClassOf(focus) != className) {
+    Fail("nothing that takes the key has the focus");
+  }
+}
+
+void UseKeyboard(HWND dialog, const std::string& key) {
+  if (key.starts_with('"')) {
+    RequireFocusOn(dialog, "Edit");
+    TypeKeys(Wide(key.substr(1, key.size() - 2)));
+  } else if (key == "SPACE") {
+    RequireFocusOn(dialog, "Button");
+    PressKey(VK_SPACE);
+  } else if (key == "ENTER") {
+    PressKey(VK_RETURN);
+  } else {
+    PressKey(VK_TAB, key == "SHIFT+TAB");
+  }
+}
+
 void Act(HWND dialog, const Line& line) {
   if (line.verb == "press") {
     Click(Clickable(dialog, line.rest));
@@ -111,13 +132,19 @@ void Act(HWND dialog, const Line& line) {
     const HWND edit = Clickable(dialog, line.rest.substr(0, blank));
     Ask(edit, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(text.c_str()));
   } else if (line.verb == "load") {
-    LoadLibraryIn(DrivenProcess().hProcess, line.rest);
+    LoadLibraryInProgram(line.rest);
   } else if (line.verb == "escape" || line.verb == "escape-during") {
     PressKey(VK_ESCAPE);
   } else if (line.verb == "close" || line.verb == "close-during") {
     PostMessageA(dialog, WM_SYSCOMMAND, SC_CLOSE, 0);
   } else if (line.verb == "show") {
     Show(dialog, line.rest);
+  } else if (line.verb == "show-focus") {
+    Print(DescribeDialog(dialog).front());
+  } else if (line.verb == "show-drawn") {
+    for (const std::string& drawn : DescribeDrawn(dialog)) Print(drawn);
+  } else if (line.verb == "keyboard") {
+    UseKeyboard(dialog, line.rest);
   } else if (line.verb == "picture" || line.verb == "picture-during") {
     WaitForPicture(line.rest);
   } else if (line.verb == "until-during") {
@@ -198,7 +225,11 @@ std::string SkipWords(const char* text, int count) {
 int main(int argc, char** argv) {
   if (argc < 4 || !OpenReport(argv[2])) return 2;
   ReadScript(argv[1]);
-  if (!StartProgram(argv[3], SkipWords(GetCommandLineA(), 3))) Fail("can't start the program");
+  const auto isDrawn = [](const Line& line) { return line.verb == "show-drawn"; };
+  if (std::ranges::any_of(script, isDrawn)) ReadPictures(argv[3]);
+  if (!StartProgram(argv[3], SkipWords(GetCommandLineA(), 3))) {
+    Fail("can't start the program: " + std::to_string(GetLastError()));
+  }
   Play();
   Print("exit code: " + std::to_string(ExitCodeOfProgram()));
   return 0;

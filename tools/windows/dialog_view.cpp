@@ -1,4 +1,4 @@
-#include "tests/windows/dialog_view.h"
+#include "tools/windows/dialog_view.h"
 
 #include <iterator>
 
@@ -65,21 +65,33 @@ ProgramWindows FindWindows(DWORD processId) {
 std::vector<std::string> DescribeDialog(HWND dialog) {
   std::vector<std::string> lines(1);
   std::string defaultId = "none";
-  for (HWND control = GetWindow(dialog, GW_CHILD); control != nullptr;
-       control = GetWindow(control, GW_HWNDNEXT)) {
+  for (const HWND control : ChildrenOf(dialog)) {
     lines.push_back(DescribeControl(control));
     const bool isDefault = (GetWindowLongA(control, GWL_STYLE) & 0xF) == BS_DEFPUSHBUTTON;
     if (defaultId == "none" && isDefault && ClassOf(control) == "Button" && IsShown(control)) {
       defaultId = std::to_string(IdOf(control));
     }
   }
+  const HWND focus = FocusOf(dialog);
+  lines[0] = "dialog " + Quoted(TextOf(dialog)) + " focus " +
+             (focus != nullptr ? std::to_string(IdOf(focus)) : "none") + " default " + defaultId;
+  return lines;
+}
+
+std::vector<HWND> ChildrenOf(HWND window) {
+  std::vector<HWND> children;
+  for (HWND child = GetWindow(window, GW_CHILD); child != nullptr;
+       child = GetWindow(child, GW_HWNDNEXT)) {
+    children.push_back(child);
+  }
+  return children;
+}
+
+HWND FocusOf(HWND dialog) {
   GUITHREADINFO thread = {};
   thread.cbSize = sizeof thread;
   GetGUIThreadInfo(GetWindowThreadProcessId(dialog, nullptr), &thread);
-  const bool hasFocus = thread.hwndFocus != nullptr && GetParent(thread.hwndFocus) == dialog;
-  lines[0] = "dialog " + Quoted(TextOf(dialog)) + " focus " +
-             (hasFocus ? std::to_string(IdOf(thread.hwndFocus)) : "none") + " default " + defaultId;
-  return lines;
+  return GetParent(thread.hwndFocus) == dialog ? thread.hwndFocus : nullptr;
 }
 
 bool IsPage(HWND dialog) {

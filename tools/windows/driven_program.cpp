@@ -1,4 +1,4 @@
-#include "tests/windows/driven_program.h"
+#include "tools/windows/driven_program.h"
 
 #include <cstdio>
 #include <cstdlib>
@@ -30,8 +30,12 @@ void Fail(const std::string& what) {
   std::exit(1);
 }
 
+void LetDraw() {
+  Sleep(10 * kStepTime);
+}
+
 void WaitForPicture(const std::string& name) {
-  Sleep(10 * kStepTime);  // until all is drawn
+  LetDraw();
   Print("picture " + name);
   for (int look = 0; look < kMostLooks; ++look) {
     if (GetFileAttributesA((reportPath + "." + name).c_str()) != INVALID_FILE_ATTRIBUTES) return;
@@ -49,6 +53,26 @@ bool StartProgram(const char* path, std::string commandLine) {
 
 const PROCESS_INFORMATION& DrivenProcess() {
   return process;
+}
+
+void WithCopyInProgram(const void* bytes, size_t size, const std::function<void(void*)>& use) {
+  const HANDLE program = process.hProcess;
+  void* const place =
+      VirtualAllocEx(program, nullptr, size, MEM_COMMIT | MEM_RESERVE, PAGE_READWRITE);
+  WriteProcessMemory(program, place, bytes, size, nullptr);
+  use(place);
+  VirtualFreeEx(program, place, 0, MEM_RELEASE);
+}
+
+// kernel32 lies at the same address in all processes.
+void LoadLibraryInProgram(const std::string& name) {
+  WithCopyInProgram(name.c_str(), name.size() + 1, [](void* place) {
+    const auto load =
+        reinterpret_cast<LPTHREAD_START_ROUTINE>(reinterpret_cast<void*>(LoadLibraryA));
+    const HANDLE thread = CreateRemoteThread(process.hProcess, nullptr, 0, load, place, 0, nullptr);
+    WaitForSingleObject(thread, 10000);
+    CloseHandle(thread);
+  });
 }
 
 bool HasEnded() {

@@ -1,6 +1,19 @@
-#include "tests/windows/user_input.h"
+#include "tools/windows/user_input.h"
 
 #include <iterator>
+
+namespace {
+
+void SendKey(WORD key, WORD character, DWORD flags) {
+  INPUT input = {};
+  input.type = INPUT_KEYBOARD;
+  input.ki.wVk = key;
+  input.ki.wScan = character;
+  input.ki.dwFlags = flags;
+  SendInput(1, &input, sizeof input);
+}
+
+}  // namespace
 
 // A click of the pointer in the middle of the control's place. What lies there is found out when
 // the program takes the message; posted messages come first.
@@ -19,12 +32,16 @@ void Click(HWND control) {
   SendInput(std::size(inputs), inputs, sizeof inputs[0]);
 }
 
-void PressKey(WORD key) {
-  INPUT inputs[2] = {};
-  for (INPUT& input : inputs) {
-    input.type = INPUT_KEYBOARD;
-    input.ki.wVk = key;
+void PressKey(WORD key, bool isShifted) {
+  if (isShifted) SendKey(VK_SHIFT, 0, 0);
+  SendKey(key, 0, 0);
+  SendKey(key, 0, KEYEVENTF_KEYUP);
+  if (isShifted) SendKey(VK_SHIFT, 0, KEYEVENTF_KEYUP);
+}
+
+void TypeKeys(const std::wstring& text) {
+  for (const wchar_t character : text) {
+    SendKey(0, character, KEYEVENTF_UNICODE);
+    SendKey(0, character, KEYEVENTF_UNICODE | KEYEVENTF_KEYUP);
   }
-  inputs[1].ki.dwFlags = KEYEVENTF_KEYUP;
-  SendInput(std::size(inputs), inputs, sizeof inputs[0]);
 }

@@ -25,6 +25,11 @@ bool IsPage(HWND dialog);
 // What the message area says now; a running pass answers at its next poll.
 std::wstring ReadMessageArea(HWND dialog);
 
+std::vector<HWND> ChildrenOf(HWND window);
+
+// The control with the focus; null for none.
+HWND FocusOf(HWND dialog);
+
 bool IsShown(HWND control);
 std::wstring TextOf(HWND window);
 std::string ClassOf(HWND window);
