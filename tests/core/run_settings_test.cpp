@@ -66,6 +66,8 @@ TEST_F(RunSettings, ADirectoryHasToFitItsBuffer) {
   EXPECT_EQ(GetDefaultInstallDir(&context, nullptr, kNeeded), -1);
   EXPECT_EQ(ChooseLanguage(nullptr), StatusBadArgument);
   EXPECT_EQ(FindInstalledProduct(nullptr), StatusBadArgument);
+  context.currentLanguage = 50000;  // a language without rows has no default
+  EXPECT_EQ(ChooseInstallDir(&context, directory, kNeeded, nullptr), StatusBadDirectory);
 }
 
 TEST_F(RunSettings, FreeSpaceIsComparedIn64BitsAndStopsNothingWhenUnknown) {
