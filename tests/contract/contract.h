@@ -89,8 +89,9 @@ using Handler = std::function<INT_PTR(HWND dialog, UINT message, WPARAM wParam, 
 
 // The dialog's result.
 INT_PTR RunDialog(Handler handler);
-// Runs `check` in a dialog that stands, and ends it.
-void RunStanding(const std::function<void(HWND dialog)>& check);
+// Runs `check` in a dialog that stands, and ends it; the other one when the next step comes.
+using Check = std::function<void(HWND dialog)>;
+void RunStanding(const Check& check, const Check& atNextStep = nullptr);
 
 // ---- What the world does: under Wine this program, on the stand-in the script contract.user
 

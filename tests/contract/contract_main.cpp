@@ -116,8 +116,9 @@ INT_PTR RunDialog(Handler handler) {
                          CallHandler, kData);
 }
 
-void RunStanding(const std::function<void(HWND dialog)>& check) {
+void RunStanding(const Check& check, const Check& atNextStep) {
   const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
+    if (message == kNextStep && atNextStep) atNextStep(dialog);
     if (message != kStep) return FALSE;
     check(dialog);
     return EndDialog(dialog, 5);

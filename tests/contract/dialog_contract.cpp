@@ -150,8 +150,8 @@ CONTRACT(List, GivesBackWhatItWasGivenAndTellsOfEveryEntryThatGoes) {
               send(CB_GETCOUNT), send(CB_GETITEMDATA, 1), send(CB_SETCURSEL, 1), send(CB_GETCURSEL),
               send(CB_SETITEMDATA, 0, 5), send(CB_GETITEMDATA), send(CB_SETCURSEL, 0)},
              {0, 0, 1, 2, 900, 1, 1, TRUE, 5, 0});
-      Expect({send(CB_SETCURSEL, 2), send(CB_GETCURSEL), send(CB_GETITEMDATA, 2),
-              send(CB_GETITEMDATA, -1), send(CB_SETITEMDATA, 2, 5)},
+      Expect({send(CB_SETCURSEL, 2), send(CB_SETCURSEL, -1), send(CB_GETCURSEL),
+              send(CB_GETITEMDATA, 2), send(CB_GETITEMDATA, -1), send(CB_SETITEMDATA, 2, 5)},
              {CB_ERR});
       Expect({send(CB_SETCURSEL, 1), send(CB_RESETCONTENT), send(CB_GETCURSEL), send(CB_GETCOUNT),
               send(CB_ADDSTRING, 0, 7), SendMessageA(Item(11), CB_GETCOUNT, 0, 0)},

@@ -31,6 +31,11 @@ CONTRACT(Files, EachOpenerSharesWhatTheOtherDoes) {
     Expect({Opens(Open("c:/CONTRACT/Shared", row.access2, row.share2)), CloseHandle(first)},
            {row.isShared, TRUE}, std::to_string(&row - rows));
   }
+  // To cut a file is to write it, whatever the access asked for.
+  const HANDLE reader = Open(name, GENERIC_READ, kShareRead);
+  Expect({CreateFileA(name, GENERIC_READ, kShareBoth, nullptr, CREATE_ALWAYS, 0, nullptr),
+          CloseHandle(reader), ReadText(name)},
+         {INVALID_HANDLE_VALUE, TRUE, "x"});
   // Descriptors let everyone read and write, but not delete.
   const HANDLE exclusive = Open(name);
   Expect(

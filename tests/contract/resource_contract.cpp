@@ -28,8 +28,7 @@ CONTRACT(Strings, AreCutToTheBuffer) {
   };
   Expect({load(7, 16), load(7, 6), load(0x10007, 16), load(7, 5), load(7, 2), load(7, 1),
           load(8, 16), load(999, 16), load(999, 1), load(65535, 16)},
-         {"5 Moriv", "5 Moriv", "5 Moriv", "4 Mori", "1 M", "0 ", "0 ", "0 ", "0 ",
-          "0 "});
+         {"5 Moriv", "5 Moriv", "5 Moriv", "4 Mori", "1 M", "0 ", "0 ", "0 ", "0 ", "0 "});
 }
 
 CONTRACT(Versions, PathsNameTheirValues) {

@@ -120,6 +120,7 @@ TEST(Faults, StrikeTheNthCallOnceOrFromThenOn) {
   CloseHandle(file);
   EXPECT_EQ(pc.Read("drive_c/file"), "123451212345");
   EXPECT_EQ(machine::Stop(), "");
+  EXPECT_EQ(machine::CallCount("CloseHandle"), 0);
 }
 
 }  // namespace

@@ -89,12 +89,12 @@ TEST_F(ScriptedUser, ScriptThatDoesNotFitTheRunEndsTheProcess) {
 TEST_F(ScriptedUser, ShowQuotesTextsAndTellsOfAListWithoutAChoice) {
   Play("show\ntype 13 by \xC3\xA9 user \nshow 13\nescape\n",
        {Control("Static", 901, 0x50000000, "\"\xE9\"\r\n\\"),
-        Control("ComboBox", 918, kShownControl | kOwnerDrawnList), Control("Button", 907),
-        Control("Edit", 13)},
-       [](HWND dialog) { DestroyWindow(GetDlgItem(dialog, 907)); });
+        Control("Button", 907, kShownControl | WS_DISABLED),
+        Control("ComboBox", 918, kShownControl | kOwnerDrawnList), Control("Edit", 13)});
   EXPECT_EQ(shown,
             "dialog \"Title\" focus 918 default none\n"
             "901 Static shown enabled \"\\\"\xC3\xA9\\\"\\r\\n\\\\\"\n"
+            "907 Button shown disabled \"\"\n"
             "918 ComboBox shown enabled none\n13 Edit shown enabled \"\"\n"
             "13 Edit shown enabled \"by \xC3\xA9 user \"\n");
 }
