@@ -14,7 +14,6 @@ constexpr uint32_t kHiddenControl = kShownControl & ~uint32_t{WS_VISIBLE};
 
 class ScriptedUser : public DialogTest {
  protected:
-  ScriptedUser() { GTEST_FLAG_SET(death_test_style, "threadsafe"); }
   ~ScriptedUser() override { machine::ForgetUser(); }
 
   // Plays the script on a dialog that command 2 or 3 ends and whose button 10 asks a question;
