@@ -58,6 +58,9 @@ TEST_F(Expander, WidthsEndAt32) {
   EXPECT_EQ(Expand(CodeStream(widest).Put('b').Put(259).Codes()), "abab");
   EXPECT_EQ(Expand(CodeStream(widest).Put(0x80000061).Codes()), "a!");
   EXPECT_EQ(Expand(CodeStream(widest).Put(257).Codes()), "a!");
+  // The widest code that may lie anywhere in 32 bits: here the last ones of a block, to its end.
+  EXPECT_EQ(Expand(CodeStream().Put('a').PutTimes(257, 25 - 9).PutTimes('b', 7).Codes()),
+            "abbbbbbb");
 }
 
 TEST_F(Expander, TheTableTakesEntriesUpTo35022) {
