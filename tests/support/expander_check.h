@@ -29,7 +29,7 @@ inline std::string ExpandChecked(const TestMachine& pc, const std::vector<std::s
 
   StreamOracle oracle;
   const auto expander = std::make_unique<PkzFileExpander>(&file);
-  std::string written;
+  size_t writes = 0;
   bool isStruck = false;
   for (const std::string& block : blocks) {
     oracle.Take(block);
@@ -38,20 +38,21 @@ inline std::string ExpandChecked(const TestMachine& pc, const std::vector<std::s
     const auto struck = std::ranges::upper_bound(oracle.ends, failingWrite * kWrite);
     isStruck = failingWrite > 0 && struck != oracle.ends.end();
     const size_t taken = isStruck ? *struck : oracle.output.size();
-    const size_t writes = taken > 0 ? (taken - 1) / kWrite : 0;
-    written = oracle.output.substr(0, writes * kWrite);
-    if (isStruck) written.erase((failingWrite - 1) * kWrite, kWrite);
+    writes = taken > 0 ? (taken - 1) / kWrite : 0;
     EXPECT_EQ(expander->failed() != 0, isStruck || oracle.failed());
     EXPECT_EQ(machine::CallCount("WriteFile"), static_cast<int>(writes));
-    EXPECT_EQ(file.GetSize(), written.size());
+    EXPECT_EQ(file.GetSize(), (writes - (isStruck ? 1 : 0)) * kWrite);
     EXPECT_TRUE(isStruck || expander->bufferFill() == taken - writes * kWrite);
-    if (oracle.output.size() > kMostOutput) break;
+    if (oracle.output.size() > kMostOutput || testing::Test::HasFailure()) break;
   }
-  if (!isStruck) {
-    const bool isStruckAtTheEnd = failingWrite == written.size() / kWrite + 1;
+  std::string written = oracle.output.substr(0, writes * kWrite);
+  if (isStruck) {
+    written.erase((failingWrite - 1) * kWrite, kWrite);
+  } else {
     expander->Flush();
-    EXPECT_EQ(expander->failed() != 0, isStruckAtTheEnd || oracle.failed());
-    if (!isStruckAtTheEnd) written = oracle.output;
+    const bool isLastStruck = failingWrite == writes + 1;
+    EXPECT_EQ(expander->failed() != 0, isLastStruck || oracle.failed());
+    if (!isLastStruck) written = oracle.output;
   }
   machine::SetFaults({});
   EXPECT_EQ(file.Close(), 1);
