@@ -169,9 +169,8 @@ TEST_F(ScriptedUser, ControlsDrawThemselvesWhenTheyAreShownAndHaveChanged) {
         if (message == WM_DRAWITEM) draw(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam));
         if (message == WM_COMMAND && LOWORD(wParam) == 12) {
           EXPECT_EQ(machine::FindWindowByHandle(text)->drawing.calls,
-                    (std::vector<std::string>{
-                        "fill 1,2 30x40 brush 006400",
-                        "text \"caf\xC3\xA9\" 0,0 60x26 format 4 color FF0000 on FFFFFF"}));
+                    (std::vector<std::string>{"fill 1,2 30x40 006400",
+                                              "text \"caf\xC3\xA9\" 0,0 format 4 0000FF on face"}));
           SetWindowTextA(text, "changed");
           SetFocus(list);
           SendMessageA(list, CB_SETCURSEL, 0, 0);

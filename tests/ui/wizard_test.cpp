@@ -107,50 +107,6 @@ TEST_F(CatalogLookup, TextsAreCutToTheBufferAndRowsThatDoNotExistAreEmpty) {
   EXPECT_EQ(SystemLanguage(), kLanguageFrench);
 }
 
-std::string Join(const std::vector<std::string>& calls) {
-  std::string text;
-  for (const std::string& call : calls) text += (text.empty() ? "" : " ") + call + ';';
-  return text + '\n';
-}
-
-using Wizard = ProductTest;
-
-// The calls for the address, the label and each entry of the list, the last one with the focus.
-TEST_F(Wizard, DrawsItsAddressItsLabelAndItsLanguages) {
-  ImageBuilder().Write(&pc);
-  std::string drawn;
-  const auto lookAtControls = [&](const machine::Fault&) {
-    machine::Dialog& dialog = *machine::OpenDialog();
-    machine::Window& list = *dialog.Find(917);
-    for (const int id : {911, 918}) drawn += Join(dialog.Find(id)->drawing);
-    for (list.selection = 0; list.selection < 5; ++list.selection) {
-      if (list.selection == 4) dialog.focus = list.handle;
-      list.needsDrawing = true;
-      machine::DrawControls();
-      drawn += Join(list.drawing);
-    }
-    list.selection = -1;
-  };
-  machine::SetFaults({{.function = "MessageBoxA"}}, lookAtControls);
-  pc.Write("user.txt", "wait\nescape\n");
-  std::string error;
-  ASSERT_TRUE(machine::LoadUser(pc.Host("user.txt"), &error)) << error;
-  SetupRequest request = {};
-  request.language = kLanguageFrench;
-  EXPECT_EQ(RunSetup(request), StatusCancelled);
-  machine::EndUser();
-  machine::ForgetUser();
-  EXPECT_EQ(machine::CallCount("CreateFontA"), 3);
-  EXPECT_EQ(drawn, R"(text "www.moriv.example" 0,0 55x16 format 4 color FF0000 on FFFFFF;
-text "                              " 0,0 58x16 format 4 color 006400 on FFFFFF; text "Langue :" 0,0 58x16 format 4 color 006400 on FFFFFF;
-fill 0,0 99x17 brush FFFFFF; copy 2,1 26x15 bitmap 120; text "English" 31,0 68x17 format 36 color 006400 on FFFFFF;
-fill 0,0 99x17 brush FFFFFF; copy 2,1 26x15 bitmap 121; text "Francais" 31,0 68x17 format 36 color 006400 on FFFFFF;
-fill 0,0 99x17 brush FFFFFF; copy 2,1 26x15 bitmap 122; text "Deutsch" 31,0 68x17 format 36 color 006400 on FFFFFF;
-fill 0,0 99x17 brush FFFFFF; copy 2,1 26x15 bitmap 123; text "Italiano" 31,0 68x17 format 36 color 006400 on FFFFFF;
-fill 0,0 99x17 brush 6A240A; copy 2,1 26x15 bitmap 124; text "Español" 31,0 68x17 format 36 color FFFFFF on 6A240A; focus;
-)");
-}
-
 TEST(SideCommands, CharactersAreReplacedOrDropped) {
   char text[] = "a\"b\"\"c";
   EXPECT_EQ(RemoveCharacter(text, '"', '\0'), 1);

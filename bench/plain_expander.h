@@ -1,12 +1,11 @@
 // A plain decoder of the streams, step by step as the format is described: bits byte by byte, each
 // string built backwards and handed on by itself, output collected in pieces of 1024 bytes. The
-// program's expander has to answer as this one does, and is measured against it.
+// program's expander is measured against it.
 #pragma once
 
 #include <cstdint>
 #include <cstring>
 #include <memory>
-#include <string>
 
 class PlainExpander {
  public:
@@ -160,23 +159,4 @@ class PlainExpander {
   bool magicSeen_ = false;
   uint8_t buffer_[kBufferSize] = {};
   uint32_t bufferFill_ = 0;
-};
-
-// Keeps what is written. The n-th write fails, counted from 1; 0: none does.
-class RecordingPlainExpander : public PlainExpander {
- public:
-  explicit RecordingPlainExpander(int failingWrite = 0) : failingWrite_(failingWrite) {}
-
-  std::string output;
-  int writes = 0;
-
- protected:
-  uint32_t Write(const uint8_t* bytes, uint32_t count) override {
-    if (++writes == failingWrite_) return 0;
-    output.append(reinterpret_cast<const char*>(bytes), count);
-    return count;
-  }
-
- private:
-  int failingWrite_;
 };
