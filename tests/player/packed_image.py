@@ -1,29 +1,34 @@
 """Contents of files as scenarios write them, and setup images made of such files.
 
-`tools` is what images are made with: `stub` and `image_tool` are host paths of a program without a
-package and of the tool that packs one; `content(kind, name)` gives the bytes of a real file.
+`tools` is what images are made with (scenario_play.Tools).
 """
 
 import random
 import re
 import subprocess
 
+# The image that a scenario has unless it needs another one.
+USUAL_FILES = ['zebdial.exe = 5000 bytes -> %INSTALL_DIR%', 'zebnet.dll = 3000 bytes -> %INSTALL_DIR%']
+
 
 class PackedImage:
     """A setup image as a 'given image' section describes it, made with the image tool."""
 
-    def __init__(self, body, tools):
+    def __init__(self, body, tools, usual=True):
+        """usual: the body changes the usual image, a file of the same name takes the other's place."""
         self.tools = tools
         self.options = {'default_directory': "'C:\\Program Files\\Moriv'",
                         'default_language': '"french"'}
         self.flags = []       # of the image tool
         self.files = []       # (name, destination)
         self.contents = {}    # name -> bytes
+        own = {line.partition(' = ')[0] for line in body}
         for line in body:
-            if ' -> ' in line:
-                self._add_file(line)
-            else:
+            if ' -> ' not in line:
                 self._set_option(line)
+        for line in (USUAL_FILES if usual else []) + body:
+            if ' -> ' in line and (line in body or line.partition(' = ')[0] not in own):
+                self._add_file(line)
 
     def _add_file(self, line):
         words, _, destination = line.partition(' -> ')
@@ -65,10 +70,9 @@ def file_content(words, seed, tools):
     if re.fullmatch('".*"', words):
         return quoted_bytes(words)
     kind, _, name = words.partition(' ')
-    content = tools.content(kind, name)
-    if content is None:
+    if kind not in tools.folders:
         raise ValueError(f'no such content: {words}')
-    return content
+    return (tools.folders[kind] / name).read_bytes()
 
 
 def quoted_bytes(words):

@@ -1,7 +1,8 @@
 """The registry below HKEY_LOCAL_MACHINE as scenarios see it: REGEDIT4 text, and what a run changed.
 
-A text value (REG_SZ) with and without the NUL at its end is the same here: Windows itself counts a
-terminator that stands behind the length that it was given.
+A quoted text (REG_SZ) is one with the NUL at its end; behind one without it stands "unterminated". Where
+texts are not compared exactly both are the same: Windows itself counts a terminator that stands behind
+the length that it was given.
 """
 
 import re
@@ -9,6 +10,7 @@ from dataclasses import dataclass, field
 
 ROOT = 'HKEY_LOCAL_MACHINE'
 REG_SZ = 1
+UNTERMINATED = ' unterminated'
 
 
 class RegistryError(Exception):
@@ -21,28 +23,28 @@ class Value:
     type: int
     data: bytes
 
-    def same(self, other):
-        return other is not None and (self.type, self._bare()) == (other.type, other._bare())
-
-    def _bare(self):
+    def without_nul(self):
         if self.type == REG_SZ and self.data.endswith(b'\0'):
-            return self.data[:-1]
-        return self.data
+            return Value(self.name, self.type, self.data[:-1])
+        return self
 
-    def exact(self):
+    def line(self, exact=True):
+        """As scenarios have it; not exact: without a word on whether there is a NUL at the end."""
+        text = self.without_nul().data
+        if self.type != REG_SZ or any(byte < 0x20 for byte in text):
+            return self._hex(self.data if exact else text)
+        mark = UNTERMINATED if exact and text == self.data else ''
+        return f'{self._name()}={quote(text.decode("cp1252", "replace"))}{mark}'
+
+    def regedit(self):
         """As REGEDIT4 has it, to the byte: a quoted text stands for one with its NUL."""
-        return self._line(self.data, self.data.endswith(b'\0'))
+        return self.line() if self.data.endswith(b'\0') else self._hex(self.data)
 
-    def __str__(self):
-        """For a comparison: a text with and without its NUL look the same."""
-        return self._line(self._bare(), True)
+    def _name(self):
+        return quote(self.name) if self.name else '@'
 
-    def _line(self, data, terminated):
-        name = _quote(self.name) if self.name else '@'
-        text = self._bare()
-        if self.type == REG_SZ and terminated and not any(byte < 0x20 for byte in text):
-            return f'{name}={_quote(text.decode("cp1252", "replace"))}'
-        return f'{name}=hex({self.type:x}):{data.hex(",")}'
+    def _hex(self, data):
+        return f'{self._name()}=hex({self.type:x}):{data.hex(",")}'
 
 
 @dataclass
@@ -95,12 +97,12 @@ class Registry:
         """REGEDIT4 sections, one a key, parents first."""
         lines = []
         for key in self.keys.values():
-            values = [value.exact() for value in key.values.values()]
+            values = [value.regedit() for value in key.values.values()]
             lines += [f'[{ROOT}\\{key.path}]', *values, '']
         return lines
 
 
-def changes(before, after):
+def changes(before, after, exact):
     """What differs, as lines: '+ [KEY]', '- [KEY]' and '  [KEY]' for one that stays, and below a
     key that is new or stays its values with '+' and '-'. In the order of the keys' names."""
     lines = []
@@ -109,7 +111,7 @@ def changes(before, after):
         if new is None:
             lines.append(f'- [{old.path}]')
             continue
-        values = _value_changes(old.values if old else {}, new.values)
+        values = _value_changes(old.values if old else {}, new.values, exact)
         if old is None:
             lines.append(f'+ [{new.path}]')
         elif values:
@@ -118,16 +120,21 @@ def changes(before, after):
     return lines
 
 
-def _value_changes(old, new):
+def _value_changes(old, new, exact):
     lines = []
     for name in sorted(old.keys() | new.keys()):
-        was, now = old.get(name), new.get(name)
-        if not now or not now.same(was):
-            lines += [f'{sign} {value}' for sign, value in (('-', was), ('+', now)) if value]
+        was, now = (values[name].line(exact) if name in values else None for values in (old, new))
+        if was != now:
+            lines += [f'{sign} {line}' for sign, line in (('-', was), ('+', now)) if line]
     return lines
 
 
-def _quote(text):
+def inexact(line):
+    """A line of changes() without a word on the NUL at the end of a text."""
+    return re.sub(r'(=hex\(1\):.*),00$', r'\1', line.removesuffix(UNTERMINATED))
+
+
+def quote(text):
     return '"' + text.replace('\\', '\\\\').replace('"', '\\"') + '"'
 
 
@@ -139,7 +146,8 @@ def _below_root(path):
 
 
 _QUOTED = r'"((?:[^"\\]|\\.)*)"'
-_VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a-fA-F, ]*)|(-))$')
+_VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a-fA-F, ]*)|(-))'
+                    rf'({UNTERMINATED})?$')
 
 
 def _parse_value(line):
@@ -147,12 +155,13 @@ def _parse_value(line):
     match = _VALUE.match(line)
     if not match:
         raise RegistryError(f'not a registry value: {line}')
-    name, text, kind, data, deleted = match.groups()
+    name, text, kind, data, deleted, unterminated = match.groups()
     name = _unquote(name or '')
     if deleted:
         return name, None
     if text is not None:
-        return name, Value(name, REG_SZ, _unquote(text).encode('cp1252') + b'\0')
+        data = _unquote(text).encode('cp1252')
+        return name, Value(name, REG_SZ, data if unterminated else data + b'\0')
     return name, Value(name, int(kind, 16), bytes.fromhex(data.replace(',', ' ')))
 
 

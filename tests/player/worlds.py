@@ -78,6 +78,7 @@ class StandIn:
 
 class StandInMachine(Machine):
     tells_requests = True  # what the program asks of the system is shown
+    keeps_texts = True     # in the registry, with their NUL or without
 
     def __init__(self, folder, machine_tool):
         super().__init__(folder.with_suffix('.user'))
@@ -222,6 +223,7 @@ class Wine:
 
 class WineMachine(Machine):
     tells_requests = False
+    keeps_texts = False
 
     def __init__(self, world):
         super().__init__(Path(f'{world.prefix}.user'))
