@@ -2,10 +2,11 @@
 
 import contextlib
 import re
+from itertools import combinations
 
 import named_pages
 import registry_text
-from good_runs import DIRECTORY, INF, LANGUAGES, REMOVAL_PROGRAM, Checks, checks_of, number
+from good_runs import DIRECTORY, INF, LANGUAGES, REMOVAL_PROGRAM, VARIANTS, Checks, checks_of, number
 from package_image import ImageError
 
 LOG = r'C:\windows\MorivLog.txt'
@@ -19,7 +20,9 @@ def as_checks(player, found, action, before):
     if files.get(LOG, '-') != '-' and LOG not in texts:
         del files[LOG]
         log = _fatal_words(player.text_lines(LOG, found.files, True))[1:]
-    lines = [f'exit {found.exit_code or "none"}'] if action.keyword == 'run' and found.exit_code != 1 else []
+    lines = []
+    if action.keyword == 'run' and found.exit_code != 1:
+        lines.append(f'exit {"none" if found.exit_code is None else found.exit_code}')
     lines += _section('shown', _page_words([f'|{line}|' for line in found.shown]))
     for path in texts:
         has_heading = b'\r\n\r\nInstalling Moriv : ' in player.machine.files.read(path)
@@ -46,7 +49,8 @@ def _ways(player, actual, before):
         else:
             rest = Checks(_unless(log, actual.log), _unless(sorted(said.files), sorted(actual.files)),
                           _unless(said.registry, actual.registry))
-        yield [words, *_sections(rest, before.image)]
+        if not (rest.log and rest.files) or words.startswith(('reg', 'unreg')):
+            yield [words, *_sections(rest, before.image)]
 
 
 def _unless(said, actual):
@@ -58,14 +62,14 @@ def _words(player, log):
     """All that may fit."""
     language, directory = _settings(player)
     place = '' if directory == DIRECTORY else f' {directory}'
-    language = '' if language == 'French' else f' in {language}'
+    place += '' if language == 'French' else f' in {language}'
     folders = {match[1] for line in log if (match := re.search(r'Removing Directory :  (.*)\|', line))}
-    words = [f'{word}{place}{language}' for word in ('installed', 'registered')]
-    words += [f'{words}, older' for words in words]
+    words = [f'{word}{place}' for word in ('installed', 'registered')]
     words += [f'{word}{folder}' for word in ('removed', 'unregistered')
               for folder in ('', *(f' {folder}' for folder in sorted(folders)))]
-    return [word.replace(', older', '') + listed + ', older' * word.endswith(', older')
-            for word in words for listed in ('', ', listed')]
+    for count in range(len(VARIANTS)):
+        for variants in combinations(VARIANTS, count):
+            yield from (', '.join([word, *variants]) for word in words)
 
 
 def _settings(player):
@@ -120,10 +124,10 @@ def _file_line(player, path, sign):
 def _content_words(player, path):
     """Words for the file's content that a check takes."""
     content = player.machine.files.read(path)
-    tries = ['the INF file'] if path == INF else []
+    tries = ['the INF file'] if path.endswith('Moriv.INF') else []
     for image in sorted(player.packed, key=lambda image: image != player.last_image):
-        if path == REMOVAL_PROGRAM:
-            tries += [f'removal program of {image} in {name}' for name in ('French', *LANGUAGES)]
+        if path.endswith('MorivRmv.exe'):
+            tries += [f'removal program of {image} in {name}' for name in ('French', *LANGUAGES, '12345')]
         names = sorted(player.packed[image].contents, key=lambda name: not path.endswith(name))
         tries += [f'original {name} of {image}' for name in names]
         tries += [f'first {len(content)} bytes of {name}' for name in names]

@@ -65,3 +65,8 @@ def changes(before, after):
     signs |= {path: '+' for path in after.keys() - before.keys()}
     signs |= {path: '~' for path in before.keys() & after.keys() if before[path] != after[path]}
     return dict(sorted(signs.items()))
+
+
+def is_writable(stamp):
+    """Whether the file of a snapshot can be deleted."""
+    return stamp[3] & stat.S_IWUSR != 0

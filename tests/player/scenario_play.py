@@ -167,7 +167,8 @@ class _Player:
         return outcome
 
     def _compare(self, found, action, before):
-        texts = {c.argument or LOG: c.body for c in action.checks if c.keyword in ('log', 'text')}
+        texts = {c.argument or LOG: (['heading'] if c.keyword == 'log' and c.body else []) + c.body
+                 for c in action.checks if c.keyword in ('log', 'text')}
         others = {c.keyword: c for c in action.checks if c.keyword not in ('log', 'text')}
         if len(texts) + len(others) != len(action.checks):
             raise ValueError('two checks of the same thing')
@@ -182,7 +183,7 @@ class _Player:
                  if self.machine.tells_requests or not line.startswith(REQUESTS)]
         report += _difference('shown', shown, [f'|{line}|' for line in found.shown])
         for path, lines in texts.items():
-            expected = _whole_events(['heading', *lines] if path == LOG else lines)
+            expected = _whole_events(lines)
             report += _difference(path, expected,
                                   self.text_lines(path, found.files, 'heading' in expected))
         files = {path: sign for path, sign in found.files.items() if path not in texts}
@@ -197,12 +198,14 @@ class _Player:
         """Puts the checks of a word where the scenario has none of its own."""
         for check in action.checks:
             if check.keyword in WORDS:
-                words = checks_of(f'{check.keyword} {check.argument}'.strip(), before)
+                words = checks_of(f'{check.keyword} {check.argument}'.replace(' ,', ',').strip(), before)
                 ends = check.keyword in ('registered', 'unregistered')
-                log = _whole_events(texts.get(LOG, [])) if ends else []
+                log = _whole_events(texts.get(LOG, ['heading']) if ends else ['heading'])
                 log += number(words.log, 1 + _events(log))
                 files = (body.get('files', []) if ends else []) + words.files
                 texts[LOG] = log if ends else texts.get(LOG, log)
+                if not texts[LOG]:
+                    del texts[LOG]  # an empty section: the log was not written
                 body['files'] = files if ends else body.get('files', files)
                 body.setdefault('registry', words.registry)
 

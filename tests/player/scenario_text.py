@@ -15,7 +15,7 @@ CHECKS = ('exit', 'shown', 'log', 'text', 'files', 'registry', *WORDS)
 VERBATIM = ('shown', 'log', 'text')
 DEFAULT_IMAGE = r'C:\Setup.exe'
 
-_KEYWORD = re.compile(f'({"|".join(WORLDS + PREPARATIONS + ACTIONS + CHECKS)})(?:: |:?$| )(.*)')
+_KEYWORD = re.compile(f'({"|".join(WORLDS + PREPARATIONS + ACTIONS + CHECKS)})(?:: |:?$| |(?=,))(.*)')
 
 
 class ScenarioError(Exception):
