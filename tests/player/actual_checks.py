@@ -111,7 +111,7 @@ def _page_words(lines):
 def _fatal_words(lines):
     """Lines of a log with one word for the three of a fatal event."""
     text = '\n'.join(lines)
-    return re.sub(r'\|\d+- Fatal Error : (.*\S)\. \|\n\|\|\n\| \(Application will exit\)\|',
+    return re.sub(r'\|\d+- Fatal Error : (.*?\S) ?\. \|\n\|\|\n\| \(Application will exit\)\|',
                   r'fatal \1', text).split('\n') if lines else []
 
 

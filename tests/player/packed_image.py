@@ -26,7 +26,9 @@ class PackedImage:
         for line in body:
             if ' -> ' not in line:
                 self._set_option(line)
-        for line in (USUAL_FILES if usual else []) + body:
+        files = [re.sub(r'(\S+) = \d+ bytes', r'\1 = sample \1', line) if 'with versions' in body else line
+                 for line in USUAL_FILES]
+        for line in (files if usual else []) + body:
             if ' -> ' in line and (line in body or line.partition(' = ')[0] not in own):
                 self._add_file(line)
 
@@ -43,6 +45,8 @@ class PackedImage:
             self.options[name.replace(' ', '_')] = quote[name] + value + quote[name]
         elif line == 'allow unknown macros':
             self.flags.append('--allow-unknown-macros')
+        elif line == 'with versions':
+            pass  # the usual files as programs with version resources
         else:
             raise ValueError(f'no such line of an image: {line}')
 

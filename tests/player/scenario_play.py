@@ -2,6 +2,7 @@
 
 import difflib
 import re
+import shutil
 from collections import namedtuple
 from datetime import datetime, timedelta
 from os.path import commonprefix
@@ -10,6 +11,7 @@ import file_tree
 import named_pages
 import registry_text
 from actual_checks import as_checks
+from explained_log import misunderstood
 from good_runs import LANGUAGES, Before, checks_of, number
 from package_image import Image, ImageError, damage
 from packed_image import PackedImage, file_content, quoted_bytes
@@ -43,9 +45,18 @@ class ScenarioFailure(Exception):
 def play(scenario, machine, tools, accept=False):
     """Raises ScenarioFailure, or ScenarioError for a scenario that can't be carried out. accept: the
     failure tells for each action that did not hold the checks that do, and all actions are played."""
-    player = _Player(machine, tools, tools.images / scenario.name)
+    folder = tools.images / scenario.name
+    shutil.rmtree(folder, ignore_errors=True)
+    failures = _play(scenario, _Player(machine, tools, folder), accept)
+    shutil.rmtree(folder)
+    if failures:
+        raise ScenarioFailure('\n'.join(failures))
+
+
+def _play(scenario, player, accept):
+    """What failed, an action each."""
     if not any(section.keyword == 'given image' for section in scenario.sections):
-        player.place_image(DEFAULT_IMAGE, PackedImage([], tools))
+        player.place_image(DEFAULT_IMAGE, PackedImage([], player.tools))
     failures = []
     for section in scenario.sections:
         try:
@@ -58,8 +69,7 @@ def play(scenario, machine, tools, accept=False):
             raise ScenarioError(f'{section.place}: {type(error).__name__}: {error}') from error
         if failures and not accept:
             break
-    if failures:
-        raise ScenarioFailure('\n'.join(failures))
+    return failures
 
 
 class _Player:
@@ -119,7 +129,8 @@ class _Player:
         """A run that other scenarios look at closely; here it has to succeed, no more."""
         outcome = self._run(section)
         if outcome.exit_code != 1 or outcome.trouble:
-            raise ValueError(f'exit code {outcome.exit_code} {outcome.trouble}')
+            raise ScenarioFailure(f'{section.place}: a given run ends with {outcome.exit_code} '
+                                  f'{outcome.trouble}')
 
     def _damage(self, section):
         path = section.argument or DEFAULT_IMAGE
@@ -153,6 +164,8 @@ class _Player:
         packed = self.packed.get(self.last_image)
         before = Before(files, registry, self.last_image, packed.files if packed else [], dialog, exact)
         report += self._compare(found, section, before)
+        if section.keyword == 'run' and not dialog and code is not None and found.files.get(LOG, '-') != '-':
+            report += misunderstood(self.tools.image_tool, self.machine.files.host(LOG), code)
         if report and accept:
             return as_checks(self, found, section, before)
         return report
@@ -310,8 +323,10 @@ def _whole_events(lines):
     whole = []
     for line in lines:
         if line.startswith('fatal '):
-            fatal = f'Fatal Error : {line.removeprefix("fatal ")}. '
-            whole += [*number([fatal], 1 + _events(whole)), '||', '| (Application will exit)|']
+            text = line.removeprefix('fatal ')
+            blank = '' if ' :' in text else ' '  # without a detail
+            whole += number([f'Fatal Error : {text}{blank}. '], 1 + _events(whole))
+            whole += ['||', '| (Application will exit)|']
         else:
             whole.append(line)
     return whole

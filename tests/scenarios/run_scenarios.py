@@ -15,7 +15,7 @@ import pytest
 sys.dont_write_bytecode = True  # before the modules of the player
 HERE = Path(__file__).resolve().parent
 sys.path.insert(0, str(HERE.parent / 'player'))
-OPTIONS = ['-p', 'player_plugin', '-p', 'no:cacheprovider', '--rootdir', str(HERE),
+OPTIONS = ['-p', 'player_plugin', '-p', 'no:cacheprovider', '--rootdir', str(HERE.parent),
            '-o', 'python_files=*_test.py', '-q', '--tb=short', '-rfEs']
 
 if __name__ == '__main__':
