@@ -27,7 +27,7 @@ def pytest_addoption(parser):
     for build in ('native', 'win32', 'win64'):
         group.addoption(f'--{build}', type=Path, default=ROOT / 'build' / build,
                         help=f'folder of the {build} build')
-    group.addoption('--work', type=Path, default=ROOT / 'build' / 'native' / 'scenarios',
+    group.addoption('--work', type=Path, default=ROOT / 'build' / 'scenarios',
                     help='folder for machines and images')
     group.addoption('--wine', type=Path, default=ROOT / 'build' / 'wine',
                     help='folder for Wine prefixes')
@@ -129,9 +129,9 @@ class Player:
     def __init__(self, options):
         self.options = options
         self.world = _make_world(options)
-        self.tools = Tools(self.world.stub, options.native / 'moriv-image',
-                           {'sample': options.win32 / 'samples', 'real': options.work / 'libraries'},
-                           options.work / f'{self.world.name}-images')
+        images = options.work / f'{self.world.name}-images'
+        kinds = {'sample': options.win32 / 'samples', 'real': images.with_name(f'{images.name}-real')}
+        self.tools = Tools(self.world.stub, options.native / 'moriv-image', kinds, images)
         self.pool = None
         self.is_open = False
 
