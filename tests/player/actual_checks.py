@@ -4,9 +4,10 @@ import contextlib
 import re
 from itertools import combinations
 
+import log_text
 import named_pages
 import registry_text
-from good_runs import DIRECTORY, INF, LANGUAGES, REMOVAL_PROGRAM, VARIANTS, Checks, checks_of, number
+from good_runs import DIRECTORY, INF, LANGUAGES, REMOVAL_PROGRAM, VARIANTS, Checks, checks_of
 from package_image import ImageError
 
 LOG = r'C:\windows\MorivLog.txt'
@@ -19,14 +20,14 @@ def as_checks(player, found, action, before):
     log = []
     if files.get(LOG, '-') != '-' and LOG not in texts:
         del files[LOG]
-        log = _fatal_words(player.text_lines(LOG, found.files, True))[1:]
+        log = log_text.with_words(player.text_lines(LOG, found.files, True))[1:]
     lines = []
     if action.keyword == 'run' and found.exit_code != 1:
         lines.append(f'exit {"none" if found.exit_code is None else found.exit_code}')
-    lines += _section('shown', _page_words([f'|{line}|' for line in found.shown]))
+    lines += _section('shown', named_pages.with_words([f'|{line}|' for line in found.shown]))
     for path in texts:
         has_heading = b'\r\n\r\nInstalling Moriv : ' in player.machine.files.read(path)
-        lines += _section(f'text {path}', _fatal_words(player.text_lines(path, found.files, has_heading)))
+        lines += _section(f'text {path}', log_text.with_words(player.text_lines(path, found.files, has_heading)))
     actual = Checks(log, [_file_line(player, path, sign) for path, sign in files.items()], found.registry)
     return lines + min(_ways(player, actual, before), key=len)
 
@@ -39,9 +40,9 @@ def _ways(player, actual, before):
             said = checks_of(words, before)
         except ValueError:
             continue
-        log = number(said.log)
+        log = log_text.number(said.log)
         if words.startswith(('registered', 'unregistered')):
-            log = number(said.log, _count_events(actual.log) - len(said.log) + 1)
+            log = log_text.number(said.log, log_text.count_events(actual.log) - len(said.log) + 1)
             if actual.log[-len(log):] != log or not set(said.files) <= set(actual.files):
                 continue
             rest = Checks(actual.log[:-len(log)], [f for f in actual.files if f not in said.files],
@@ -91,30 +92,6 @@ def _section(name, body):
     return [name, *('  ' + line for line in body if line)] if body else []
 
 
-def _count_events(log):
-    return len([line for line in log if re.match(r'\|\d+- |fatal ', line)])
-
-
-def _page_words(lines):
-    """Shown lines with the names of pages in place of their lines."""
-    said, block = [], []
-    for line in [*lines, '']:
-        if block and re.match(r'\|\d+ (Static|Edit|Button|ComboBox) ', line) and len(block) < 16:
-            block.append(line)
-            continue
-        said += named_pages.shortest(block) if len(block) > 1 else block
-        block = [line] if line.startswith('|dialog ') else []
-        said += [line] if line and not block else []
-    return said
-
-
-def _fatal_words(lines):
-    """Lines of a log with one word for the three of a fatal event."""
-    text = '\n'.join(lines)
-    return re.sub(r'\|\d+- Fatal Error : (.*?\S) ?\. \|\n\|\|\n\| \(Application will exit\)\|',
-                  r'fatal \1', text).split('\n') if lines else []
-
-
 def _file_line(player, path, sign):
     if sign == '-' or path.endswith('\\'):
         return f'{sign} {path}'
@@ -127,7 +104,7 @@ def _content_words(player, path):
     tries = ['the INF file'] if path.endswith('Moriv.INF') else []
     for image in sorted(player.packed, key=lambda image: image != player.last_image):
         if path.endswith('MorivRmv.exe'):
-            tries += [f'removal program of {image} in {name}' for name in ('French', *LANGUAGES, '12345')]
+            tries += [f'removal program of {image} in {name}' for name in LANGUAGES]
         names = sorted(player.packed[image].contents, key=lambda name: not path.endswith(name))
         tries += [f'original {name} of {image}' for name in names]
         tries += [f'first {len(content)} bytes of {name}' for name in names]

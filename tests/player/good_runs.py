@@ -65,11 +65,6 @@ def checks_of(words, before):
     return Checks(head[0] + tail.log, head[1] + tail.files, tail.registry)
 
 
-def number(events, first=1):
-    """Lines of a log."""
-    return [f'|{place}- {event}|' for place, event in enumerate(events, first)]
-
-
 def _targets(packed, directory):
     """Name, directory and path of each target of each file."""
     targets = []
@@ -130,7 +125,8 @@ def _registration(before, directory, language, variants):
         events.append(f'Error installing Uninstall file {REMOVAL_PROGRAM}. (Warning)')
     else:
         events.append(f'Uninstall file is installed correctly :  {REMOVAL_PROGRAM}')
-        files.append(f'{_written(REMOVAL_PROGRAM, before)} = removal program of {before.image} in {language}')
+        files.append(f'{_written(REMOVAL_PROGRAM, before)} = '
+                     f'removal program of {before.image} in {language}')
     if 'listed' in variants:
         lines += [f'[{ENTRY}]', f'"DisplayName"="{LANGUAGES[language].tag}ZEB Machine virtuelle Moriv"',
                   f'"UninstallString"={registry_text.quote(REMOVAL_PROGRAM)}']

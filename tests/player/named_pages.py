@@ -24,8 +24,33 @@ def page(words, changes=()):
     return _changed([_in_language(line, language) for line in PAGES[name]], changes)
 
 
-def shortest(lines):
-    """The shortest way to say what "show" has printed."""
+def without_words(lines):
+    """Shown lines, with those of a page in place of its name and its changes, which are indented."""
+    whole, changes = [], []
+    for line in reversed(lines):
+        if line.startswith('  '):
+            changes.insert(0, line[2:])
+        elif line.startswith('page '):
+            whole[:0], changes = page(line.removeprefix('page '), changes), []
+        else:
+            whole.insert(0, line)
+    return whole
+
+
+def with_words(lines):
+    """Shown lines, with what "show" has printed said in the shortest way."""
+    said, block = [], []
+    for line in [*lines, '']:
+        if block and re.match(r'\|\d+ (Static|Edit|Button|ComboBox) ', line) and len(block) < 16:
+            block.append(line)
+            continue
+        said += _shortest(block) if len(block) > 1 else block
+        block = [line] if line.startswith('|dialog ') else []
+        said += [line] if line and not block else []
+    return said
+
+
+def _shortest(lines):
     ways = [[f'page {words}', *changes] for name in PAGES for language in LANGUAGES
             for words in [name if language == 'French' else f'{name} in {language}']
             if (changes := _changes(page(words), lines)) is not None]

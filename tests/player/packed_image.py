@@ -26,10 +26,13 @@ class PackedImage:
         for line in body:
             if ' -> ' not in line:
                 self._set_option(line)
-        files = [re.sub(r'(\S+) = \d+ bytes', r'\1 = sample \1', line) if 'with versions' in body else line
-                 for line in USUAL_FILES]
-        for line in (files if usual else []) + body:
-            if ' -> ' in line and (line in body or line.partition(' = ')[0] not in own):
+        for line in USUAL_FILES if usual else []:
+            if 'with versions' in body:
+                line = re.sub(r'(\S+) = \d+ bytes', r'\1 = sample \1', line)
+            if line.partition(' = ')[0] not in own:
+                self._add_file(line)
+        for line in body:
+            if ' -> ' in line:
                 self._add_file(line)
 
     def _add_file(self, line):

@@ -15,14 +15,6 @@ run /s /r
 installed, listed
 run C:\windows\MorivRmv.exe /s /r
 removed, listed
-restart
-files
-  - C:\windows\MorivRmv.exe
-  - C:\windows\MorivLog.txt
-  - C:\windows\Moriv.INF
-registry
-    [SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce]
-  - "MorivCommand"="C:\\windows\\system32\\rundll32.exe setupapi.dll,InstallHinfSection Uninstall 132 C:\\windows\\Moriv.INF"
 """
 
 

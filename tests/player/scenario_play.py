@@ -4,15 +4,16 @@ import difflib
 import re
 import shutil
 from collections import namedtuple
-from datetime import datetime, timedelta
+from datetime import datetime
 from os.path import commonprefix
 
 import file_tree
+import log_text
 import named_pages
 import registry_text
 from actual_checks import as_checks
 from explained_log import misunderstood
-from good_runs import LANGUAGES, Before, checks_of, number
+from good_runs import LANGUAGES, Before, checks_of
 from package_image import Image, ImageError, damage
 from packed_image import PackedImage, file_content, quoted_bytes
 from registry_text import RegistryError
@@ -164,7 +165,8 @@ class _Player:
         packed = self.packed.get(self.last_image)
         before = Before(files, registry, self.last_image, packed.files if packed else [], dialog, exact)
         report += self._compare(found, section, before)
-        if section.keyword == 'run' and not dialog and code is not None and found.files.get(LOG, '-') != '-':
+        has_log = found.files.get(LOG, '-') != '-'
+        if section.keyword == 'run' and has_log and not dialog:
             report += misunderstood(self.tools.image_tool, self.machine.files.host(LOG), code)
         if report and accept:
             return as_checks(self, found, section, before)
@@ -176,7 +178,8 @@ class _Player:
             self.last_image = program
         begun = datetime.now()
         outcome = self.machine.run(program, arguments)
-        self.times, self.has_user = (begun, datetime.now()), False
+        self.times = (self.now or begun, self.now or datetime.now())
+        self.has_user = False
         return outcome
 
     def _compare(self, found, action, before):
@@ -194,11 +197,11 @@ class _Player:
             actual = 'none' if found.exit_code is None else str(found.exit_code)
             expected = others['exit'].argument if 'exit' in others else '1'
             report += _difference('exit code', [expected], [actual])
-        shown = [line for line in _whole_pages(body.get('shown', []))
+        shown = [line for line in named_pages.without_words(body.get('shown', []))
                  if self.machine.tells_requests or not line.startswith(REQUESTS)]
         report += _difference('shown', shown, [f'|{line}|' for line in found.shown])
         for path, lines in texts.items():
-            expected = _whole_events(lines)
+            expected = log_text.without_words(lines)
             report += _difference(path, expected,
                                   self.text_lines(path, found.files, 'heading' in expected))
         files = {path: sign for path, sign in found.files.items() if path not in texts}
@@ -212,8 +215,8 @@ class _Player:
             if check.keyword in WORDS:
                 words = checks_of(f'{check.keyword} {check.argument}'.replace(' ,', ',').strip(), before)
                 ends = check.keyword in ('registered', 'unregistered')
-                log = _whole_events(texts.get(LOG, ['heading']) if ends else ['heading'])
-                log += number(words.log, 1 + _events(log))
+                log = log_text.without_words(texts.get(LOG, ['heading']) if ends else ['heading'])
+                log += log_text.number(words.log, 1 + log_text.count_events(log))
                 files = (body.get('files', []) if ends else []) + words.files
                 texts[LOG] = log if ends else texts.get(LOG, log)
                 if not texts[LOG]:
@@ -227,24 +230,7 @@ class _Player:
         if changed.get(path) not in ('+', '~'):
             return [f'(the run did not write {path})']
         text = self.machine.files.read(path).decode('cp1252', 'replace')
-        lines = []
-        parts = re.split(r'\r\n\r\nInstalling Moriv : (.*?) \r\n\r\n', text) if headings else [text]
-        for place, part in enumerate(parts):
-            if place % 2 == 1:
-                lines.append(self._heading_line(part))
-            elif part:
-                lines += [f'|{line}|' for line in part.split('\r\n')]
-                # What stands behind the last line end: nothing, as it should be.
-                if lines.pop() != '||':
-                    lines.append(f'|{part.split(chr(10))[-1]}| without a line end')
-        return lines
-
-    def _heading_line(self, stamp):
-        """'heading' if the time is that of a run, else what it is."""
-        begun, ended = (self.now, self.now) if self.now else self.times
-        good = {(begun + timedelta(seconds=later)).strftime('%A, %d %B %Y at : %Hh %Mm %Ss')
-                for later in range(int((ended - begun).total_seconds()) + 2)}
-        return 'heading' if stamp in good else f'heading with the time "{stamp}"'
+        return log_text.text_lines(text, self.times if headings else None)
 
     def _compare_files(self, lines, found):
         actual = []
@@ -297,38 +283,6 @@ def _program_and_arguments(text):
         return DEFAULT_IMAGE, text
     program, _, arguments = text.partition(' ')
     return program, arguments
-
-
-def _whole_pages(lines):
-    """The lines shown, with all lines of a page in place of its name."""
-    whole = []
-    while lines:
-        line, lines = lines[0], lines[1:]
-        changes = 0
-        while line.startswith('page ') and lines[changes:] and lines[changes].startswith('  '):
-            changes += 1
-        is_page = line.startswith('page ')
-        whole += named_pages.page(line[5:], [c.strip() for c in lines[:changes]]) if is_page else [line]
-        lines = lines[changes:]
-    return whole
-
-
-def _events(lines):
-    return sum(bool(re.match(r'\|\d+- ', line)) for line in lines)
-
-
-def _whole_events(lines):
-    """The lines of a log, with the three of a fatal event in place of its word."""
-    whole = []
-    for line in lines:
-        if line.startswith('fatal '):
-            text = line.removeprefix('fatal ')
-            blank = '' if ' :' in text else ' '  # without a detail
-            whole += number([f'Fatal Error : {text}{blank}. '], 1 + _events(whole))
-            whole += ['||', '| (Application will exit)|']
-        else:
-            whole.append(line)
-    return whole
 
 
 def _split_file_line(line):

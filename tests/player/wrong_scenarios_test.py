@@ -46,7 +46,8 @@ MALFORMED = [
     ('only stand-in:\nrun\n', ''), ('run\nonly stand-in: too late\n', 2),
     ('run\nlog\n  no bars\n', 3), ('run\nfile\n', 2), ('each\n  a | b\n  1\nrun {a}\n', 3),
     ('each\n  a\n  1\nrun {b}\n', 4), ('damage C:\\a.exe\n  no records\nrun\n', 1),
-    ('damage\n  no such damage\nrun\n', 1), ('run\ninstalled in Latin\n', 1), ('run\nshown\n  page x\n', 1),
+    ('damage\n  no such damage\nrun\n', 1), ('run\ninstalled in Latin\n', 1),
+    ('run\nshown\n  page x\n', 1),
 ]
 
 
@@ -83,8 +84,9 @@ def test_malformed(play_text, text, line):
         play_text(text)
 
 
-@pytest.mark.parametrize('name', ['dialog_removal_page', 'power_lost_in_an_install', 'plug_in_with_a_tail',
-                                  'dialog_services_remain_at_set_up', 'dialog_cancel_in_a_long_stream'])
+@pytest.mark.parametrize('name', ['dialog_removal_page', 'power_lost_in_an_install',
+                                  'plug_in_with_a_tail', 'dialog_services_remain_at_set_up',
+                                  'dialog_cancel_in_a_long_stream'])
 def test_accepted(play_text, name):
     """Without its checks a scenario fails, and what the failure prints are checks that hold."""
     kept, is_check = [], False
