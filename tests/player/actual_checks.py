@@ -27,8 +27,10 @@ def as_checks(player, found, action, before):
     lines += _section('shown', named_pages.with_words([f'|{line}|' for line in found.shown]))
     for path in texts:
         has_heading = b'\r\n\r\nInstalling Moriv : ' in player.machine.files.read(path)
-        lines += _section(f'text {path}', log_text.with_words(player.text_lines(path, found.files, has_heading)))
-    actual = Checks(log, [_file_line(player, path, sign) for path, sign in files.items()], found.registry)
+        text = log_text.with_words(player.text_lines(path, found.files, has_heading))
+        lines += _section(f'text {path}', text)
+    file_lines = [_file_line(player, path, sign) for path, sign in files.items()]
+    actual = Checks(log, file_lines, found.registry)
     return lines + min(_ways(player, actual, before), key=len)
 
 
@@ -85,7 +87,8 @@ def _settings(player):
 def _sections(checks, image):
     """Brief: without the image's name, and without French."""
     files = [re.sub(' in French$', '', line.replace(f' of {image}', '')) for line in checks.files]
-    return _section('log', checks.log) + _section('files', files) + _section('registry', checks.registry)
+    return [*_section('log', checks.log), *_section('files', files),
+            *_section('registry', checks.registry)]
 
 
 def _section(name, body):

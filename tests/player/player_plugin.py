@@ -14,6 +14,7 @@ from worlds import StandIn, Wine, WorldError, require
 ROOT = Path(__file__).resolve().parent.parent.parent
 SCENARIOS = ROOT / 'tests' / 'scenarios'
 PROGRAMS = ROOT / 'tests' / 'player'
+BUILD = ROOT / 'build'
 LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
 
 
@@ -24,13 +25,8 @@ def pytest_addoption(parser):
                     help='end at the first failure')
     group.addoption('--accept', action='store_true',
                     help='print what a run does in the form of checks, where its checks do not hold')
-    for build in ('native', 'win32', 'win64'):
-        group.addoption(f'--{build}', type=Path, default=ROOT / 'build' / build,
-                        help=f'folder of the {build} build')
-    group.addoption('--work', type=Path, default=ROOT / 'build' / 'scenarios',
-                    help='folder for machines and images')
-    group.addoption('--wine', type=Path, default=ROOT / 'build' / 'wine',
-                    help='folder for Wine prefixes')
+    group.addoption('--native', type=Path, default=BUILD / 'native', help='the native build')
+    group.addoption('--wine', type=Path, default=BUILD / 'wine', help='folder for Wine prefixes')
 
 
 def pytest_configure(config):
@@ -128,9 +124,10 @@ class Player:
 
     def __init__(self, options):
         self.options = options
-        self.world = _make_world(options)
-        images = options.work / f'{self.world.name}-images'
-        kinds = {'sample': options.win32 / 'samples', 'real': images.with_name(f'{images.name}-real')}
+        self.work = options.native / 'scenarios'
+        self.world = self._make_world()
+        images = self.work / f'{self.world.name}-images'
+        kinds = {'sample': BUILD / 'win32' / 'samples', 'real': images.with_name(f'{images.name}-real')}
         self.tools = Tools(self.world.stub, options.native / 'moriv-image', kinds, images)
         self.pool = None
         self.is_open = False
@@ -159,8 +156,8 @@ class Player:
         """Prints the closing line, and keeps it for tools/test, which tells all worlds' at its end."""
         line = f'scenarios: {self.world.name}: {line}'
         print(line)
-        self.options.work.mkdir(parents=True, exist_ok=True)
-        (self.options.work / f'scenarios.{self.world.name}.count').write_text(line + '\n')
+        self.work.mkdir(parents=True, exist_ok=True)
+        (self.work / f'scenarios.{self.world.name}.count').write_text(line + '\n')
 
     def can_play(self, scenario):
         return self.world.name.lower().startswith(scenario.only.lower())
@@ -174,10 +171,9 @@ class Player:
             raise type(failure)(f'{failure}{machine.keep()}') from failure
         machine.discard()
 
-
-def _make_world(options):
-    if options.world == 'stand-in':
-        return StandIn(options.native, options.work / 'stand-in')
-    bits = int(options.world.removeprefix('wine'))
-    return Wine(bits, getattr(options, f'win{bits}'), ROOT / 'tools' / 'wine',
-                options.wine / f'scenarios{bits}')
+    def _make_world(self):
+        if self.options.world == 'stand-in':
+            return StandIn(self.options.native, self.work / 'stand-in')
+        bits = int(self.options.world.removeprefix('wine'))
+        return Wine(bits, BUILD / f'win{bits}', ROOT / 'tools' / 'wine',
+                    self.options.wine / f'scenarios{bits}')

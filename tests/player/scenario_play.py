@@ -83,7 +83,6 @@ class _Player:
         self.last_image = DEFAULT_IMAGE  # that has run
         self.now = None       # the machine's own time, when it is set
         self.times = ()       # of the last run: before and after it
-        self.has_user = False
 
     # Preparations
 
@@ -98,7 +97,6 @@ class _Player:
 
     def _given_user(self, section):
         self.machine.user(section.body)
-        self.has_user = True
 
     def _given_files(self, section):
         for line in section.body:
@@ -152,7 +150,7 @@ class _Player:
     def act(self, section, accept):
         """What does not hold, line by line; accept: in its place the checks that do."""
         files, registry = self.machine.files.snapshot(), self.machine.registry()
-        report, code, shown, dialog = [], None, [], self.has_user
+        report, code, shown, dialog = [], None, [], self.machine.has_user
         if section.keyword == 'restart':
             self.machine.restart()
         else:
@@ -179,7 +177,6 @@ class _Player:
         begun = datetime.now()
         outcome = self.machine.run(program, arguments)
         self.times = (self.now or begun, self.now or datetime.now())
-        self.has_user = False
         return outcome
 
     def _compare(self, found, action, before):
@@ -213,7 +210,8 @@ class _Player:
         """Puts the checks of a word where the scenario has none of its own."""
         for check in action.checks:
             if check.keyword in WORDS:
-                words = checks_of(f'{check.keyword} {check.argument}'.replace(' ,', ',').strip(), before)
+                words = f'{check.keyword} {check.argument}'.replace(' ,', ',').strip()
+                words = checks_of(words, before)
                 ends = check.keyword in ('registered', 'unregistered')
                 log = log_text.without_words(texts.get(LOG, ['heading']) if ends else ['heading'])
                 log += log_text.number(words.log, 1 + log_text.count_events(log))

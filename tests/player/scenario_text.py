@@ -51,7 +51,7 @@ def parse(name, text, file_name):
         return [_scenario(name, title, lines, file_name)]
     scenarios = {}
     for row in rows:
-        row_name = f'{name}[{re.sub("[^A-Za-z0-9.]+", "-", next(iter(row.values()))).strip("-")}]'
+        row_name = f'{name}[{re.sub("[^A-Za-z0-9]+", "-", next(iter(row.values()))).strip("-")}]'
         if row_name in scenarios:
             raise ScenarioError(f'{file_name}: two rows {row_name}')
         filled = [(place, _fill(line, row, place)) for place, line in lines]
