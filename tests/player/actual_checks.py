@@ -37,6 +37,8 @@ def as_checks(player, found, action, before):
 def _ways(player, actual, before):
     """Ways to say log, files and registry: without a word, and with each that fits."""
     yield _sections(actual, before.image)
+    if any(line.startswith('fatal ') for line in actual.log):
+        return
     for words in _words(player, actual.log):
         try:
             said = checks_of(words, before)

@@ -32,6 +32,8 @@ def without_words(lines):
             changes.insert(0, line[2:])
         elif line.startswith('page '):
             whole[:0], changes = page(line.removeprefix('page '), changes), []
+        elif changes:
+            raise ValueError(f'no page is changed: {line}')
         else:
             whole.insert(0, line)
     return whole

@@ -47,7 +47,7 @@ MALFORMED = [
     ('run\nlog\n  no bars\n', 3), ('run\nfile\n', 2), ('each\n  a | b\n  1\nrun {a}\n', 3),
     ('each\n  a\n  1\nrun {b}\n', 4), ('damage C:\\a.exe\n  no records\nrun\n', 1),
     ('damage\n  no such damage\nrun\n', 1), ('run\ninstalled in Latin\n', 1),
-    ('run\nshown\n  page x\n', 1),
+    ('run\nshown\n  page x\n', 1), ('run\nshown\n  |box|\n    |1 x|\n', 1),
 ]
 
 
