@@ -22,18 +22,16 @@ class PackedImage:
         self.flags = []       # of the image tool
         self.files = []       # (name, destination)
         self.contents = {}    # name -> bytes
-        own = {line.partition(' = ')[0] for line in body}
-        for line in body:
-            if ' -> ' not in line:
-                self._set_option(line)
-        for line in USUAL_FILES if usual else []:
-            if 'with versions' in body:
-                line = re.sub(r'(\S+) = \d+ bytes', r'\1 = sample \1', line)
-            if line.partition(' = ')[0] not in own:
-                self._add_file(line)
-        for line in body:
+        lines = {}            # of files, by name
+        for line in [*(USUAL_FILES if usual else []), *body]:
             if ' -> ' in line:
-                self._add_file(line)
+                lines[line.partition(' = ')[0]] = line
+            elif line == 'with versions':
+                lines = {name: f'{name} = sample {name} -> %INSTALL_DIR%' for name in lines}
+            else:
+                self._set_option(line)
+        for line in lines.values():
+            self._add_file(line)
 
     def _add_file(self, line):
         words, _, destination = line.partition(' -> ')
@@ -48,8 +46,6 @@ class PackedImage:
             self.options[name.replace(' ', '_')] = quote[name] + value + quote[name]
         elif line == 'allow unknown macros':
             self.flags.append('--allow-unknown-macros')
-        elif line == 'with versions':
-            pass  # the usual files as programs with version resources
         else:
             raise ValueError(f'no such line of an image: {line}')
 
