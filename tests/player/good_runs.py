@@ -4,7 +4,8 @@ the machine before the run and from the image that ran.
     installed [DIRECTORY] [in LANGUAGE][, VARIANT]...
     removed [DIRECTORY][, listed]
 
-are log, files and registry of an image whose files go below %INSTALL_DIR%. Variants: "listed", with the
+are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
+is not there. Variants: "listed", with the
 uninstall entry; "older", the event of an update that has found an older or missing file; "not removable",
 without a removal program; "not registered", without a registry. "registered" and "unregistered" are the
 ends of the two: the last events, which follow the scenario's own, the removal program or the INF file,
@@ -23,6 +24,9 @@ Language = namedtuple('Language', 'word offset tag')
 LANGUAGES = {'English': Language('GB', 0, '_ENG_ '), 'French': Language('FR', 10000, ''),
              'German': Language('DE', 20000, '_GER_ '), 'Italian': Language('IT', 30000, '_ITA_ '),
              'Spanish': Language('ES', 40000, '_SPA_ ')}
+
+# What a registry key of the browser behind a macro has in its path.
+BROWSERS = {'%PLUGIN_NS_DIR%': 'netscape', '%PLUGIN_IE_DIR%': 'iexplore', '%PLUGIN_OPERA_DIR%': 'opera'}
 
 DIRECTORY = r'C:\Program Files\Moriv'
 REMOVAL_PROGRAM = r'C:\windows\MorivRmv.exe'
@@ -51,7 +55,7 @@ def checks_of(words, before):
     if not match or (match[3] or 'French') not in LANGUAGES or not set(variants) <= set(VARIANTS):
         raise ValueError(f'no such words: {words}')
     word, directory, language = match[1], match[2] or DIRECTORY, match[3] or 'French'
-    targets = _targets(before.packed, directory) if word in ('installed', 'removed') else []
+    targets = _targets(before, directory) if word in ('installed', 'removed') else []
     if word == 'installed':
         head = _copies(before, targets, directory, 'older' in variants), _new_files(before, targets)
     elif word == 'removed':
@@ -65,10 +69,13 @@ def checks_of(words, before):
     return Checks(head[0] + tail.log, head[1] + tail.files, tail.registry)
 
 
-def _targets(packed, directory):
-    """Name, directory and path of each target of each file."""
+def _targets(before, directory):
+    """Name, directory and path of each target of each file; a browser that is not there is none."""
     targets = []
-    for name, destination in packed:
+    for name, destination in before.packed:
+        browser = BROWSERS.get(destination)
+        if browser and not any(browser in key for key in before.registry.keys):
+            continue
         for place in destination.replace('%INSTALL_DIR%', directory).split(';'):
             if not place.startswith(directory):
                 raise ValueError(f'{name} goes to {destination}: its log and files have to be written')
