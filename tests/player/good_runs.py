@@ -5,11 +5,10 @@ the machine before the run and from the image that ran.
     removed [DIRECTORY][, listed]
 
 are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
-is not there. Variants: "listed", with the
-uninstall entry; "older", the event of an update that has found an older or missing file; "not removable",
-without a removal program; "not registered", without a registry. "registered" and "unregistered" are the
-ends of the two: the last events, which follow the scenario's own, the removal program or the INF file,
-which stands beside the scenario's own files, and the registry.
+is not there. Variants: "listed", with the uninstall entry; "older", the event of an update that has found
+an older or missing file; "not removable", without a removal program; "not registered", without a registry.
+"registered" and "unregistered" are the ends of the two: the last events, which follow the scenario's own,
+the removal program or the INF file, which stands beside the scenario's own files, and the registry.
 """
 
 import copy
