@@ -10,6 +10,8 @@ import subprocess
 # The image that a scenario has unless it needs another one.
 USUAL_FILES = ['zebdial.exe = 5000 bytes -> %INSTALL_DIR%', 'zebnet.dll = 3000 bytes -> %INSTALL_DIR%']
 
+_PACKED = {}  # images by all that goes into them: most scenarios have the same
+
 
 class PackedImage:
     """A setup image as a 'given image' section describes it, made with the image tool."""
@@ -51,6 +53,9 @@ class PackedImage:
 
     def make(self, folder):
         """The image's bytes; folder takes the sources and is made here."""
+        key = (self.tools.stub, *self.options.values(), *self.flags, *self.files, *self.contents.values())
+        if key in _PACKED:
+            return _PACKED[key]
         folder.mkdir(parents=True)
         lines = ['[package]', *(f'{name} = {value}' for name, value in self.options.items())]
         for name, destination in self.files:
@@ -63,7 +68,7 @@ class PackedImage:
                               capture_output=True, text=True)
         if done.returncode != 0:
             raise ValueError(done.stderr.strip())
-        return image.read_bytes()
+        return _PACKED.setdefault(key, image.read_bytes())
 
 
 def file_content(words, seed, tools):

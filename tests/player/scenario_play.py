@@ -49,7 +49,7 @@ def play(scenario, machine, tools, accept=False):
     folder = tools.images / scenario.name
     shutil.rmtree(folder, ignore_errors=True)
     failures = _play(scenario, _Player(machine, tools, folder), accept)
-    shutil.rmtree(folder)
+    shutil.rmtree(folder, ignore_errors=True)
     if failures:
         raise ScenarioFailure('\n'.join(failures))
 
