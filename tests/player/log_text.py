@@ -35,12 +35,12 @@ def with_words(lines):
 
 
 def text_lines(text, times):
-    """The lines of a text file. times: before and after the run, for the headings; None for a text without."""
+    """The lines of a text file. times: before and after each run, for headings; None for a text without."""
     parts = re.split(r'\r\n\r\nInstalling Moriv : (.*?) \r\n\r\n', text) if times else [text]
     lines = []
     for place, part in enumerate(parts):
         if place % 2 == 1:
-            lines.append(_heading(part, *times))
+            lines.append(_heading(part, times))
         elif part:
             lines += [f'|{line}|' for line in part.split('\r\n')]
             # What stands behind the last line end: nothing, as it should be.
@@ -49,8 +49,8 @@ def text_lines(text, times):
     return lines
 
 
-def _heading(stamp, begun, ended):
-    """'heading' if the time is that of the run, else what it is."""
+def _heading(stamp, times):
+    """'heading' if the time is that of a run, else what it is."""
     good = {(begun + timedelta(seconds=later)).strftime('%A, %d %B %Y at : %Hh %Mm %Ss')
-            for later in range(int((ended - begun).total_seconds()) + 2)}
+            for begun, ended in times for later in range(int((ended - begun).total_seconds()) + 1)}
     return 'heading' if stamp in good else f'heading with the time "{stamp}"'

@@ -82,7 +82,7 @@ class _Player:
         self.packed = {}      # path -> PackedImage
         self.last_image = DEFAULT_IMAGE  # that has run
         self.now = None       # the machine's own time, when it is set
-        self.times = ()       # of the last run: before and after it
+        self.times = []       # of each run: before and after it
 
     # Preparations
 
@@ -174,9 +174,9 @@ class _Player:
         program, arguments = _program_and_arguments(section.argument)
         if program in self.images:
             self.last_image = program
-        begun = datetime.now()
+        begun = datetime.now().replace(microsecond=0)  # a heading has whole seconds
         outcome = self.machine.run(program, arguments)
-        self.times = (self.now or begun, self.now or datetime.now())
+        self.times.append((self.now or begun, self.now or datetime.now()))
         return outcome
 
     def _compare(self, found, action, before):
