@@ -1,6 +1,6 @@
 // What moriv-image explain says: every exit code has its words, in every form that tools show, and
 // a log is judged by its last run. Which event goes with which code is held against the scenarios
-// (tests/scenarios/explained_logs.py) and the fault loops.
+// (tests/player/explained_log.py) and the fault loops.
 
 #include "tools/image/run_explainer.h"
 
