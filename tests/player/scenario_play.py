@@ -22,7 +22,7 @@ from scenario_text import ACTIONS, DEFAULT_IMAGE, WORDS, ScenarioError
 LOG = r'C:\windows\MorivLog.txt'
 
 # What the program asks of the system; only the stand-in machine tells of it.
-REQUESTS = ('|beep ', '|open ', '|start ')
+REQUESTS = ('|font ', '|drawn ', '|beep ', '|open ', '|start ')
 
 # What a removal leaves for the system's INF installer; one scenario has it line by line.
 INF_FILE = '\r\n'.join([
