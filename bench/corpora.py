@@ -7,7 +7,6 @@
 
 import os
 import random
-import re
 import shutil
 import subprocess
 import sys
@@ -18,16 +17,14 @@ from timed_runs import BenchError, output_of
 
 # All paths are relative to the root, so that a command can be told and repeated as it was run.
 os.chdir(Path(__file__).resolve().parent.parent)
-sys.path.insert(0, 'tests/scenarios')
+sys.path.insert(0, 'tests/player')
 from package_image import Image  # noqa: E402
+from stripped_libraries import SOURCE, strip_libraries  # noqa: E402
 
 BUILD = Path('build/bench')
 STUB = BUILD / 'MorivSetup'
 IMAGE_TOOL = BUILD / 'moriv-image'
 
-LIBRARIES = Path('/usr/lib/x86_64-linux-gnu/wine/x86_64-windows')
-# It writes the time into a library, unless it is told one.
-STRIP = ('env', 'SOURCE_DATE_EPOCH=0', 'x86_64-w64-mingw32-strip')
 LARGEST_LIBRARY = 3_000_000
 TEXT_FILE = 1_000_000
 PEER_PACKERS = {'.Z': ('compress', '-b16', '-f', '-c'), '.gz': ('gzip', '-9', '-n', '-c')}
@@ -82,22 +79,10 @@ def megabyte_of(corpus):
 
 def make_libraries(folder, count):
     _make_anew(folder)
-    families = {}
-    stripped = folder / 'stripped'
-    sources = sorted(LIBRARIES.glob('*.dll'), key=lambda file: (-file.stat().st_size, file.name))
-    for source in sources:
-        family = re.match('[a-z]*', source.name)[0]
-        if len(families) == count:
-            break
-        if family in families:
-            continue
-        output_of([*STRIP, '-o', stripped, source])
-        if stripped.stat().st_size <= LARGEST_LIBRARY:
-            families[family] = stripped.rename(folder / source.name)
-    stripped.unlink(missing_ok=True)
-    if len(families) < count:
-        raise BenchError(f'{LIBRARIES} has too few libraries')
-    return sorted(families.values())
+    files = strip_libraries(folder, count, LARGEST_LIBRARY)
+    if not files:
+        raise BenchError(f'{SOURCE} has too few libraries')
+    return files
 
 
 def make_text(folder, count):

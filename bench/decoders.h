@@ -43,7 +43,7 @@ struct Decoder {
 
 // The program's expander, in blocks of 1024 bytes as an install reads them.
 bool DecodeByExpander(Bytes stream, Output* output);
-// The decoder of the tests, written to the letter of the format.
+// A plain decoder, step by step as the format is described.
 bool DecodeByLetter(Bytes stream, Output* output);
 
 // Bytes of the heap that one expander takes for itself and its tables; 0 where the C library can't

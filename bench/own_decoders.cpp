@@ -3,8 +3,8 @@
 #include <memory>
 
 #include "bench/decoders.h"
+#include "bench/plain_expander.h"
 #include "package/expander.h"
-#include "tests/support/plain_expander.h"
 
 #ifdef __GLIBC__
 #include <malloc.h>

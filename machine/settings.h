@@ -41,6 +41,7 @@ struct Settings {
   std::map<char, DiskSettings>
       disks;  // by upper-case drive letter; a drive without one has the defaults
   bool hasGetDiskFreeSpaceEx = true;
+  bool hasReadOnlyRegistry = false;  // no key opens for more than reading, as for a plain user
   std::vector<Fault> faults;
   std::string commandLine;  // of the program that runs, with its name; no setting of the file
 };

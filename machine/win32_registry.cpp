@@ -1,6 +1,7 @@
 // The registry functions. Windows checks a handle's rights where values are read or written and
 // subkeys listed; making, opening and deleting subkeys goes by the rights of the keys themselves,
-// which nobody restricts here. On the 9x family no rights are checked at all: this is stricter.
+// which nobody restricts here but for a registry that is read-only as a whole. On the 9x family no
+// rights are checked at all: this is stricter.
 #include <cstring>
 #include <map>
 #include <memory>
@@ -95,6 +96,8 @@ LSTATUS RegOpenKeyExA(HKEY key, LPCSTR subkey, DWORD, REGSAM access, PHKEY resul
   }
   const std::shared_ptr<RegistryKey> found = machine::FindKey(parent, path);
   if (found == nullptr) return ERROR_FILE_NOT_FOUND;
+  const bool isReadOnly = machine::CurrentSettings().hasReadOnlyRegistry;
+  if (isReadOnly && (access & ~REGSAM{KEY_READ}) != 0) return ERROR_ACCESS_DENIED;
   *result = OpenHandle(found, access);
   return ERROR_SUCCESS;
 }

@@ -2,20 +2,21 @@
 // line with the counts. Returns 0 when all hold, else -1, which no exit status takes for a success.
 #include <algorithm>
 #include <cstdio>
-#include <cstring>
-#include <vector>
+#include <map>
 
 #include "tests/contract/contract.h"
 
 namespace {
 
 // Cases are registered before main; a local static is there when the first one comes.
-std::vector<contract::Case>& Cases() {
-  static std::vector<contract::Case> cases;
+std::map<std::string, void (*)()>& Cases() {
+  static std::map<std::string, void (*)()> cases;
   return cases;
 }
 
 std::string failures;  // of the case that runs
+contract::Handler handlerOfCase;
+HWND openDialog;
 
 // A key and all below it; one that is not there is no failure.
 void DeleteTree(const std::string& path) {
@@ -23,60 +24,47 @@ void DeleteTree(const std::string& path) {
   if (RegOpenKeyExA(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ, &key) != ERROR_SUCCESS) return;
   char name[MAX_PATH];
   while (RegEnumKeyA(key, 0, name, sizeof(name)) == ERROR_SUCCESS) {
-    const std::string below = path + '\\' + name;
-    DeleteTree(below);
+    DeleteTree(std::string(path).append("\\").append(name));
   }
   RegCloseKey(key);
   RegDeleteKeyA(HKEY_LOCAL_MACHINE, path.c_str());
 }
 
-bool Holds(const contract::Case& one) {
-  failures.clear();
-  DeleteTree(contract::kKey);
-  one.body();
-  if (failures.empty()) {
-    std::printf("ok %s\n", one.name);
-  } else {
-    std::printf("failed %s:%s\n", one.name, failures.c_str());
-  }
-  std::fflush(stdout);
-  return failures.empty();
+INT_PTR CALLBACK CallHandler(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
+  openDialog = dialog;
+  if (message == WM_INITDIALOG) PostMessageA(dialog, contract::kStep, 0, 0);
+  return handlerOfCase(dialog, message, wParam, lParam);
 }
 
 }  // namespace
 
 namespace contract {
 
-Case::Case(const char* caseName, void (*caseBody)()) : name(caseName), body(caseBody) {
-  Cases().push_back(*this);
+bool AddCase(const char* name, void (*body)()) {
+  return Cases().emplace(name, body).second;
+}
+
+void Expect(Answers actual, Answers expected, const std::string& row, std::source_location where) {
+  for (size_t call = 0; call < actual.size(); ++call) {
+    const std::string& is = (actual.begin() + call)->text;
+    const std::string wanted = expected.size() == 1      ? expected.begin()->text
+                               : call >= expected.size() ? "without an answer"
+                                                         : (expected.begin() + call)->text;
+    if (is == wanted) continue;
+    const std::string file = where.file_name();
+    failures.append(" ").append(file.substr(file.rfind('/') + 1)).append(":");
+    failures.append(std::to_string(where.line())).append(" [").append(row).append("] call ");
+    failures.append(std::to_string(call + 1)).append(" is ").append(is).append(", not ");
+    failures.append(wanted).append(";");
+  }
 }
 
 bool IsWine() {
   return GetProcAddress(GetModuleHandleA("ntdll.dll"), "wine_get_version") != nullptr;
 }
 
-void Expect(const Shown& actual, const Shown& expected, const std::string& row,
-            std::source_location where) {
-  if (actual.text == expected.text) return;
-  const char* const slash = std::strrchr(where.file_name(), '/');
-  failures += std::string(" ") + (slash != nullptr ? slash + 1 : where.file_name()) + ':' +
-              std::to_string(where.line()) + (row.empty() ? "" : " [" + row + ']') + " is " +
-              actual.text + ", not " + expected.text + ';';
-}
-
-void ExpectEach(std::initializer_list<Shown> actual, std::initializer_list<Shown> expected,
-                const std::string& row, std::source_location where) {
-  if (expected.size() != 1) Expect(expected.size(), actual.size(), "answers", where);
-  const Shown* answer = expected.begin();
-  for (const Shown& one : actual) {
-    Expect(one, *answer, row + " call " + std::to_string(&one - actual.begin() + 1), where);
-    if (answer + 1 != expected.end()) ++answer;
-  }
-}
-
 HANDLE Open(const std::string& name, DWORD access, DWORD share) {
-  return CreateFileA(name.c_str(), access, share, nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL,
-                     nullptr);
+  return CreateFileA(name.c_str(), access, share, nullptr, OPEN_EXISTING, 0, nullptr);
 }
 
 HANDLE Create(const std::string& name, DWORD attributes) {
@@ -100,22 +88,79 @@ BOOL Write(HANDLE file, const std::string& bytes) {
   const auto count = static_cast<DWORD>(bytes.size());
   DWORD done = 99;
   const BOOL isWritten = WriteFile(file, bytes.data(), count, &done, nullptr);
-  Expect(done, isWritten != FALSE ? count : 0);
+  Expect({done}, {isWritten != FALSE ? count : 0});
   return isWritten;
 }
 
-void WriteText(const std::string& path, const std::string& bytes) {
-  const HANDLE file = Create(path);
-  ExpectEach({Write(file, bytes), CloseHandle(file)}, {TRUE}, path);
+void WriteText(const std::string& name, const std::string& bytes) {
+  const HANDLE file = Create(name);
+  Expect({Write(file, bytes), CloseHandle(file)}, {TRUE}, name);
 }
 
-std::string ReadText(const std::string& path) {
-  const HANDLE file = Open(path, GENERIC_READ);
+std::string ReadText(const std::string& name) {
+  const HANDLE file = Open(name);
   const DWORD size = GetFileSize(file, nullptr);
   const std::string bytes = Read(file, size != INVALID_FILE_SIZE ? size : 0);
   CloseHandle(file);
   return bytes;
 }
+
+HWND Item(int id) {
+  return GetDlgItem(openDialog, id);
+}
+
+INT_PTR RunDialog(Handler handler) {
+  constexpr int kTemplate = 100;
+  handlerOfCase = std::move(handler);
+  return DialogBoxParamA(GetModuleHandleA(nullptr), MAKEINTRESOURCEA(kTemplate), nullptr,
+                         CallHandler, kData);
+}
+
+void RunStanding(const Check& check, const Check& atNextStep) {
+  const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
+    if (message == kNextStep && atNextStep) atNextStep(dialog);
+    if (message != kStep) return FALSE;
+    check(dialog);
+    return EndDialog(dialog, 5);
+  });
+  Expect({result}, {5});
+}
+
+#ifdef _WIN32
+
+static int buttonOfUser;
+static std::string folderOfUser;
+
+// The timer's message comes when no other waits, in the loop of the box or picker, which is then
+// the active window of the thread.
+static void CALLBACK Answer(HWND, UINT, UINT_PTR timer, DWORD) {
+  const HWND modal = GetActiveWindow();
+  if (modal == nullptr) return;
+  KillTimer(nullptr, timer);
+  if (!folderOfUser.empty()) {
+    SendMessageA(modal, BFFM_SETSELECTIONA, TRUE, reinterpret_cast<LPARAM>(folderOfUser.c_str()));
+  }
+  PostMessageA(modal, WM_COMMAND, static_cast<WPARAM>(buttonOfUser), 0);
+}
+
+void AnswerNext(int button, const std::string& folder) {
+  constexpr UINT kMilliseconds = 50;
+  buttonOfUser = button;
+  folderOfUser = folder;
+  SetTimer(nullptr, 0, kMilliseconds, Answer);
+}
+
+void WaitForEnd(HANDLE process) {
+  constexpr DWORD kMilliseconds = 30000;
+  WaitForSingleObject(process, kMilliseconds);
+}
+
+#else
+
+void AnswerNext(int, const std::string&) {}
+void WaitForEnd(HANDLE) {}
+
+#endif
 
 }  // namespace contract
 
@@ -125,12 +170,17 @@ int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR commandLine, int) {
     contract::WriteText(commandLine, "started");
     return 0;
   }
-  std::vector<contract::Case>& cases = Cases();
-  std::ranges::sort(cases,
-                    [](const auto& a, const auto& b) { return std::strcmp(a.name, b.name) < 0; });
-  const auto held = std::ranges::count_if(cases, Holds);
-  const auto failed = static_cast<long long>(cases.size()) - held;
+  int failed = 0;
+  for (const auto& [name, body] : Cases()) {
+    failures.clear();
+    DeleteTree(contract::kKey);
+    body();
+    failed += failures.empty() ? 0 : 1;
+    std::printf("%s %s%s%s\n", failures.empty() ? "ok" : "failed", name.c_str(),
+                failures.empty() ? "" : ":", failures.c_str());
+    std::fflush(stdout);
+  }
   DeleteTree(contract::kKey);
-  std::printf("%lld held, %lld failed\n", static_cast<long long>(held), failed);
+  std::printf("%d held, %d failed\n", static_cast<int>(Cases().size()) - failed, failed);
   return failed == 0 ? 0 : -1;
 }

@@ -1,7 +1,6 @@
-// Messages: what is sent, posted and polled, what a click and a change of text bring.
-#include <vector>
-
-#include "tests/contract/standing_dialog.h"
+// Messages: what is sent, posted and polled, what a click and a change of text bring; message boxes
+// and the folder picker, whose texts are looked at by the scenarios.
+#include "tests/contract/contract.h"
 
 namespace contract {
 namespace {
@@ -18,117 +17,109 @@ MSG TakeStep() {
 }
 
 void PostClick(HWND control) {
-  constexpr UINT kButtonDown = 0x201;
-  constexpr UINT kButtonUp = 0x202;
+  constexpr UINT kButtonDown = 0x201, kButtonUp = 0x202;
   PostMessageA(control, kButtonDown, 1, 0x00020002);
   PostMessageA(control, kButtonUp, 0, 0x00020002);
 }
 
+// Runs `ask` in a dialog that has the focus on its first button. The step that was posted before it
+// runs while the question stands, with the dialog disabled. That a step can end the dialog under it
+// is shown by the scenarios.
+void RunAsking(const std::function<void(HWND dialog)>& ask) {
+  DWORD style = 0;  // of the dialog under the question
+  RunStanding(
+      [&](HWND dialog) {
+        SetFocus(Item(11));
+        PostMessageA(dialog, kNextStep, 0, 0);
+        ask(dialog);
+        Expect({SetFocus(Item(11)), StyleOf(dialog) & WS_DISABLED, style & WS_DISABLED},
+               {Item(11), 0, WS_DISABLED});
+      },
+      [&](HWND dialog) { style = StyleOf(dialog); });
+}
+
 }  // namespace
 
-CONTRACT(Messages, SentMessageAnswersNothingOfTheHandlers) {
-  RunDialog([](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-    if (message == WM_INITDIALOG) {
-      // What a handler returns tells only whether it has handled the message.
-      ExpectEach({SendMessageA(dialog, kStep, 1, 0), SendMessageA(dialog, WM_COMMAND, 77, 0)}, {0});
-      EndDialog(dialog, 1);
-    }
-    return message == kStep || (message == WM_COMMAND && LOWORD(wParam) == 77) ? 5 : FALSE;
-  });
-}
-
-CONTRACT(Messages, PostedMessagesComeInTheirOrder) {
-  std::vector<UINT> order;
-  RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
-    if (IsStep(message)) order.push_back(message);
-    if (message == kStep) {
-      ExpectEach({PostMessageA(dialog, kNextStep, 1, 2), PostMessageA(dialog, kLastStep, 0, 0)},
-                 {TRUE});
-      Expect(order.size(), 1, "none runs inside the call");
-    }
-    if (message == kNextStep) Expect(wParam * 10 + static_cast<WPARAM>(lParam), 12);
-    if (message == kLastStep) {
-      EndDialog(dialog, 1);
-      PostMessageA(dialog, kStep, 0, 0);  // too late: the loop has ended
-    }
-    return FALSE;
-  });
-  Expect(order == std::vector<UINT>{kStep, kNextStep, kLastStep}, true);
-}
-
-CONTRACT(Messages, PolledMessagesAreThoseOfWindowsThatStand) {
-  RunStanding([](HWND dialog) {
-    const HWND gone = GetDlgItem(dialog, 9);
-    ExpectEach({PostMessageA(gone, kStep, 0, 0), PostMessageA(dialog, kNextStep, 3, 4),
-                PostMessageA(nullptr, kLastStep, 0, 0)},
-               {TRUE}, "the last is the thread's own");
-    DestroyWindow(gone);
-    Expect(PostMessageA(gone, kStep, 0, 0), FALSE);
-    const MSG own = TakeStep();
-    ExpectEach({own.message, own.hwnd, own.wParam, own.lParam}, {kNextStep, dialog, 3, 4});
-    const MSG nobodys = TakeStep();
-    ExpectEach({nobodys.message, nobodys.hwnd}, {kLastStep, nullptr});
-    ExpectEach({DispatchMessageA(&nobodys), TakeStep().message}, {0});
-  });
-}
-
-CONTRACT(Messages, EndInsideANestedHandlerWaitsForTheOuterOne) {
-  bool isOuterDone = false;
+CONTRACT(Messages, ArePolledInTheirOrderAndSentAtOnce) {
+  std::string order;
   const INT_PTR result = RunDialog([&](HWND dialog, UINT message, WPARAM, LPARAM) -> INT_PTR {
-    if (message == kStep) {
-      for (const UINT step : {kNextStep, kLastStep}) PostMessageA(dialog, step, 0, 0);
-      const MSG next = TakeStep();
-      Expect(next.message, kNextStep);
-      DispatchMessageA(&next);
-      Expect(IsWindow(dialog) && GetDlgItem(dialog, 10) != nullptr, true);
-      isOuterDone = true;
-    }
+    if (!IsStep(message)) return FALSE;
+    order += std::to_string(message - kStep) + ' ';
     if (message == kNextStep) EndDialog(dialog, 7);
-    Expect(message == kLastStep, false);
+    if (message != kStep) return 5;
+    const HWND gone = Item(9);
+    // What waits for a window that goes is gone too; the third is the thread's own. What a handler
+    // returns for the sent one tells only whether it has handled it.
+    Expect({PostMessageA(gone, kStep, 0, 0), PostMessageA(dialog, kNextStep, 3, 4),
+            PostMessageA(nullptr, kLastStep, 0, 0), DestroyWindow(gone),
+            PostMessageA(gone, kStep, 0, 0), order, SendMessageA(dialog, kLastStep, 0, 0), order},
+           {TRUE, TRUE, TRUE, TRUE, FALSE, "0 ", 0, "0 2 "});
+    const MSG own = TakeStep(), nobodys = TakeStep();
+    Expect({own.message, own.hwnd, own.wParam, own.lParam, nobodys.message, nobodys.hwnd,
+            DispatchMessageA(&nobodys), TakeStep().message},
+           {kNextStep, dialog, 3, 4, kLastStep, nullptr, 0, 0});
+    // An end inside a nested handler waits for the outer one, and what waits then comes no more.
+    DispatchMessageA(&own);
+    Expect({PostMessageA(dialog, kLastStep, 0, 0), IsWindow(dialog), Item(10) != nullptr}, {TRUE});
     return FALSE;
   });
-  Expect(isOuterDone, true);
-  Expect(result, 7);
+  Expect({order, result}, {"0 2 1 ", 7});
 }
 
-CONTRACT(Messages, ClickGivesTheIdOfThatMoment) {
+CONTRACT(Messages, ClickAndChangeOfTextTellTheIdOfThatMoment) {
   std::string commands;
   RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
     if (message == kStep) {
       // The first has no SS_NOTIFY; the others have been renumbered.
-      SetWindowLongA(GetDlgItem(dialog, 11), GWL_ID, 21);
-      SetWindowLongA(GetDlgItem(dialog, 9), GWL_ID, 20);
-      for (const int id : {9, 21, 20}) PostClick(GetDlgItem(dialog, id));
+      SetWindowLongA(Item(11), GWL_ID, 21);
+      SetWindowLongA(Item(9), GWL_ID, 20);
+      for (const int id : {9, 21, 20}) PostClick(Item(id));
+      for (const int id : {10, 21}) SetWindowTextA(Item(id), "by program");
+      SendMessageA(Item(10), EM_SETSEL, 0, -1);
       PostMessageA(dialog, kLastStep, 0, 0);
     }
-    if (message == WM_COMMAND && HIWORD(wParam) == 0) {
-      commands += std::to_string(LOWORD(wParam)) + ' ';
-      Expect(reinterpret_cast<HWND>(lParam), GetDlgItem(dialog, LOWORD(wParam)));
-      const HWND button = GetDlgItem(dialog, 21);
-      if (LOWORD(wParam) == 21) Expect(SetFocus(button), button, "the click has moved it there");
+    const int id = LOWORD(wParam), notice = HIWORD(wParam);
+    const bool isOfFocus = id == 10 && notice < 0x300;
+    if (message == WM_COMMAND && !isOfFocus) {
+      commands += std::to_string(id) + '/' + std::to_string(notice) + ' ';
+      Expect({reinterpret_cast<HWND>(lParam)}, {Item(id)});
+      if (id == 21) Expect({SetFocus(Item(id))}, {Item(id)}, "the click has moved it");
     }
     if (message == kLastStep) EndDialog(dialog, 1);
     return FALSE;
   });
-  Expect(commands, "21 20 ");
+  Expect({commands}, {"10/1024 10/768 21/0 20/0 "});  // EN_UPDATE, EN_CHANGE
 }
 
-CONTRACT(Messages, EditFieldTellsOfEveryChange) {
-  std::string notices;
-  RunDialog([&](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-    const bool isOfFocus = HIWORD(wParam) < 0x300;
-    if (message == WM_COMMAND && LOWORD(wParam) == 10 && !isOfFocus) {
-      notices += std::to_string(HIWORD(wParam)) + ' ';
-    }
-    if (message == kStep) {
-      SetWindowTextA(GetDlgItem(dialog, 10), "by program");
-      SetWindowTextA(GetDlgItem(dialog, 11), "a button");
-      SendMessageA(GetDlgItem(dialog, 10), EM_SETSEL, 0, -1);
-      EndDialog(dialog, 1);
-    }
-    return FALSE;
-  });
-  Expect(notices, "1024 768 ");  // EN_UPDATE, EN_CHANGE
+CONTRACT(Modal, BoxGivesTheButtonWhileTheDialogsStepsRun) {
+  for (const int button : {IDNO, IDYES}) {
+    RunAsking([button](HWND dialog) {
+      AnswerNext(button);
+      Expect({MessageBoxA(dialog, "Sure?", "Question", MB_YESNO | MB_DEFBUTTON2)}, {button});
+    });
+  }
+  AnswerNext(IDOK);
+  Expect({MessageBoxA(nullptr, nullptr, nullptr, MB_OK)}, {IDOK});
+}
+
+CONTRACT(Modal, PickerGivesAListOrNone) {
+  // What is picked, or "none".
+  const auto pick = [](HWND owner, int button, const char* folder) -> std::string {
+    char name[MAX_PATH] = {}, path[MAX_PATH] = {};
+    BROWSEINFOA browse = {};
+    browse.hwndOwner = owner;
+    browse.pszDisplayName = name;
+    browse.lpszTitle = "Where?";
+    AnswerNext(button, folder);
+    const LPITEMIDLIST list = SHBrowseForFolderA(&browse);
+    IMalloc* allocator = nullptr;
+    Expect({SHGetPathFromIDListA(list, path), SHGetMalloc(&allocator)}, {list != nullptr, S_OK});
+    allocator->Free(list);
+    allocator->Release();
+    return list != nullptr ? path : "none";
+  };
+  RunAsking([&](HWND dialog) { Expect({pick(dialog, IDOK, "C:\\contract")}, {"C:\\contract"}); });
+  RunAsking([&](HWND dialog) { Expect({pick(dialog, IDCANCEL, "")}, {"none"}); });
 }
 
 }  // namespace contract

@@ -6,91 +6,86 @@
 namespace contract {
 
 CONTRACT(Paths, NamesLeadToTheirFiles) {
-  CreateDirectoryA("C:\\contract\\Dir", nullptr);
-  WriteText("C:\\contract\\Dir\\Read Me.TXT", "x");
-  WriteText("C:\\contract\\caf\xE9", "x");
+  CreateDirectoryA("contract/Dir", nullptr);
+  WriteText("contract/Dir/Read Me.TXT", "x");
+  WriteText("contract/caf\xE9", "x");
   const std::pair<DWORD, std::vector<const char*>> rows[] = {
       {FILE_ATTRIBUTE_DIRECTORY,
-       {"C:\\contract\\Dir", "C:\\contract\\Dir\\", "C:", "\\contract\\dir",
-        "C:\\contract\\absent\\..\\dir", "C:\\..\\..\\contract\\dir", "C:\\contract\\dir. ",
-        "C:\\contract\\dir\\.. ", "C:\\contract\\dir\\. . ", "C:contract\\dir", "contract/dir",
-        "C:\\contract\\dir\\..", "C:\\contract\\dir\\...", "C:\\contract\\dir\\ "}},
-      {FILE_ATTRIBUTE_ARCHIVE,
-       {"c:/CONTRACT\\dIR/READ me.txt", "C:\\contract\\CAF\xC9",
-        "C:\\contract\\\\Dir\\\\\\read me.txt", "C:\\contract\\Dir\\.\\..\\dir\\read me.txt",
-        "C:\\contract\\dir\\Read Me.TXT. ", "C:\\contract\\dir\\Read Me.TXT...",
-        "C:\\contract\\dir.\\read me.txt", "C:\\contract\\nul ", "C:\\contract\\nul.", "nul:x",
-        "C:nul", "C:\\contract\\nul", "C:\\contract\\NUL.txt", "C:\\contract\\con",
-        "C:\\contract\\aux .x", "C:\\contract\\Com1", "C:\\contract\\lpt9:", "nul"}},
-      {INVALID_FILE_ATTRIBUTES,
-       {"C:\\contract\\cafe",
-        "C:\\contract\\dir \\read me.txt",
-        "C:\\contract\\dir..\\read me.txt",
-        "C:\\contract\\dir. .\\read me.txt",
-        "C:\\contract\\...\\dir",
-        "C:\\contract\\dir\\. \\read me.txt",
-        "C:\\contract\\dir\\.. \\dir",
-        "C:\\contract\\dir\\read me.txt \\",
-        "C:\\contract\\nul\\",
+       {"C:\\contract\\Dir", "C:\\contract\\Dir\\", "C:", "\\contract\\dir", "C:contract\\dir",
+        "C:\\contract\\absent\\..\\dir", "C:\\..\\..\\contract\\dir", "contract/dir",
+        "contract/dir. ", "contract/dir/..", "contract/dir/.. ", "contract/dir/. . ",
+        "contract/dir/...", "contract/dir/ "}},
+      {kPlain,
+       {"c:/CONTRACT\\dIR/READ me.txt", "contract/CAF\xC9", "contract\\\\Dir\\\\\\read me.txt",
+        "contract\\Dir\\.\\..\\dir\\read me.txt", "contract/dir/Read Me.TXT. ",
+        "contract/dir/Read Me.TXT...", "contract/dir./read me.txt",
+        // Names of devices are no names of files.
+        "contract/nul ", "contract/nul.", "nul:x", "C:nul", "contract/nul", "contract/NUL.txt",
+        "contract/con", "contract/aux .x", "contract/Com1", "contract/lpt9:", "nul"}},
+      {kAbsent,
+       {"contract/cafe",
+        "contract/dir /read me.txt",
+        "contract/dir../read me.txt",
+        "contract/dir. ./read me.txt",
+        "contract/.../dir",
+        "contract/dir/. /read me.txt",
+        "contract/dir/.. /dir",
+        "contract/dir/read me.txt /",
         " C:\\contract\\dir",
-        "C:\\contract\\ dir",
-        "C:\\contract\\dir\\read me.txt\\",
-        "C:\\contract\\dir\\read me",
-        "C:\\contract\\dir\\*",
-        "C:\\contract\\dir\\read?me.txt",
+        "contract/ dir",
+        "contract\\dir\\read me.txt\\",
+        "contract/dir/read me",
+        "contract/dir/*",
+        "contract/dir/read?me.txt",
         "Q:\\",
         "1:\\dir",
         "\\\\absent\\share\\x",
         "",
-        "C:\\contract\\CONSOLE",
-        "C:\\contract\\COM0",
-        "C:\\contract\\nul\\x"}}};
+        "contract/CONSOLE",
+        "contract/COM0",
+        "contract/nul/",
+        "contract/nul/x"}}};
   for (const auto& [attributes, names] : rows) {
-    for (const char* name : names) Expect(GetFileAttributesA(name), attributes, name);
+    for (const char* name : names) Expect({GetFileAttributesA(name)}, {attributes}, name);
   }
-  Expect(GetFileAttributesA("C:\\") & FILE_ATTRIBUTE_DIRECTORY, FILE_ATTRIBUTE_DIRECTORY);
-  Expect(GetFileAttributesA(nullptr), INVALID_FILE_ATTRIBUTES);
+  Expect({GetFileAttributesA("C:\\") & FILE_ATTRIBUTE_DIRECTORY, GetFileAttributesA(nullptr)},
+         {FILE_ATTRIBUTE_DIRECTORY, kAbsent});
 
   // The end of a name falls away when it is made too.
-  WriteText("C:\\contract\\end. ", "x");
-  Expect(ReadText("C:\\contract\\end"), "x");
-  ExpectEach({DeleteFileA("C:\\contract\\END.. "), CreateDirectoryA("C:\\contract\\tail ", nullptr),
-              RemoveDirectoryA("C:\\contract\\tail")},
-             {TRUE});
+  WriteText("contract/end. ", "x");
+  Expect({ReadText("contract/end")}, {"x"});
+  Expect({DeleteFileA("contract/END.. "), CreateDirectoryA("contract/tail ", nullptr),
+          RemoveDirectoryA("contract/tail")},
+         {TRUE});
 }
 
-// Names of devices are no names of files: the null device takes and forgets what is written.
+// The null device takes and forgets what is written.
 CONTRACT(Paths, NullDeviceIsOpenedForAName) {
-  const HANDLE device = Create("C:\\contract\\nul.log");
-  Expect(device != INVALID_HANDLE_VALUE, true);
-  char byteBack = 0;
-  DWORD done = 0;
-  Expect(WriteFile(device, "x", 1, &done, nullptr), TRUE);
-  Expect(done, 1);
-  Expect(ReadFile(device, &byteBack, 1, &done, nullptr), TRUE);
-  Expect(done, 0);
-  Expect(CloseHandle(device), TRUE);
+  const HANDLE device = Create("contract/nul.log");
+  char one = 0;
+  DWORD done = 99;
+  Expect(
+      {WriteFile(device, "x", 1, &done, nullptr), done, ReadFile(device, &one, 1, &done, nullptr),
+       done, CloseHandle(device), DeleteFileA("contract/nul")},
+      {TRUE, 1, TRUE, 0, TRUE, FALSE});
   // Wine makes a directory of that name.
-  if (!IsWine()) Expect(CreateDirectoryA("C:\\contract\\nul", nullptr), FALSE);
-  Expect(DeleteFileA("C:\\contract\\nul"), FALSE);
+  if (!IsWine()) Expect({CreateDirectoryA("contract/nul", nullptr)}, {FALSE});
 }
 
 CONTRACT(Paths, PathsOf260CharactersAreTooLong) {
-  const std::string folder = "C:\\contract\\";
-  const auto path = [&](size_t length) {
-    return folder + std::string(length - folder.size(), 'p');
+  const auto folder = [](size_t length) {
+    const std::string path = "C:\\contract\\" + std::string(length - 12, 'p');
+    return CreateDirectoryA(path.c_str(), nullptr) != FALSE && RemoveDirectoryA(path.c_str());
   };
-  Expect(CreateDirectoryA(path(247).c_str(), nullptr), TRUE);
-  Expect(GetFileAttributesA(path(247).c_str()), FILE_ATTRIBUTE_DIRECTORY);
-  ExpectEach(
-      {RemoveDirectoryA(path(247).c_str()), Opens(Create(path(259))),
-       CopyFileA(path(259).c_str(), path(258).c_str(), FALSE), DeleteFileA(path(259).c_str())},
-      {TRUE});
+  const auto file = [](size_t length, size_t copyLength) {
+    const std::string path = "C:\\contract\\" + std::string(length - 12, 'p');
+    const std::string copy = "C:\\contract\\" + std::string(copyLength - 12, 'q');
+    return Opens(Create(path)) && CopyFileA(path.c_str(), copy.c_str(), FALSE) != FALSE &&
+           GetFileAttributesA(copy.c_str()) == kPlain && DeleteFileA(path.c_str());
+  };
+  Expect({folder(247), file(259, 258), file(258, 259)}, {true});
   // Wine has no limits of its own.
-  if (IsWine()) return;
-  ExpectEach({CreateDirectoryA(path(248).c_str(), nullptr), Opens(Create(path(260))),
-              CopyFileA(path(258).c_str(), path(260).c_str(), FALSE)},
-             {FALSE});
+  if (!IsWine()) Expect({folder(248), file(260, 258), file(258, 260)}, {false});
 }
 
 }  // namespace contract

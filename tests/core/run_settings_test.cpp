@@ -16,48 +16,31 @@ TEST(FormatSize, GivesMegabytesCutToOneDecimal) {
       {1048575, "0,9"}, {1048576, "1"},     {1258291, "1,1"},       {1258496, "1,2"},
       {10590208, "10"}, {10591232, "10,1"}, {4294967295u, "4095,9"}};
   for (const auto& [bytes, expected] : rows) {
-    char text[32] = "";
-    EXPECT_EQ(FormatSize(bytes, text, sizeof(text)), 1);
+    char text[7] = "before";
+    EXPECT_EQ(FormatSize(bytes, text, 6), strlen(expected) < 6) << bytes;
+    EXPECT_STREQ(text, strlen(expected) < 6 ? expected : "before") << bytes;
+    EXPECT_EQ(FormatSize(bytes, text, 7), 1);
     EXPECT_STREQ(text, expected) << bytes;
   }
-  char text[8] = "before";
-  EXPECT_EQ(FormatSize(4294967295u, text, 6), 0);
-  EXPECT_STREQ(text, "before");
-  EXPECT_EQ(FormatSize(4294967295u, text, 7), 1);
   EXPECT_EQ(FormatSize(1, nullptr, 100), 0);
 }
 
 TEST(IsValidPath, LooksBehindTheFirstColonAndCutsTrailingBlanks) {
-  struct Row {
-    const char* path;
-    int isValid;
-    const char* left;
-  };
-  const Row rows[] = {
-      {"C:", 1, "C:"},
-      {"C:\\My Files\\a b  ", 1, "C:\\My Files\\a b"},
-      {"a*b", 1, "a*b"},
-      {"\\\\server\\share", 1, "\\\\server\\share"},
-      {"a/b ", 1, "a/b"},
-      {"*:\\a", 1, "*:\\a"},
-      {"C:\\\xE9", 1, "C:\\\xE9"},
-      {"   ", 1, " "},
-      {" a\t ", 1, " a\t"},
-      {"", 0, ""},
-      {"C:\\a:b", 0, "C:\\a:b"},
-      {"C:/a", 0, "C:/a"},
-      {"C:\\a* ", 0, "C:\\a*"},
-      {"C:\\?", 0, "C:\\?"},
-      {"C:\\\"a", 0, "C:\\\"a"},
-      {"C:\\<", 0, "C:\\<"},
-      {"C:\\>", 0, "C:\\>"},
-      {"::", 0, "::"},
-      {"C:\\a|b", 0, "C:\\a|b"},
-  };
-  for (const Row& row : rows) {
-    std::string path = row.path;
-    EXPECT_EQ(IsValidPath(path.data()), row.isValid) << row.path;
-    EXPECT_STREQ(path.c_str(), row.left);
+  for (const char* good : {"C:", "a*b", "\\\\server\\share", "a/b", "*:\\a", "C:\\\xE9", " a\t"}) {
+    std::string path = good;
+    EXPECT_EQ(IsValidPath(path.data()), 1) << good;
+    for (const char* blanks : {" ", "  "}) {
+      path = std::string(good) + blanks;
+      EXPECT_EQ(IsValidPath(path.data()), 1) << good;
+      EXPECT_STREQ(path.c_str(), good);
+    }
+  }
+  char blanks[] = "   ";
+  EXPECT_EQ(IsValidPath(blanks), 1);
+  EXPECT_STREQ(blanks, " ");
+  for (std::string bad :
+       {"", "C:\\a:b", "C:/a", "C:\\a* ", "C:\\?", "C:\\\"a", "C:\\<", "C:\\>", "::", "C:\\a|b"}) {
+    EXPECT_EQ(IsValidPath(bad.data()), 0) << bad;
   }
   EXPECT_EQ(IsValidPath(nullptr), 0);
   EXPECT_EQ(CharInSet('\0', "/:*"), -1);
@@ -81,8 +64,9 @@ TEST_F(RunSettings, ADirectoryHasToFitItsBuffer) {
   EXPECT_EQ(ChooseInstallDir(&context, nullptr, kNeeded, "C:\\a"), StatusBadArgument);
   EXPECT_EQ(ChooseInstallDir(&context, directory, 0, "C:\\a"), StatusBadArgument);
   EXPECT_EQ(GetDefaultInstallDir(&context, nullptr, kNeeded), -1);
-  // A language without rows has no default.
-  context.currentLanguage = 50000;
+  EXPECT_EQ(ChooseLanguage(nullptr), StatusBadArgument);
+  EXPECT_EQ(FindInstalledProduct(nullptr), StatusBadArgument);
+  context.currentLanguage = 50000;  // a language without rows has no default
   EXPECT_EQ(ChooseInstallDir(&context, directory, kNeeded, nullptr), StatusBadDirectory);
 }
 
@@ -90,15 +74,18 @@ TEST_F(RunSettings, FreeSpaceIsComparedIn64BitsAndStopsNothingWhenUnknown) {
   context.header.spaceNeeded = 4294967295u;
   for (const bool hasNewerQuestion : {true, false}) {
     machine::CurrentSettings().hasGetDiskFreeSpaceEx = hasNewerQuestion;
-    machine::CurrentSettings().disks['C'].freeBytes = uint64_t{5} << 30;
+    // The older question answers in whole clusters.
+    uint64_t& freeBytes = machine::CurrentSettings().disks['C'].freeBytes;
+    freeBytes = hasNewerQuestion ? uint64_t{4294967295} : uint64_t{5} << 30;
     EXPECT_EQ(CheckDiskSpace(&context), StatusOk);
-    machine::CurrentSettings().disks['C'].freeBytes = 4294967294u;
+    freeBytes = 4294967294u;
     EXPECT_EQ(CheckDiskSpace(&context), StatusNoDiskSpace);
   }
   EXPECT_EQ(CheckDiskSpace(nullptr), StatusBadArgument);
   uint64_t bytes = 0;
-  EXPECT_FALSE(GetFreeDiskSpace("Q:\\a", &bytes));
-  EXPECT_FALSE(GetFreeDiskSpace(nullptr, &bytes));
+  for (const char* path : {"Q:\\a", "C:", static_cast<const char*>(nullptr)}) {
+    EXPECT_FALSE(GetFreeDiskSpace(path, &bytes));
+  }
   EXPECT_FALSE(GetFreeDiskSpace((std::string(260, 'a') + "\\b").c_str(), &bytes));
   machine::CurrentSettings().hasGetDiskFreeSpaceEx = true;
   FailCall("GetDiskFreeSpaceExA");  // then the older question has the answer
@@ -110,7 +97,7 @@ TEST_F(RunSettings, FreeSpaceIsComparedIn64BitsAndStopsNothingWhenUnknown) {
 TEST_F(RunSettings, AskingForTheSpaceNeededLeavesAnOpenPackageOpen) {
   ImageBuilder().Write(&pc);
   ASSERT_EQ(OpenPackage(&context), StatusOk);
-  EXPECT_EQ(GetNeededSpace(&context), 0u);
+  EXPECT_EQ(GetNeededSpace(&context) + GetNeededSpace(nullptr), 0u);
   EXPECT_NE(context.packageFile, nullptr);
 }
 

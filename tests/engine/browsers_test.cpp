@@ -14,7 +14,6 @@ TEST_F(Browsers, ResultsThatDoNotFitLeaveTheBufferAlone) {
   EXPECT_STREQ(buffer, "old");
   EXPECT_EQ(FindOperaPluginDir(buffer, 17), 1);
   EXPECT_STREQ(buffer, "C:\\Opera\\Plugins");
-  EXPECT_EQ(FindOperaPluginDir(nullptr, 260), 0);
 }
 
 TEST_F(Browsers, ANavigatorDirectoryIsTakenAsItStands) {
@@ -38,24 +37,27 @@ TEST_F(Browsers, ANavigatorDirectoryIsTakenAsItStands) {
 
 TEST_F(Browsers, AValueIsReadUpTo260BytesWithOrWithoutItsNul) {
   const std::string key = AppPathsKey("Opera.exe");
-  const auto read = [&](char(&data)[260], DWORD count = 260) {
+  char data[260] = {};
+  const auto read = [&](DWORD count) {
     return ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, &count);
   };
-  char data[260] = {};
-  for (const std::string& good : {std::string(259, 'p'), std::string(259, 'p') + '\0'}) {
-    SetRegistryText(key, "Path", good);
-    EXPECT_EQ(read(data), 1);
-    EXPECT_STREQ(data, good.c_str());
+  for (const size_t size : {259u, 260u, 261u}) {  // with its NUL
+    SetRegistryText(key, "Path", std::string(size - 1, 'p') + '\0');
+    EXPECT_EQ(read(260), size <= 260) << size;
+    SetRegistryText(key, "Path", std::string(size, 'p'));
+    EXPECT_EQ(read(260), size <= 259) << size;
   }
-  for (const std::string& bad : {std::string(260, 'p'), std::string(260, 'p') + '\0'}) {
-    SetRegistryText(key, "Path", bad);
-    EXPECT_EQ(read(data), 0);
-  }
+  SetRegistryText(key, "Path", "");
+  EXPECT_EQ(read(0), 0);
   DWORD count = sizeof(data);
-  EXPECT_EQ(read(data, 0), 0);
-  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, "", "Path", data, &count), 0);
-  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", nullptr, &count), 0);
-  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, nullptr), 0);
+  for (const int result :
+       {ReadRegistryValue(HKEY_LOCAL_MACHINE, "", "Path", data, &count),
+        ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", nullptr, &count),
+        ReadRegistryValue(HKEY_LOCAL_MACHINE, key.c_str(), "Path", data, nullptr),
+        FindNetscapePluginDir(nullptr, 260), FindExplorerPluginDir(nullptr, 260),
+        FindOperaPluginDir(nullptr, 260)}) {
+    EXPECT_EQ(result, 0);
+  }
 }
 
 }  // namespace

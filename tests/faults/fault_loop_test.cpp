@@ -64,8 +64,16 @@ class FaultLoop : public testing::Test {
  protected:
   enum class Machine { kFresh, kOutdated, kUpToDate };
 
+  // How much a loop must have tried at least, so that it can't pass by trying nothing: some less
+  // than there is today.
+  struct Floor {
+    int faults, failures, powerLosses;
+    size_t statesRunAgain;
+  };
+
   // The whole loop of one kind of run, on a machine with no product, an older or the same one.
-  void Run(const RunKind& runKind, Machine installed, const std::string& system = "") {
+  void Run(const RunKind& runKind, Machine installed, const Floor& floor,
+           const std::string& system = "") {
     kind = runKind;
     Prepare(installed, system);
     const RunReport report = RunFrom(before, {});
@@ -81,11 +89,13 @@ class FaultLoop : public testing::Test {
     TryCalls({.function = kAllocation, .fromThenOn = true});
     if (!kind.workButtons.empty()) TryCalls({.function = kCancel});
     Tell();
+    EXPECT_GE(faults, floor.faults);
+    EXPECT_GE(faults - endedWell, floor.failures);
+    EXPECT_GE(powerLosses, floor.powerLosses);
+    EXPECT_GE(statesRunAgain.size(), floor.statesRunAgain);
   }
 
  private:
-  fs::path Folder() const { return pc.Host(""); }
-
   void Prepare(Machine installed, const std::string& system) {
     pc.Write("machine.ini", "[system]\nnow = 2001-12-31T23:59:00\n" + system);
     pc.Restart();
@@ -93,17 +103,17 @@ class FaultLoop : public testing::Test {
     machine::Stop();
     if (installed != Machine::kFresh) {
       WriteImage(pc, installed == Machine::kOutdated ? kOldVersion : kNewVersion);
-      ASSERT_EQ(RunWithFault({.commandLine = "/s /r"}, {}, Folder()).code, StatusOk);
-      fs::remove(Folder() / kLogPath);
+      ASSERT_EQ(RunWithFault({.commandLine = "/s /r"}, {}, folder).code, StatusOk);
+      fs::remove(folder / kLogPath);
     }
     WriteImage(pc, kNewVersion);
-    before = ReadMachine(Folder());
+    before = ReadMachine(folder);
   }
 
   RunReport RunFrom(const MachineState& state, const Injection& injection) {
-    WriteMachine(Folder(), state);
-    const RunReport report = RunWithFault(kind, injection, Folder());
-    after = ReadMachine(Folder());
+    WriteMachine(folder, state);
+    const RunReport report = RunWithFault(kind, injection, folder);
+    after = ReadMachine(folder);
     return report;
   }
 
@@ -128,7 +138,7 @@ class FaultLoop : public testing::Test {
       if (report.end == RunEnd::kReturned && report.strikes == 0) return;
       Count(injection, report);
       const MachineState left = after;
-      const FaultyRun run = {kind, injection, report, before, whole, left};
+      const FaultyRun run = {kind, injection, report, before, whole, left, folder};
       Complain(run, JudgeRun(run));
       RunAgain(run);
     }
@@ -172,6 +182,7 @@ class FaultLoop : public testing::Test {
   }
 
   TestMachine pc;
+  const fs::path folder = pc.Host("");
   RunKind kind;
   MachineState before;
   MachineState whole;  // what a run without a fault leaves
@@ -186,11 +197,12 @@ class FaultLoop : public testing::Test {
 constexpr char kSilentInstall[] = "/s /r /rf:C:\\report.txt";
 
 TEST_F(FaultLoop, FreshInstall) {
-  Run({.name = "fresh install", .commandLine = kSilentInstall}, Machine::kFresh);
+  Run({.name = "fresh install", .commandLine = kSilentInstall}, Machine::kFresh,
+      {500, 190, 90, 50});
 }
 
 TEST_F(FaultLoop, Update) {
-  Run({.name = "update", .commandLine = kSilentInstall}, Machine::kOutdated);
+  Run({.name = "update", .commandLine = kSilentInstall}, Machine::kOutdated, {520, 200, 95, 40});
 }
 
 // The image is read, and all that is written goes, through the runtime's descriptors.
@@ -198,11 +210,12 @@ TEST_F(FaultLoop, UpdateByDescriptors) {
   Run({.name = "update by descriptors",
        .commandLine = kSilentInstall,
        .always = {{.function = "CreateFileA", .fromThenOn = true}}},
-      Machine::kOutdated, "platform = 9x\n");
+      Machine::kOutdated, {560, 220, 100, 40}, "platform = 9x\n");
 }
 
 TEST_F(FaultLoop, Removal) {
-  Run({.name = "removal", .work = kRemoval, .commandLine = "/s /u /r"}, Machine::kUpToDate);
+  Run({.name = "removal", .work = kRemoval, .commandLine = "/s /u /r"}, Machine::kUpToDate,
+      {310, 75, 55, 45});
 }
 
 TEST_F(FaultLoop, RemovalProgram) {
@@ -210,19 +223,22 @@ TEST_F(FaultLoop, RemovalProgram) {
        .work = kRemoval,
        .commandLine = "/s /r",
        .image = "drive_c/windows/MorivRmv.exe"},
-      Machine::kUpToDate, "platform = 9x\n");
+      Machine::kUpToDate, {310, 75, 55, 45}, "platform = 9x\n");
 }
 
 TEST_F(FaultLoop, Help) {
-  Run({.name = "help", .work = kHelp, .commandLine = "/h /s /rf:C:\\report.txt"}, Machine::kFresh);
+  Run({.name = "help", .work = kHelp, .commandLine = "/h /s /rf:C:\\report.txt"}, Machine::kFresh,
+      {50, 0, 5, 0});
 }
 
 TEST_F(FaultLoop, DialogInstall) {
-  Run({.name = "dialog install", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kFresh);
+  Run({.name = "dialog install", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kFresh,
+      {1200, 340, 70, 50});
 }
 
 TEST_F(FaultLoop, DialogUpdate) {
-  Run({.name = "dialog update", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kOutdated);
+  Run({.name = "dialog update", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kOutdated,
+      {1300, 360, 75, 40});
 }
 
 TEST_F(FaultLoop, DialogRemoval) {
@@ -230,7 +246,7 @@ TEST_F(FaultLoop, DialogRemoval) {
        .work = kRemoval,
        .commandLine = "/u /r",
        .workButtons = {IDC_REMOVE}},
-      Machine::kUpToDate);
+      Machine::kUpToDate, {1050, 165, 60, 45});
 }
 
 }  // namespace

@@ -1,53 +1,16 @@
 #include "tests/faults/run_judgement.h"
 
 #include <algorithm>
+#include <optional>
+#include <regex>
 #include <string_view>
 
-#include "core/status.h"
-#include "tests/faults/log_text.h"
+#include "tests/support/documented_codes.h"
+#include "tools/image/run_explainer.h"
 
 namespace {
 
 using Complaints = std::vector<std::string>;
-
-struct ExitCodeRow {
-  StatusCode code;
-  unsigned works;                   // Work that can give it
-  std::vector<const char*> events;  // one of these tells the reason
-};
-
-const ExitCodeRow kExitCodes[] = {
-    {0, kHelp, {}},
-    {StatusOk, kInstall | kRemoval, {}},
-    {StatusRemovalProgramFailed, kInstall, {"Error installing Uninstall file"}},
-    {StatusNotRegistered, kInstall, {"Couldn't register Moriv"}},
-    {StatusBadPackage,
-     kInstall | kRemoval,
-     {"Cannot initialize Data File", "Error opening Data File", "Error preparing",
-      "Invalide or abscent"}},
-    {StatusNoMemory,
-     kInstall | kRemoval,
-     {"Cannot allocate memory", "Error while constructing", "Cannot create destination file"}},
-    {StatusSeekFailed, kInstall | kRemoval, {"Error preparing"}},
-    {StatusBadRecord, kInstall | kRemoval, {"Cannot read next install file"}},
-    {StatusReadFailed,
-     kInstall | kRemoval,
-     {"Error reading Data File", "Cannot create destination file"}},
-    {StatusNoSystemDir, kInstall | kRemoval, {"Error while constructing"}},
-    {StatusDeleteFailed, kInstall, {"Error deleting file"}},
-    {StatusCreateDirFailed, kInstall, {"Cannot create the file path"}},
-    {StatusCreateFileFailed, kInstall, {"Cannot create destination file"}},
-    {StatusExpandFailed, kInstall, {"Cannot create destination file"}},
-    {StatusCopyFailed, kInstall, {"Error copying"}},
-    {StatusServicesRemain, kRemoval, {"Cannot unsitall"}},
-};
-
-const ExitCodeRow* FindRow(const FaultyRun& run) {
-  const auto row = std::ranges::find_if(kExitCodes, [&](const ExitCodeRow& candidate) {
-    return candidate.code == run.report.code && (candidate.works & run.kind.work) != 0;
-  });
-  return row != std::end(kExitCodes) ? row : nullptr;
-}
 
 bool IsDialog(const RunKind& kind) {
   return !kind.workButtons.empty();
@@ -63,7 +26,9 @@ void JudgeCode(const FaultyRun& run, Complaints* complaints) {
   const StatusCode code = run.report.code;
   const bool isKnown = IsDialog(run.kind) ? code == StatusOk || code == StatusCancelled ||
                                                 code == StatusDialogAborted
-                                          : FindRow(run) != nullptr;
+                       : run.kind.work == kHelp
+                           ? code == 0
+                           : IsSilentEnd(code, run.kind.work == kInstall ? "install" : "removal");
   if (!isKnown) complaints->emplace_back("no exit code of this run");
 }
 
@@ -75,20 +40,35 @@ bool CanLackLog(const FaultyRun& run) {
                  {kAllocation, "LoadStringA", "GetWindowsDirectoryA", "_creat", "DialogBoxParamA"});
 }
 
-bool TellsReason(const FaultyRun& run, const std::vector<LogLine>& lines) {
-  const ExitCodeRow* const row = FindRow(run);
-  if (row == nullptr || row->events.empty()) return true;
-  return std::ranges::any_of(lines, [row](const LogLine& line) {
-    return line.severity != 'i' && std::ranges::any_of(row->events, [&](const char* event) {
-             return line.text.starts_with(event);
-           });
-  });
+// Of each event of a log of one block whether it is fatal; nullopt when a byte is out of form.
+std::optional<std::vector<bool>> ReadEvents(const std::string& log) {
+  static const std::regex heading("\r\n\r\nInstalling Moriv : [^\r\n]* \r\n\r\n");
+  static const std::regex event(
+      "([0-9]+)- (?:(Fatal Error : )[^\r\n]*\\. \r\n\r\n \\(Application will exit\\)|"
+      "(?!Fatal Error : )[^\r\n]*)\r\n");
+  const auto whole = std::regex_constants::match_continuous;
+  std::smatch match;
+  if (!std::regex_search(log, match, heading, whole)) return std::nullopt;
+  std::vector<bool> events;
+  for (auto at = match.suffix().first; at != log.end(); at = match.suffix().first) {
+    if (!std::regex_search(at, log.end(), match, event, whole)) return std::nullopt;
+    events.push_back(match[2].matched);
+    if (match[1] != std::to_string(events.size())) return std::nullopt;
+  }
+  return events;
 }
 
-bool HasRightEvents(const FaultyRun& run, const std::vector<LogLine>& lines) {
+// A reader of the log is told the exit code.
+bool TellsReason(const FaultyRun& run, const char* path) {
+  return run.report.code == StatusOk || run.report.code == 0 ||
+         image::ExplainLog(run.folder / path)
+                 .find("exit code   " + std::to_string(run.report.code) + " ") != std::string::npos;
+}
+
+bool HasRightEvents(const FaultyRun& run, const char* path, const std::vector<bool>& events) {
   // An event that finds no memory is lost, and nothing else.
   if (run.injection.function == kAllocation) return true;
-  const auto fatal = std::ranges::count(lines, 'f', &LogLine::severity);
+  const auto fatal = std::ranges::count(events, true);
   if (IsDialog(run.kind)) {
     // A seek that fails in the check for older files closes the package without an event, and the
     // pass that finds it closed adds none. Nor does a pass that the user stops between two records.
@@ -96,9 +76,8 @@ bool HasRightEvents(const FaultyRun& run, const std::vector<LogLine>& lines) {
     return fatal == (run.report.code == StatusDialogAborted ? 1 : 0);
   }
   // A silent run gives up at its fatal event.
-  const bool endsFatally = !lines.empty() && lines.back().severity == 'f';
-  if (fatal != (EndedWell(run.report.code) ? 0 : 1) || (fatal == 1 && !endsFatally)) return false;
-  return TellsReason(run, lines);
+  const bool isRight = EndedWell(run.report.code) ? fatal == 0 : fatal == 1 && events.back();
+  return isRight && TellsReason(run, path);
 }
 
 void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
@@ -109,10 +88,10 @@ void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
     if (!CanLackLog(run)) complaints->push_back(std::string("missing: ") + path);
     return;
   }
-  const auto lines = ReadLog(log->second);
-  if (!lines) {
+  const auto events = ReadEvents(log->second);
+  if (!events) {
     complaints->push_back(std::string("malformed: ") + path);
-  } else if (!HasRightEvents(run, *lines)) {
+  } else if (!HasRightEvents(run, path, *events)) {
     complaints->push_back(std::string("without the right events: ") + path + log->second);
   }
 }
@@ -133,19 +112,25 @@ bool Holds(const MachineState& state, const std::string& name, const std::string
   return item != state.items.end() && item->second == content;
 }
 
-// Without power nobody cleans up. A script that could not be written whole stays, without the
-// command that would use it. A system that doesn't tell its family gets the 9x family's command,
-// and a name that the catalog doesn't give is an empty one.
-bool MayDiffer(const FaultyRun& run, const std::string& name) {
-  return run.report.end == RunEnd::kStopped || name == kScript ||
-         (name == kRunOnce && run.injection.function == "GetVersionExA") ||
-         (name == kDisplayName && run.injection.function == "LoadStringA");
+// What may stand there besides the old and the whole content. Without power nobody cleans up, and
+// of a file that was being written there is a beginning; a script that could not be written whole
+// stays too, without the command that would use it. A system that doesn't tell its family gets the
+// 9x family's command, and a name that the catalog doesn't give is an empty one.
+bool MayStand(const FaultyRun& run, const std::string& name, const std::string& content) {
+  const auto whole = run.whole.items.find(name);
+  if (whole == run.whole.items.end()) return false;
+  const bool isFile = run.whole.files.contains(name) && whole->second != kFolder;
+  if (isFile && (run.report.end == RunEnd::kStopped || name == kScript))
+    return whole->second.starts_with(content);
+  if (name == kRunOnce && run.injection.function == "GetVersionExA")
+    return content.find("\\rundll.exe setupx.dll,") != std::string::npos;
+  return name == kDisplayName && run.injection.function == "LoadStringA" && content == "=\"\"";
 }
 
 void JudgeMachine(const FaultyRun& run, Complaints* complaints) {
   for (const auto& [name, content] : run.after.items) {
-    const bool isPartOfWork = run.whole.items.contains(name) && MayDiffer(run, name);
-    if (!Holds(run.before, name, content) && !Holds(run.whole, name, content) && !isPartOfWork) {
+    if (!Holds(run.before, name, content) && !Holds(run.whole, name, content) &&
+        !MayStand(run, name, content)) {
       complaints->push_back("neither old nor whole: " + name);
     }
   }
@@ -198,6 +183,7 @@ std::vector<std::string> JudgeRun(const FaultyRun& run) {
   if (run.report.end == RunEnd::kCrashed) complaints.emplace_back("crashed");
   if (run.report.end == RunEnd::kStuck) complaints.emplace_back("the dialog can't be closed");
   if (run.report.end == RunEnd::kReturned) {
+    if (run.injection.stop) complaints.emplace_back("the power was not lost");
     const std::string open = run.report.openObjects;
     const int leaked = run.report.leakedBlocks;
     if (!open.empty()) complaints.push_back("open: " + open);

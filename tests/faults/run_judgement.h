@@ -15,6 +15,7 @@ struct FaultyRun {
   const MachineState& before;
   const MachineState& whole;  // what a run without a fault makes of `before`
   const MachineState& after;
+  const std::filesystem::path& folder;  // where `after` stands
 };
 
 // 0 and the codes above it.
@@ -22,7 +23,8 @@ bool EndedWell(int code);
 
 // What is wrong, one text each: the end of the run, what it left open, its exit code, its log and
 // report, and the machine. Each thing on that is what it was, what an undisturbed run makes of it,
-// or gone; what such a run leaves alone is untouched.
+// or gone, and after a power loss a file may be a beginning; what such a run leaves alone is
+// untouched.
 std::vector<std::string> JudgeRun(const FaultyRun& run);
 
 // The same of a second run, without a fault, that found what the first one left and has made

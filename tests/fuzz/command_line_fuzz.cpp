@@ -1,18 +1,20 @@
-// The command line against a second reading of its rules, on texts that grow at will.
+// The command line, on texts that grow at will: what is taken stands in the line, and how the line
+// is cut into options changes nothing else.
 #include <cstring>
-#include <string>
+#include <tuple>
 
 #include "core/command_line.h"
 #include "tests/fuzz/fuzz_target.h"
 
 namespace {
 
-struct PlainRequest {
-  uint32_t options = 0;
-  int32_t language = kLanguageNone;
-  std::string installDir;
-  std::string reportFile;
-};
+SetupRequest Parse(const std::string& line) {
+  SetupRequest request = {};
+  request.language = kLanguageNone;
+  const bool hasMarker = line.find_first_of("/-") != std::string::npos;
+  EXPECT_EQ(ParseCommandLine(line.c_str(), &request), hasMarker ? 1 : 0);
+  return request;
+}
 
 std::string Lower(std::string text) {
   for (char& letter : text) {
@@ -21,63 +23,44 @@ std::string Lower(std::string text) {
   return text;
 }
 
-void ApplyPlainly(const std::string& option, PlainRequest* request) {
-  static constexpr struct {
-    const char* text;
-    int32_t language;
-  } kLanguages[] = {{"eng", kLanguageEnglish},
-                    {"fra", kLanguageFrench},
-                    {"ger", kLanguageGerman},
-                    {"ita", kLanguageItalian},
-                    {"spa", kLanguageSpanish}};
-  const std::string lower = Lower(option);
-  uint32_t& options = request->options;
-  if (lower == "s") options = (options & ~OptionInteractive) | OptionSilent;
-  if (lower == "i") options = (options & ~OptionSilent) | OptionInteractive;
-  if (lower == "n") options = (options & ~OptionSilent) | OptionInteractive | OptionRegister;
-  if (lower == "u") options |= OptionRemove;
-  if (lower == "r") options |= OptionRegister;
-  if (lower == "h" || lower == "?") options = OptionHelp;
-  if (lower.starts_with("d:") && lower.size() > 2) request->installDir = option.substr(2);
-  if (lower.starts_with("rf:") && lower.size() > 3) request->reportFile = option.substr(3);
-  for (const auto& row : kLanguages) {
-    if (lower == row.text) request->language = row.language;
-  }
+auto FieldsOf(const SetupRequest& request) {
+  return std::make_tuple(request.options, request.language, Lower(request.installDir),
+                         Lower(request.reportFile), request.productFound);
 }
 
-size_t FindMarker(const std::string& line, size_t from) {
-  const size_t slash = line.find('/', from);
-  return slash != std::string::npos ? slash : line.find('-', from);
-}
-
-bool ParsePlainly(const std::string& line, PlainRequest* request) {
-  size_t marker = FindMarker(line, 0);
-  if (marker == std::string::npos) return false;
-  while (marker != std::string::npos && marker + 1 < line.size()) {
-    const size_t start = marker + 1;
-    marker = FindMarker(line, start);
-    std::string option = line.substr(start, marker - start);
-    if (option.size() >= kPathSize) continue;  // has no effect, before its blanks are cut
-    while (option.size() > 1 && option.back() == ' ') option.pop_back();
-    ApplyPlainly(option, request);
-  }
-  return true;
+template <size_t N>
+void ExpectFrom(const std::string& line, const std::string& prefix, const char (&field)[N]) {
+  ASSERT_NE(std::memchr(field, 0, N), nullptr);
+  const std::string value = field;
+  if (value.empty()) return;
+  EXPECT_NE(Lower(line).find(prefix + Lower(value)), std::string::npos);
+  EXPECT_NE(line.find(value), std::string::npos);
+  EXPECT_TRUE(value.find('/') == std::string::npos && value.back() != ' ');
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  const std::string line(data, std::find(data, data + size, 0));
-  SetupRequest request = {};
-  request.language = kLanguageNone;
-  PlainRequest expected;
-  EXPECT_EQ(ParseCommandLine(line.c_str(), &request), ParsePlainly(line, &expected) ? 1 : 0);
-  EXPECT_EQ(request.options, expected.options);
-  EXPECT_EQ(request.language, expected.language);
-  EXPECT_NE(std::memchr(request.installDir, 0, sizeof(request.installDir)), nullptr);
-  EXPECT_NE(std::memchr(request.reportFile, 0, sizeof(request.reportFile)), nullptr);
-  EXPECT_EQ(request.installDir, expected.installDir);
-  EXPECT_EQ(request.reportFile, expected.reportFile);
-  EXPECT_EQ(request.productFound, 0);
+  std::string line(data, std::find(data, data + size, 0));
+  const SetupRequest request = Parse(line);
+  constexpr uint32_t kModes = OptionSilent | OptionInteractive;
+  EXPECT_NE(request.options & kModes, kModes);
+  EXPECT_EQ(request.options & ~(kModes | OptionRemove | OptionRegister | OptionHelp), 0u);
+  EXPECT_TRUE(request.language == kLanguageNone || request.language % 10000 == 0);
+  ExpectFrom(line, "d:", request.installDir);
+  ExpectFrom(line, "rf:", request.reportFile);
+
+  EXPECT_EQ(FieldsOf(Parse(Lower(line))), FieldsOf(request));
+  EXPECT_EQ(FieldsOf(Parse("setup" + line)), FieldsOf(request));
+  // A hyphen behind the last slash is as good as a slash.
+  const size_t lastSlash = line.rfind('/');
+  std::replace(line.begin() + static_cast<ptrdiff_t>(lastSlash + 1), line.end(), '-', '/');
+  EXPECT_EQ(FieldsOf(Parse(line)), FieldsOf(request));
+  // Options are taken one after the other.
+  const size_t middle = line.find('/', line.size() / 2);
+  if (middle == std::string::npos || line.find('-') != std::string::npos) return 0;
+  SetupRequest inTwo = Parse(line.substr(0, middle));
+  (void)ParseCommandLine(line.c_str() + middle, &inTwo);
+  EXPECT_EQ(FieldsOf(inTwo), FieldsOf(request));
   return 0;
 }

@@ -6,19 +6,8 @@
 // empty.txt.
 #include "tests/fuzz/tool_runs.h"
 
-namespace {
-
-const ToolRuns& ToolWithSample() {
-  static const ToolRuns tool;
-  static const bool isPacked = (tool.PackSample(), true);
-  EXPECT_TRUE(isPacked);
-  return tool;
-}
-
-}  // namespace
-
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  const ToolRuns& tool = ToolWithSample();
+  static const ToolRuns tool;
   const std::string text(data, data + size);
   tool.Write("fuzz.toml", text);
   const std::vector<std::string> before = tool.NamesIn("");

@@ -1,10 +1,11 @@
-// The resolver against a second reading of its rules, on a machine with Netscape and Opera; and the
-// stand-in's own way from a path to a file of the host, which must not lead out of the machine.
+// The resolver, on a machine with Netscape and Opera: elements are resolved one after the other,
+// each to a place below a directory that it can name; and the stand-in's own way from a path to a
+// file of the host, which must not lead out of the machine.
 //
 //   line 1   the base directory
 //   line 2   the file name; a text that fills its field has no NUL
 //   rest     the destination
-#include <optional>
+#include <sstream>
 #include <utility>
 #include <vector>
 
@@ -15,118 +16,98 @@
 #include "platform/text.h"
 #include "tests/fuzz/fuzz_target.h"
 #include "tests/support/product_test.h"
+#include "tests/support/test_image.h"
 
 namespace {
 
-using Target = std::pair<std::string, std::string>;  // path, directory
-
-constexpr char kNetscape[] = "C:\\ns\\Plugins";
-constexpr char kOpera[] = "C:\\opera\\Plugins";
-
-struct PlainMacro {
-  std::string_view text;
-  StatusCode missing;                    // when there are no directories
-  std::vector<std::string> directories;  // a base directory is put in
+struct BrowsedMachine : TestMachine {
+  BrowsedMachine() {
+    Write("drive_c/ns/Plugins/a", "");
+    Write("drive_c/opera/Plugins/a", "");
+    SetRegistryText(AppPathsKey("Netscape.exe"), "Path", "C:\\ns");
+    SetRegistryText(AppPathsKey("Opera.exe"), "Path", "C:\\opera;C:\\other");
+  }
 };
 
-std::vector<PlainMacro> Macros(const std::string& base) {
-  return {{"%REMOVE_DIR%", 0, {"C:\\windows"}},
-          {"%REMOVEDIR%", 0, {"C:\\windows"}},
-          {"%INSTALL_DIR%", 0, {base}},
-          {"%CURDIR%", 0, {base}},
-          {"%CUR_DIR%", 0, {base}},
-          {"%SYS_DIR%", 0, {"C:\\windows\\system32"}},
-          {"%SYSDIR%", 0, {"C:\\windows\\system32"}},
-          {"%PLUGIN_NS_DIR%", StatusNoNetscape, {kNetscape}},
-          {"%PLUGIN_IE_DIR%", StatusNoExplorer, {}},
-          {"%PLUGIN_OPERA_DIR%", StatusNoOpera, {kOpera}},
-          {"%PLUGIN_ALL_DIR%", 0, {kNetscape, kOpera}},
-          {"", 0, {base}}};
+using Target = std::pair<std::string, std::string>;  // path, directory
+using Resolution = std::pair<StatusCode, std::vector<Target>>;
+
+Resolution Resolve(const std::string& base, const std::string& name,
+                   const std::string& destination) {
+  FileRecord record = {};
+  SetField(record.fileName, name);
+  SetField(record.destination, destination);
+  SetupContext context = {};
+  TargetList list = {};
+  Resolution resolution;
+  resolution.first = ResolveTargets(&context, &list, base.c_str(), &record, false);
+  for (int32_t i = 0; i < list.count; ++i)
+    resolution.second.emplace_back(list.entries[i].path, list.entries[i].directory);
+  FreeTargets(&list);
+  return resolution;
 }
 
 std::string WithBackslash(const std::string& text) {
   return text.empty() || text.back() == '\\' ? text : text + '\\';
 }
 
-StatusCode ResolvePlainly(const std::string& base, const std::string& name, std::string rest,
-                          std::vector<Target>* targets) {
-  StatusCode result = StatusOk;
-  while (!rest.empty()) {
-    const std::string element = rest.substr(0, rest.find(';'));
-    rest.erase(0, std::min(element.size() + 1, rest.size()));
-    const std::vector<PlainMacro> macros = Macros(base);
-    const auto macro = std::find_if(macros.begin(), macros.end(), [&](const PlainMacro& row) {
-      return BeginsWithIgnoringCase(element.c_str(), std::string(row.text).c_str());
-    });
-    const bool isAbsolute =
-        macro->text != "%PLUGIN_ALL_DIR%" && element.find(':') != std::string::npos;
-    if (!isAbsolute && macro->directories.empty()) result = macro->missing;
-    for (const std::string& directory :
-         isAbsolute ? std::vector<std::string>{element} : macro->directories) {
-      std::string tail = isAbsolute ? "" : element.substr(macro->text.size());
-      const bool hasTail =
-          macro->directories.size() > 1 ? tail != "\\" && !tail.empty() : !tail.empty();
-      if (tail.starts_with('\\')) tail.erase(0, 1);
-      const std::string place = hasTail ? WithBackslash(directory) + tail : directory;
-      const std::string path = WithBackslash(place) + name;
-      if (path.size() >= kPathSize) return StatusBufferTooSmall;
-      targets->emplace_back(path, hasTail && place.size() + 1 < kPathSize ? place : "");
-      result = StatusOk;
-    }
-  }
-  return result;
+// The element as it stands, or a directory and the element's end.
+bool IsPlaceOf(const std::string& element, const std::string& base, const std::string& place) {
+  const std::string asItStands = WithBackslash(element);
+  if (place == asItStands && element.find(':') != std::string::npos) return true;
+  const std::string directories[] = {base, "C:\\windows", "C:\\windows\\system32",
+                                     "C:\\ns\\Plugins", "C:\\opera\\Plugins"};
+  return std::ranges::any_of(directories, [&](const std::string& directory) {
+    const std::string root = WithBackslash(directory);
+    return place.starts_with(root) && asItStands.ends_with(place.substr(root.size()));
+  });
 }
 
-void RegisterBrowsers(const TestMachine& pc) {
-  pc.Write("drive_c/ns/Plugins/a", "");
-  pc.Write("drive_c/opera/Plugins/a", "");
-  SetRegistryText(AppPathsKey("Netscape.exe"), "Path", "C:\\ns");
-  SetRegistryText(AppPathsKey("Opera.exe"), "Path", "C:\\opera;C:\\other");
+// A path leads nowhere out of the machine's folder.
+void ExpectInside(const TestMachine& pc, const std::string& path) {
+  const auto location = machine::Locate(path);
+  EXPECT_TRUE(!location ||
+              location->host.lexically_normal().string().starts_with(pc.Host("drive_").string()))
+      << location->host;
+  (void)FileExists(path.c_str());
+  (void)DirectoryExists(path.c_str());
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static TestMachine pc;
-  static const bool hasBrowsers = (RegisterBrowsers(pc), true);
-  EXPECT_TRUE(hasBrowsers);
+  static const BrowsedMachine pc;
   FuzzInput input(data, size);
-  const auto takeText = [&](size_t limit) {
-    const std::string line = input.TakeLine();
-    return line.substr(0, std::min(line.find('\0'), limit));
+  const auto cut = [](std::string text, size_t limit) {
+    text.resize(std::min({text.find('\0'), text.size(), limit}));
+    return text;
   };
-  const std::string base = takeText(kPathSize - 1);
-  FileRecord record = {};
-  const std::string name = takeText(sizeof(record.fileName));
-  const std::string_view rest = input.rest();
-  const std::string destination(
-      rest.substr(0, std::min(rest.find('\0'), sizeof(record.destination))));
-  name.copy(record.fileName, name.size());
-  destination.copy(record.destination, destination.size());
+  const std::string base = cut(input.TakeLine(), kPathSize - 1);
+  const std::string name = cut(input.TakeLine(), sizeof(FileRecord::fileName));
+  const std::string destination(cut(std::string(input.rest()), sizeof(FileRecord::destination)));
 
-  std::vector<Target> expected;
-  const StatusCode expectedResult = ResolvePlainly(base, name, destination, &expected);
-  SetupContext context = {};
-  TargetList list = {};
-  EXPECT_EQ(ResolveTargets(&context, &list, base.c_str(), &record, false), expectedResult);
-  std::vector<Target> targets;
-  for (int32_t i = 0; i < list.count; ++i) {
-    targets.emplace_back(list.entries[i].path, list.entries[i].directory);
-  }
-  FreeTargets(&list);
-  EXPECT_EQ(targets, expected);
-
-  targets.emplace_back(base, rest);
-  for (const auto& [path, directory] : targets) {
-    for (const std::string& text : {path, directory}) {
-      const auto location = machine::Locate(text);
-      EXPECT_TRUE(!location || location->host.lexically_normal().string().starts_with(
-                                   pc.Host("drive_").string()))
-          << location->host;
-      (void)FileExists(text.c_str());
-      (void)DirectoryExists(text.c_str());
+  Resolution inTurn = {StatusOk, {}};
+  std::istringstream elements(destination);
+  for (std::string element; inTurn.first >= 0 && std::getline(elements, element, ';');) {
+    // The semicolon makes an empty element one too; there is no room for it in a full field.
+    const bool isFull = element.size() == sizeof(FileRecord::destination);
+    const auto [result, targets] = Resolve(base, name, isFull ? element : element + ';');
+    for (const auto& [path, directory] : targets) {
+      EXPECT_TRUE(path.ends_with(name));
+      const std::string place = path.substr(0, path.size() - name.size());
+      EXPECT_TRUE(IsPlaceOf(element, base, place)) << element << " -> " << path;
+      EXPECT_TRUE(directory.empty() || WithBackslash(directory) == place) << directory;
+      ExpectInside(pc, path);
+      ExpectInside(pc, directory);
     }
+    EXPECT_LE(targets.size(), 2u);
+    EXPECT_TRUE(!targets.empty() || result == StatusBufferTooSmall || result == StatusNoExplorer);
+    inTurn.first = result;
+    inTurn.second.insert(inTurn.second.end(), targets.begin(), targets.end());
   }
+  EXPECT_EQ(Resolve(base, name, destination), inTurn);
+  ExpectInside(pc, base);
+  ExpectInside(pc, std::string(input.rest()));
   EXPECT_EQ(machine::OpenObjects(), "");
   return 0;
 }

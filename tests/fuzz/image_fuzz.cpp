@@ -1,14 +1,15 @@
 // A whole image: hostile bytes behind a small program, installed and removed silently. Nothing but
-// the targets of its records and the program's own four files is written, and a removal takes what
-// an install wrote.
+// what its records name and the program's own three files is touched, and a removal takes what an
+// install wrote.
 //
 //   0     how it is run: the bits below
 //   1...  the package
-#include <cstring>
-#include <optional>
+#include <algorithm>
+#include <iterator>
 #include <set>
+#include <sstream>
+#include <vector>
 
-#include "engine/resolver.h"
 #include "machine/drives.h"
 #include "package/package_format.h"
 #include "tests/fuzz/silent_run.h"
@@ -25,34 +26,42 @@ constexpr char kSettings[] = "[disk C]\nwritable = 200000\n[system]\nplatform = 
 constexpr char kImage[] = "drive_c/setup.exe";
 constexpr char kRemovalProgram[] = "drive_c/windows/MorivRmv.exe";
 
-template <typename Record>
-std::optional<Record> ReadAt(const std::string& bytes, uint64_t offset) {
-  Record record;
-  if (offset > bytes.size() || bytes.size() - offset < sizeof(record)) return std::nullopt;
-  std::memcpy(&record, bytes.data() + offset, sizeof(record));
-  return record;
-}
+using Files = std::map<std::filesystem::path, std::string>;
+using Places = std::set<std::filesystem::path>;
 
-// Where on the host the files of the package go that a walk over it reaches.
-std::set<std::filesystem::path> TargetsOf(const std::string& image) {
-  std::set<std::filesystem::path> hosts;
-  const auto header = ReadAt<PackageHeader>(image, image.size() - sizeof(PackageHeader));
-  uint64_t offset = header->dataOffset;
-  for (int i = 0; i < header->recordCount; ++i) {
-    const auto record = ReadAt<FileRecord>(image, offset);
-    if (!record || record->recordSize != sizeof(FileRecord)) break;
-    SetupContext context = {};
-    TargetList list = {};
-    (void)ResolveTargets(&context, &list, "C:\\Moriv", &*record, false);
-    for (int32_t target = 0; target < list.count; ++target) {
-      if (const auto location = machine::Locate(list.entries[target].path)) {
-        hosts.insert(location->host);
+// Wherever on the host the files of the package may go that a walk over it reaches: what a record's
+// element names, with or without the macro in front of it, in any directory that a macro can mean,
+// or the element as it stands.
+Places PlacesOf(const std::string& bytes) {
+  Places places;
+  const auto add = [&places](const std::string& path) {
+    if (const auto location = machine::Locate(path)) places.insert(location->host);
+  };
+  ImageBuilder image = ImageBuilder::TakenApart(bytes);
+  for (const ImageBuilder::Piece& piece : image.pieces()) {
+    if (piece.record.recordSize != sizeof(FileRecord)) break;
+    const std::string name = '\\' + FieldText(piece.record.fileName);
+    std::istringstream elements(FieldText(piece.record.destination));
+    for (std::string element; std::getline(elements, element, ';');) {
+      add(element + name);
+      const size_t macroEnd = element.starts_with('%') ? element.find('%', 1) + 1 : 0;
+      for (const char* directory :
+           {"C:\\Moriv\\", "C:\\windows\\", "C:\\windows\\system32\\", "C:\\opera\\Plugins\\"}) {
+        add(directory + element + name);
+        add(directory + element.substr(macroEnd) + name);
       }
     }
-    FreeTargets(&list);
-    offset += sizeof(FileRecord) + record->storedSize;
   }
-  return hosts;
+  return places;
+}
+
+// The files that were made, changed or deleted.
+Places Differences(const Files& before, const Files& after) {
+  std::vector<Files::value_type> lines;
+  std::ranges::set_symmetric_difference(before, after, std::back_inserter(lines));
+  Places places;
+  for (const auto& [file, bytes] : lines) places.insert(file);
+  return places;
 }
 
 }  // namespace
@@ -71,31 +80,27 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   pc.Write(kImage, image);
   pc.Write("drive_c/Moriv/kept.txt", "kept");
   pc.Write("drive_c/windows/system32/kept.dll", "kept");
-  const auto before = FilesOf(pc);
+  const Files before = FilesOf(pc);
 
   const StatusCode installed = RunSilently(pc, kImage, "/s /r /d:C:\\Moriv");
-  const auto targets = TargetsOf(image);
-  std::set<std::filesystem::path> own;
-  for (const char* name : {"MorivRmv.exe", "MorivLog.txt", "Moriv.INF"}) {
-    own.insert(pc.Host("drive_c/windows") / name);
-  }
-  own.insert(pc.Host(kImage));
-  for (const auto& [file, bytes] : FilesOf(pc)) {
-    const auto old = before.find(file);
-    const bool isUntouched = old != before.end() && old->second == bytes;
-    EXPECT_TRUE(isUntouched || targets.contains(file) || own.contains(file)) << file;
-  }
+  const Files between = FilesOf(pc);
+  const Places places = PlacesOf(image);
+  const Places own = {pc.Host("drive_c/windows/MorivRmv.exe"),
+                      pc.Host("drive_c/windows/MorivLog.txt"),
+                      pc.Host("drive_c/windows/Moriv.INF")};
   EXPECT_TRUE(pc.Read(kImage) == image);
 
   const bool byRemovalProgram = (how & kByRemovalProgram) != 0 && pc.Has(kRemovalProgram);
   const StatusCode removed =
       RunSilently(pc, byRemovalProgram ? kRemovalProgram : kImage, "/s /u /r /d:C:\\Moriv");
+  const Files after = FilesOf(pc);
+  for (const Files& now : {between, after}) {
+    for (const auto& file : Differences(before, now))
+      EXPECT_TRUE(places.contains(file) || own.contains(file)) << file;
+  }
   if (installed != StatusOk) return 0;
   EXPECT_EQ(removed, StatusOk);
-  for (const std::filesystem::path& target : targets) {
-    std::error_code tooLong;  // a name can be: in UTF-8 it has more bytes
-    EXPECT_TRUE(own.contains(target) || !std::filesystem::is_regular_file(target, tooLong))
-        << target;
-  }
+  for (const auto& file : Differences(before, between))
+    EXPECT_TRUE(own.contains(file) || !after.contains(file)) << file;
   return 0;
 }

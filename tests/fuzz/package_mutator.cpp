@@ -20,73 +20,18 @@ namespace {
 constexpr size_t kMostRecords = 6;
 constexpr size_t kLongestStream = 2000;
 
-struct Piece {
-  FileRecord record;
-  std::string stream;
-};
-
-struct Package {
-  std::vector<Piece> pieces;
-  PackageHeader header;
-};
-
-template <typename Record>
-Record ReadAt(const std::string& bytes, size_t offset) {
-  Record record = {};
-  std::memcpy(&record, bytes.data() + offset, std::min(sizeof(record), bytes.size() - offset));
-  return record;
-}
-
-// Whatever the bytes are, they are taken as a package.
-Package Parse(const std::string& bytes) {
-  Package package = {};
-  const size_t end = bytes.size() - std::min(bytes.size(), sizeof(PackageHeader));
-  package.header = ReadAt<PackageHeader>(bytes, end);
-  for (size_t offset = 0;
-       end - offset >= sizeof(FileRecord) && package.pieces.size() < kMostRecords;) {
-    Piece piece = {ReadAt<FileRecord>(bytes, offset), ""};
-    offset += sizeof(FileRecord);
-    const size_t stored = std::min<size_t>(piece.record.storedSize, end - offset);
-    piece.stream = bytes.substr(offset, stored);
-    offset += stored;
-    package.pieces.push_back(piece);
-  }
-  return package;
-}
-
-std::string Write(const Package& package) {
-  ImageBuilder image;
-  PackageHeader& header = image.header();
-  const PackageHeader good = header;
-  header = package.header;
-  header.headerSize = good.headerSize;
-  std::memcpy(header.magic, good.magic, sizeof(good.magic));
-  for (const auto& [record, packed] : package.pieces) {
-    std::string stream = packed;
-    if (stream.size() > kStreamMagicSize) stream.replace(0, kStreamMagicSize, kStreamMagic);
-    image.AddStream("", "", stream);
-    FileRecord& added = image.LastRecord();
-    const uint32_t storedSize = added.storedSize;
-    added = record;
-    added.recordSize = sizeof(FileRecord);
-    added.storedSize = storedSize;
-  }
-  return image.Bytes().substr(image.executable().size());
-}
-
 void Mutate(std::string* bytes, size_t maxSize) {
   const size_t size = bytes->size();
   bytes->resize(std::max(size, maxSize));
   bytes->resize(LLVMFuzzerMutate(reinterpret_cast<uint8_t*>(bytes->data()), size, bytes->size()));
 }
 
-// A field keeps its width: a text that fills it has no NUL.
+// A field keeps its width.
 template <size_t N>
 void MutateText(char (&field)[N]) {
-  std::string text(field, std::find(field, field + N, '\0'));
+  std::string text = FieldText(field);
   Mutate(&text, N);
-  std::memset(field, 0, N);
-  text.copy(field, N);
+  SetField(field, text);
 }
 
 template <typename Record>
@@ -95,19 +40,22 @@ void MutateBytes(Record* record) {
   (void)LLVMFuzzerMutate(bytes, sizeof(Record), sizeof(Record));
 }
 
-void MutatePackage(Package* package, std::minstd_rand& random) {
-  std::vector<Piece>& pieces = package->pieces;
+void MutatePackage(ImageBuilder* package, std::minstd_rand& random) {
+  std::vector<ImageBuilder::Piece>& pieces = package->pieces();
   const size_t kind = random() % 16;
-  if (kind == 0) return MutateText(package->header.defaultDirectory);
-  if (kind == 1) return MutateBytes(&package->header);
+  if (kind == 0) return MutateText(package->header().defaultDirectory);
+  if (kind == 1) return MutateBytes(&package->header());
   if (pieces.empty()) pieces.emplace_back();
-  Piece& piece = pieces[random() % pieces.size()];
-  if (kind == 2 && pieces.size() < kMostRecords) return pieces.push_back(Piece(piece));
+  ImageBuilder::Piece& piece = pieces[random() % pieces.size()];
+  if (kind == 2 && pieces.size() < kMostRecords)
+    return pieces.push_back(ImageBuilder::Piece(piece));
   if (kind == 3) return void(pieces.erase(pieces.begin() + (&piece - pieces.data())));
   if (kind == 4) return MutateBytes(&piece.record);
   if (kind < 8) return MutateText(piece.record.fileName);
   if (kind < 12) return MutateText(piece.record.destination);
   Mutate(&piece.stream, kLongestStream);
+  if (piece.stream.size() > kStreamMagicSize)
+    piece.stream.replace(0, kStreamMagicSize, kStreamMagic);
 }
 
 }  // namespace
@@ -116,9 +64,12 @@ size_t LLVMFuzzerCustomMutator(uint8_t* data, size_t size, size_t maxSize, unsig
   std::minstd_rand random(seed);
   if (random() % 8 == 0 || size == 0) return LLVMFuzzerMutate(data, size, maxSize);
   if (random() % 16 == 0) data[0] = static_cast<uint8_t>(random());
-  Package package = Parse(std::string(data + 1, data + size));
+  static const std::string stub = VersionedProgram("4.1.7");
+  // Whatever the bytes are, they are taken as a package.
+  ImageBuilder package = ImageBuilder::TakenApart(stub + std::string(data + 1, data + size),
+                                                  stub.size(), kMostRecords);
   MutatePackage(&package, random);
-  const std::string bytes = Write(package);
+  const std::string bytes = package.Bytes().substr(stub.size());
   if (bytes.size() + 1 > maxSize) return LLVMFuzzerMutate(data, size, maxSize);
   std::memcpy(data + 1, bytes.data(), bytes.size());
   return bytes.size() + 1;

@@ -1,4 +1,4 @@
-// moriv-image in the fuzzer's own process, in one folder for all inputs.
+// moriv-image in the fuzzer's own process, in one folder for all inputs, beside the sample.
 #pragma once
 
 #include <filesystem>
@@ -8,15 +8,14 @@
 #include "tests/fuzz/fuzz_target.h"
 #include "tests/tools/tool_bench.h"
 
-class ToolRuns : public ToolBench {
+class ToolRuns : public SampleBench {
  public:
-  using ToolBench::NamesIn;
-  using ToolBench::PackSample;
-  using ToolBench::Write;
+  using SampleBench::NamesIn;
+  using SampleBench::Write;
 
   // The exit status, which must be one that the tool has, with a message for a failure.
   int Run(const std::vector<std::string>& arguments) const {
-    const ToolRun run = RunImage(arguments);
+    const ToolRun run = SampleBench::Run(arguments);
     EXPECT_TRUE(run.status == 0 || run.status == 1 || run.status == 2) << run.status;
     EXPECT_EQ(run.status == 2, !run.err.empty()) << run.err;
     return run.status;

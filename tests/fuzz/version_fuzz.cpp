@@ -1,10 +1,10 @@
-// Version texts against a second reading of their rules, and version resources: of the text, of
-// hostile bytes, of a hostile executable.
+// Version texts: each token counts as far as its digits go, whatever separates them, and a file's
+// resource says what its text says; and version resources of hostile bytes, of a hostile
+// executable.
 //
 //   0     what the rest is: a version text, a version resource or an executable
 //   1...  the rest
 #include <array>
-#include <iterator>
 
 #include "engine/file_version.h"
 #include "machine/executable_resources.h"
@@ -18,26 +18,26 @@ using Version = std::array<int16_t, 3>;
 constexpr Version kNotSet = {kVersionNotSet, kVersionNotSet, kVersionNotSet};
 constexpr char kFile[] = "drive_c/a.exe";
 
-int16_t PlainNumber(std::string token) {
-  token.resize(std::min<size_t>(token.size(), 15));
-  return static_cast<int16_t>(std::strtoll(token.c_str(), nullptr, 10));
+Version Parse(const std::string& text) {
+  Version fields = {1, 2, 3};
+  EXPECT_EQ(ParseVersionText(text.c_str(), fields.data()),
+            text.empty() ? StatusNoVersion : StatusOk);
+  const auto notSet = std::count(fields.begin(), fields.end(), kVersionNotSet);
+  EXPECT_EQ(notSet, text.empty() ? 3 : 0);
+  return fields;
 }
 
-Version ParsePlainly(const std::string& text) {
-  if (text.empty()) return kNotSet;
-  Version version = kNotSet;
-  std::string token;
-  for (const char letter : text) {
-    if (std::string_view(".,- ").find(letter) == std::string_view::npos) {
-      token += letter;
-      continue;
-    }
-    *std::find(version.begin(), version.end() - 1, kVersionNotSet) = PlainNumber(token);
-    token.clear();
+void CheckText(std::string text) {
+  const Version version = Parse(text);
+  if (!text.empty()) {  // a token ends with its digits, and with its 15th character
+    EXPECT_EQ(Parse(text + 'x'), version);
+    EXPECT_EQ(Parse(text + std::string(15, 'x') + '1'), version);
   }
-  if (version[2] == kVersionNotSet) version[2] = PlainNumber(token);
-  std::replace(version.begin(), version.end(), kVersionNotSet, int16_t{0});
-  return version;
+  constexpr std::string_view kSeparators = ".,- ";
+  for (char& letter : text) {
+    if (kSeparators.find(letter) != std::string_view::npos) letter = '.';
+  }
+  EXPECT_EQ(Parse(text), version);
 }
 
 // What the program reads of the file at kFile.
@@ -60,14 +60,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (kind == 0) {
     const std::string_view rest = input.rest();
     const std::string text(rest.substr(0, rest.find('\0')));
-    Version fields = kNotSet;
-    EXPECT_EQ(ParseVersionText(text.c_str(), fields.data()),
-              text.empty() ? StatusNoVersion : StatusOk);
-    EXPECT_EQ(fields, ParsePlainly(text));
+    CheckText(text);
     pc.Write(kFile, PortableExecutable(size % 2 == 0, 16, 1,
                                        {{0x40C, VersionResource({{"FileVersion", text}})}}));
     if (text.size() < 20000) {  // a block tells its length in 16 bits
-      EXPECT_EQ(ReadVersion(), ParsePlainly(text));
+      EXPECT_EQ(ReadVersion(), Parse(text));
     }
     return 0;
   }

@@ -1,8 +1,10 @@
-// Where paths lead: the rules of names and drives.
+// Where paths lead on the host, and what the machine's settings and its image change of the file
+// functions. What these do anywhere is in tests/contract/.
 #include "machine/drives.h"
 
 #include <gtest/gtest.h>
 
+#include "platform/win32.h"
 #include "tests/support/test_machine.h"
 
 namespace fs = std::filesystem;
@@ -10,17 +12,42 @@ using machine::Locate;
 
 namespace {
 
-// What names lead to anywhere is in tests/contract/.
+HANDLE Open(const char* name, DWORD access = GENERIC_READ, DWORD share = 0) {
+  return CreateFileA(name, access, share, nullptr, OPEN_EXISTING, 0, nullptr);
+}
+
+HANDLE Create(const char* name) {
+  return CreateFileA(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
+}
+
+// Whether the open works; what it opened is closed again.
+bool Opens(HANDLE handle) {
+  return handle != INVALID_HANDLE_VALUE && CloseHandle(handle);
+}
+
+// At the position, from the file's start.
+bool Write(HANDLE handle, LONG position, const std::string& bytes) {
+  DWORD done = 99;
+  SetFilePointer(handle, position, nullptr, FILE_BEGIN);
+  return WriteFile(handle, bytes.data(), static_cast<DWORD>(bytes.size()), &done, nullptr);
+}
+
+// The answers of calls, made from left to right: y or n.
+std::string Told(std::initializer_list<int> answers) {
+  std::string told;
+  for (const int answer : answers) told += answer != 0 ? 'y' : 'n';
+  return told;
+}
+
 TEST(Drives, NamesFindTheirFilesAsTheHostSpellsThem) {
   TestMachine pc;
-  pc.Write("drive_c/Dir/Read Me.TXT", "x");
-  pc.Write("drive_c/both", "lower");
-  pc.Write("drive_c/BOTH", "upper");
-  pc.Write("drive_c/caf\xC3\xA9", "x");
-  pc.Write("drive_d/file", "x");
+  for (const char* file : {"drive_c/Dir/Read Me.TXT", "drive_c/both", "drive_c/BOTH", "drive_c/NUL",
+                           "drive_c/caf\xC3\xA9", "drive_d/file", "drive_c/what?"}) {
+    pc.Write(file, "x");
+  }
   struct {
     const char* path;
-    const char* host;  // in the machine's folder
+    const char* host;  // in the machine's folder; null: out of reach
     bool exists;
   } const rows[] = {
       {"c:/dIR\\READ me.txt", "drive_c/Dir/Read Me.TXT", true},
@@ -32,49 +59,44 @@ TEST(Drives, NamesFindTheirFilesAsTheHostSpellsThem) {
       {"C:\\DIR\\New Name", "drive_c/Dir/New Name", false},
       {"D:file", "drive_d/file", true},
       {"D:\\..\\drive_c\\both", "drive_d/drive_c/both", false},
+      {"C:\\NUL", nullptr, false},
+      {"C:\\what?", nullptr, false},
+      {"ab:c", nullptr, false},
   };
   for (const auto& row : rows) {
     const auto location = Locate(row.path);
-    ASSERT_TRUE(location.has_value()) << row.path;
+    ASSERT_EQ(location.has_value(), row.host != nullptr) << row.path;
+    if (row.host == nullptr) continue;
     EXPECT_EQ(location->host, pc.Host(row.host)) << row.path;
     EXPECT_EQ(location->exists, row.exists) << row.path;
   }
-  EXPECT_FALSE(Locate("C:\\none\\New Name")->parentExists);
-  EXPECT_TRUE(Locate("C:\\new")->parentExists);
-}
-
-TEST(Drives, HostsFilesOfImpossibleNamesAreOutOfReach) {
-  TestMachine pc;
-  pc.Write("drive_c/NUL", "x");
-  pc.Write("drive_c/what?", "x");
-  for (const char* path : {"C:\\NUL", "C:\\what?", "C:\\a:b", "ab:c", "C:\\prn\\x", "//server/x"})
-    EXPECT_FALSE(Locate(path).has_value()) << path;
 }
 
 TEST(Drives, ChangesInAFolderAreSeenWhoeverMakesThem) {
-  const auto exists = [](const char* path) { return Locate(path)->exists; };
+  const auto seen = [] {
+    std::string names;
+    for (const std::string name : {"dir\\one", "dir\\two", "dir\\three", "old\\one", "old\\two"}) {
+      if (Locate("C:\\" + name)->exists) names += name + ' ';
+    }
+    return names;
+  };
   for (const int others : {0, 300}) {  // a small folder and a large one
     SCOPED_TRACE(others);
     TestMachine pc;
     for (int i = 0; i < others; ++i) pc.Write("drive_c/dir/" + std::to_string(i), "x");
     pc.Write("drive_c/dir/One", "x");
-    EXPECT_TRUE(exists("C:\\DIR\\ONE"));
-    EXPECT_FALSE(exists("C:\\DIR\\TWO"));
+    EXPECT_EQ(seen(), "dir\\one ");
     pc.Write("drive_c/dir/Two", "x");
-    EXPECT_TRUE(exists("C:\\DIR\\TWO"));
+    EXPECT_EQ(seen(), "dir\\one dir\\two ");
     fs::rename(pc.Host("drive_c/dir/Two"), pc.Host("drive_c/dir/Three"));
-    EXPECT_FALSE(exists("C:\\DIR\\TWO"));
-    EXPECT_TRUE(exists("C:\\DIR\\THREE"));
+    EXPECT_EQ(seen(), "dir\\one dir\\three ");
     // Another folder under the same path: moved there, or made anew.
     fs::rename(pc.Host("drive_c/dir"), pc.Host("drive_c/old"));
-    pc.Write("drive_c/dir/Four", "x");
-    EXPECT_FALSE(exists("C:\\DIR\\ONE"));
-    EXPECT_TRUE(exists("C:\\DIR\\FOUR"));
-    EXPECT_TRUE(exists("C:\\OLD\\ONE"));
+    pc.Write("drive_c/dir/Two", "x");
+    EXPECT_EQ(seen(), "dir\\two old\\one ");
     fs::remove_all(pc.Host("drive_c/old"));
-    pc.Write("drive_c/old/Five", "x");
-    EXPECT_FALSE(exists("C:\\OLD\\ONE"));
-    EXPECT_TRUE(exists("C:\\OLD\\FIVE"));
+    pc.Write("drive_c/old/Two", "x");
+    EXPECT_EQ(seen(), "dir\\two old\\two ");
   }
 }
 
@@ -82,7 +104,7 @@ TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
   TestMachine pc;
   pc.Write("drive_c/dir/file", "x");
   const TemporaryFolder outside;
-  std::ofstream(outside.Path() / "file") << "x";
+  outside.Write("file", "x");
   fs::create_directory_symlink(pc.Host("drive_c/dir"), pc.Host("drive_c/inside"));
   fs::create_directory_symlink(outside.Path(), pc.Host("drive_c/outside"));
   fs::create_symlink(outside.Path() / "file", pc.Host("drive_c/outer file"));
@@ -92,6 +114,97 @@ TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
   for (const char* path : {"C:\\outside", "C:\\outside\\file", "C:\\outside\\new", "C:\\outer file",
                            "C:\\dangling", "E:\\file"}) {
     EXPECT_FALSE(Locate(path).has_value()) << path;
+  }
+}
+
+TEST(Disks, FullOneTakesAWriteWholeOrNotAtAll) {
+  TestMachine pc("[disk c]\nwritable = 10\n");
+  const auto room = [] { return *machine::CurrentSettings().disks['C'].writable; };
+  HANDLE file = Create("C:\\a");
+  // Two bytes more fit, and ten over what is there.
+  EXPECT_EQ(Told({Write(file, 0, "12345678"), Write(file, 8, "abc"),
+                  GetFileSize(file, nullptr) == 8, Write(file, 6, "7890"), Write(file, 10, "!"),
+                  Write(file, 0, "1234567890"), DeleteFileA("C:\\a"), CloseHandle(file),
+                  CopyFileA("C:\\a", "C:\\b", FALSE), pc.Has("drive_c/b")}),
+            "ynyynynynn");
+  EXPECT_TRUE(Opens(Create("C:\\a")));  // cut: ten bytes again
+  EXPECT_EQ(room(), 10u);
+  file = Create("C:\\b");
+  EXPECT_EQ(Told({Write(file, 0, "123456789"), Write(file, 10, "z"), CloseHandle(file),
+                  DeleteFileA("C:\\b")}),
+            "ynyy");  // the gap counts too
+  EXPECT_EQ(room(), 10u);
+  const int text = _creat("C:\\text", _S_IREAD | _S_IWRITE);
+  for (int number = 0; number < 64; ++number) {
+    EXPECT_EQ(number != text && _close(number) == 0, false);  // of a handle, or nothing
+  }
+  EXPECT_EQ(_write(text, "123\n567\n9", 9), -1);  // eleven bytes in text mode
+  EXPECT_EQ(_write(text, "123\n5678\n", 9), -1);
+  EXPECT_EQ(_write(text, "123\n56789", 9), 9);
+  EXPECT_EQ(_close(text), 0);
+}
+
+TEST(Disks, ReadOnlyOneRefusesEveryChange) {
+  TestMachine pc("[disk D]\nreadonly = 1\n");
+  pc.Write("drive_d/dir/file", "x");
+  for (const char* folder : {"drive_d/empty", "drive_e"}) fs::create_directory(pc.Host(folder));
+  const char* const file = "D:\\dir\\file";
+  // The root of a disk stays, empty or not.
+  EXPECT_EQ(
+      Told({Opens(Open(file)), CopyFileA(file, "C:\\copy", FALSE), Opens(Open(file, GENERIC_WRITE)),
+            Opens(Create("D:\\new")), DeleteFileA(file), CopyFileA(file, "D:\\copy", FALSE),
+            CreateDirectoryA("D:\\new", nullptr), RemoveDirectoryA("D:\\empty"),
+            RemoveDirectoryA("E:\\"), _chmod(file, _S_IREAD) == 0}),
+      "yynnnnnnnn");
+}
+
+TEST(Disks, SpaceIsWhatTheSettingsTell) {
+  TestMachine pc("[disk C]\nfree = 12287\n[disk D]\nfree = 18446744073709551615\n");
+  for (const char* drive : {"drive_d", "drive_e"}) fs::create_directory(pc.Host(drive));
+  struct {
+    const char* root;
+    uint64_t bytes;
+    DWORD clusters;
+  } const rows[] = {
+      {"C:", 12287, 2}, {"D:\\", UINT64_MAX, UINT32_MAX}, {"E:", uint64_t{10} << 30, 10 << 18}};
+  for (const auto& row : rows) {
+    ULARGE_INTEGER toCaller, total, all;
+    DWORD sectors = 0, bytes = 0, clusters = 0, allClusters = 0;
+    EXPECT_TRUE(GetDiskFreeSpaceExA(row.root, &toCaller, &total, &all)) << row.root;
+    EXPECT_TRUE(GetDiskFreeSpaceA(row.root, &sectors, &bytes, &clusters, &allClusters));
+    EXPECT_EQ(toCaller.QuadPart, row.bytes) << row.root;
+    EXPECT_TRUE(all.QuadPart >= row.bytes && total.QuadPart >= all.QuadPart) << row.root;
+    EXPECT_EQ(sectors * bytes, 4096u);
+    EXPECT_EQ(clusters, row.clusters) << row.root;
+  }
+}
+
+TEST(Image, CanBeReadOnlyWhileItRuns) {
+  for (const std::string where : {"setup.exe", "drive_c/setup.exe"}) {
+    for (const std::string family : {"nt", "9x"}) {
+      SCOPED_TRACE(where + ' ' + family);
+      TestMachine pc("[system]\nplatform = " + family + '\n');
+      pc.Write(where, "MZ");
+      pc.Write("other.exe", "MZ");
+      pc.Restart(where);
+      const bool isOutside = where == "setup.exe";  // of the drives: the one file of a drive
+      const char* const image = isOutside ? "Z:\\SETUP.exe" : "C:\\SETUP.exe";
+      EXPECT_EQ(machine::ImagePath(), isOutside ? "Z:\\setup.exe" : "C:\\setup.exe");
+      EXPECT_EQ(Opens(Open(image)), family == "nt");
+      const int descriptor = _sopen(image, _O_RDONLY | _O_BINARY, _SH_DENYNO);
+      EXPECT_EQ(Told({_close(descriptor) == 0, CopyFileA(image, "C:\\copy", FALSE),
+                      CopyFileA("C:\\copy", image, FALSE), Opens(Open(image, GENERIC_WRITE, 3)),
+                      _sopen(image, _O_WRONLY | _O_BINARY, _SH_DENYNO) >= 0, Opens(Create(image)),
+                      DeleteFileA(image), pc.Read(where) == "MZ"}),
+                "yynnnnny");
+      if (!isOutside) continue;
+      EXPECT_EQ(GetFileAttributesA("Z:\\"), FILE_ATTRIBUTE_DIRECTORY);
+      for (const char* name : {"Z:\\", "Z:\\other.exe", "Z:\\setup.exe\\"}) {
+        EXPECT_EQ(Told({Opens(Create(name)), Opens(Open(name)), CreateDirectoryA(name, nullptr),
+                        RemoveDirectoryA(name), DeleteFileA(name)}),
+                  "nnnnn");
+      }
+    }
   }
 }
 

@@ -1,10 +1,9 @@
-// The registry's file: what is written, what is read, what is refused.
+// The registry's file: what is written, what is read, what is refused; and the registry functions
+// where this machine is stricter than Windows, and on the 9x family.
 #include "machine/registry_store.h"
 
-#include <gtest/gtest.h>
-
 #include "machine/host_file.h"
-#include "tests/support/test_machine.h"
+#include "tests/support/product_test.h"
 
 namespace {
 
@@ -12,45 +11,49 @@ class RegistryFile : public testing::Test {
  protected:
   // Loads a file of this text. The error, or "".
   std::string Load(const std::string& text) {
-    std::ofstream(File(), std::ios::binary) << text;
+    folder_.Write("registry.reg", text);
     std::string error;
-    return machine::LoadRegistry(File(), &error) ? "" : error;
+    return machine::LoadRegistry(folder_.Host("registry.reg"), &error) ? "" : error;
   }
 
   std::string Saved() {
     machine::SaveRegistry();
-    const auto bytes = machine::ReadHostFile(File());
-    return bytes ? std::string(bytes->begin(), bytes->end()) : "";
+    return folder_.Read("registry.reg");
   }
 
   void TearDown() override { machine::CloseRegistry(); }
-
-  std::filesystem::path File() const { return folder_.Path() / "registry.reg"; }
 
  private:
   TemporaryFolder folder_;
 };
 
 TEST_F(RegistryFile, ItsOwnFormComesBackByteForByte) {
-  const std::string text =
-      "REGEDIT4\n"
-      "\n[HKEY_LOCAL_MACHINE]\n"
-      "\"AtTheRoot\"=\"\"\n"
-      "\n[HKEY_LOCAL_MACHINE\\Zz]\n"
-      "@=\"first made, first written\"\n"
-      "\"b\"=\"C:\\\\Program Files\\\\\\\"x\\\" ]\"\n"
-      "\"A \\\\ \\\"\"=\"d\xE9j\xE0\"\n"
-      "\"NoNul\"=hex(1):43,3a\n"
-      "\"Empty\"=hex(1):\n"
-      "\"TwoNuls\"=hex(1):41,00,00\n"
-      "\"Control\"=hex(1):41,0a,00\n"
-      "\"Expand\"=hex(2):25,00\n"
-      "\"Binary\"=hex(3):00,ff\n"
-      "\"Odd\"=hex(ffffffff):01\n"
-      "\n[HKEY_LOCAL_MACHINE\\Zz\\Below]\n"
-      "\n[HKEY_LOCAL_MACHINE\\Aa]\n"
-      "\n[HKEY_CURRENT_USER\\Kept]\n"
-      "\"x\"=\"y\"\n";
+  const std::string text = R"(REGEDIT4
+
+[HKEY_LOCAL_MACHINE]
+"AtTheRoot"=""
+
+[HKEY_LOCAL_MACHINE\Zz]
+@="first made, first written"
+"b"="C:\\Program Files\\\"x\" ]"
+"A \\ \""="d)"
+                           "\xE9j\xE0"
+                           R"("
+"NoNul"=hex(1):43,3a
+"Empty"=hex(1):
+"TwoNuls"=hex(1):41,00,00
+"Control"=hex(1):41,0a,00
+"Expand"=hex(2):25,00
+"Binary"=hex(3):00,ff
+"Odd"=hex(ffffffff):01
+
+[HKEY_LOCAL_MACHINE\Zz\Below]
+
+[HKEY_LOCAL_MACHINE\Aa]
+
+[HKEY_CURRENT_USER\Kept]
+"x"="y"
+)";
   ASSERT_EQ(Load(text), "");
   EXPECT_EQ(Saved(), text);
 }
@@ -64,56 +67,93 @@ TEST_F(RegistryFile, OtherFormsAreRead) {
                  "[HKEY_LOCAL_MACHINE\\a]\r\n@=\"one\"\r\n@=\"two\"\r\n"
                  "[HKEY_CLASSES_ROOT\\.htm]\r\n@=\"page\""),
             "");
-  EXPECT_EQ(Saved(),
-            "REGEDIT4\n"
-            "\n[HKEY_LOCAL_MACHINE\\A]\n@=\"two\"\n"
-            "\n[HKEY_LOCAL_MACHINE\\A\\B]\n"
-            "\"Long\"=hex(3):0a,ff,00,01\n"
-            "\"Number\"=hex(4):0f,01,00,00\n"
-            "\"Text\"=\"AB\"\n"
-            "\n[HKEY_LOCAL_MACHINE\\SOFTWARE]\n"
-            "\n[HKEY_LOCAL_MACHINE\\SOFTWARE\\Classes]\n"
-            "\n[HKEY_LOCAL_MACHINE\\SOFTWARE\\Classes\\.htm]\n@=\"page\"\n");
+  EXPECT_EQ(Saved(), R"(REGEDIT4
+
+[HKEY_LOCAL_MACHINE\A]
+@="two"
+
+[HKEY_LOCAL_MACHINE\A\B]
+"Long"=hex(3):0a,ff,00,01
+"Number"=hex(4):0f,01,00,00
+"Text"="AB"
+
+[HKEY_LOCAL_MACHINE\SOFTWARE]
+
+[HKEY_LOCAL_MACHINE\SOFTWARE\Classes]
+
+[HKEY_LOCAL_MACHINE\SOFTWARE\Classes\.htm]
+@="page"
+)");
 }
 
 TEST_F(RegistryFile, MistakesNameTheirLineAndChangeNothing) {
-  const std::string key = "REGEDIT4\n[HKEY_LOCAL_MACHINE\\A]\n";
-  const std::string deep = [] {
-    std::string path;
-    for (int level = 0; level < 513; ++level) path += "\\a";
-    return path;
-  }();
+  std::string deep = "HKEY_LOCAL_MACHINE";
+  for (int level = 0; level < 513; ++level) deep += "\\a";
+  const std::string wide = "HKEY_LOCAL_MACHINE\\" + std::string(256, 'n');
+  // The text behind the heading, and the error; a text in quotes stands in the third line.
   const std::pair<std::string, std::string> rows[] = {
-      {"", "1: the file does not begin with REGEDIT4"},
-      {"Windows Registry Editor Version 5.00\n", "1: the file does not begin with REGEDIT4"},
-      {"REGEDIT4\n\n\"a\"=\"b\"\n", "3: a value in front of the first key"},
-      {"REGEDIT4\n[HKEY_LOCAL_MACHINE\\A\n", "2: a section without its closing bracket"},
-      {"REGEDIT4\n[HKEY_USERS\\A]\n", "2: an unknown root key: HKEY_USERS"},
-      {"REGEDIT4\n[-HKEY_LOCAL_MACHINE\\A]\n", "2: an unknown root key: -HKEY_LOCAL_MACHINE"},
-      {"REGEDIT4\n[HKEY_LOCAL_MACHINE" + deep + "]\n",
-       "2: a bad key name: HKEY_LOCAL_MACHINE" + deep},
-      {"REGEDIT4\n[HKEY_LOCAL_MACHINE\\" + std::string(256, 'n') + "]\n",
-       "2: a bad key name: HKEY_LOCAL_MACHINE\\" + std::string(256, 'n')},
-      {key + "name=\"b\"\n", "3: neither a section nor a value"},
-      {key + "\"a\\n\"=\"b\"\n", "3: neither a section nor a value"},
-      {key + "\"a\tb\"=\"b\"\n", "3: a bad value name"},
-      {key + "\"a\"\"b\"\n", "3: a value without its equals sign"},
-      {key + "\"a\"=\"b\n", "3: a text that is not well quoted"},
-      {key + "\"a\"=\"b\\\n", "3: a text that is not well quoted"},
-      {key + "\"a\"=\"b\" c\n", "3: a text that is not well quoted"},
-      {key + "\"a\"=-\n", "3: data of an unknown form"},
-      {key + "\"a\"=hex(g):00\n", "3: a bad value type"},
-      {key + "\"a\"=hex(123456789):00\n", "3: a bad value type"},
-      {key + "\"a\"=hex:0g\n", "3: a bad hexadecimal byte"},
-      {key + "\"a\"=hex:001\n", "3: a bad hexadecimal byte"},
-      {key + "\"a\"=hex:00,\n", "3: a comma without a byte behind it"},
-      {key + "\"a\"=hex:00,\\\n  01,\\\n", "4: the file ends within a value"},
-      {key + "\"a\"=dword:\n", "3: a bad dword"},
-      {key + "\"a\"=dword:123456789\n", "3: a bad dword"},
+      {"\n\"a\"=\"b\"", "3: a value in front of the first key"},
+      {"[HKEY_LOCAL_MACHINE\\A", "2: a section without its closing bracket"},
+      {"[HKEY_USERS\\A]", "2: an unknown root key: HKEY_USERS"},
+      {"[-HKEY_LOCAL_MACHINE\\A]", "2: an unknown root key: -HKEY_LOCAL_MACHINE"},
+      {"[" + deep + "]", "2: a bad key name: " + deep},
+      {"[" + wide + "]", "2: a bad key name: " + wide},
+      {"name=\"b\"", "3: neither a section nor a value"},
+      {R"("a\n"="b")", "3: neither a section nor a value"},
+      {"\"a\tb\"=\"b\"", "3: a bad value name"},
+      {R"("a""b")", "3: a value without its equals sign"},
+      {R"("a"="b)", "3: a text that is not well quoted"},
+      {R"("a"="b\)", "3: a text that is not well quoted"},
+      {R"("a"="b" c)", "3: a text that is not well quoted"},
+      {R"("a"=-)", "3: data of an unknown form"},
+      {R"("a"=hex(g):00)", "3: a bad value type"},
+      {R"("a"=hex(123456789):00)", "3: a bad value type"},
+      {R"("a"=hex:0g)", "3: a bad hexadecimal byte"},
+      {R"("a"=hex:001)", "3: a bad hexadecimal byte"},
+      {R"("a"=hex:00,)", "3: a comma without a byte behind it"},
+      {"\"a\"=hex:00,\\\n  01,\\", "4: the file ends within a value"},
+      {R"("a"=dword:)", "3: a bad dword"},
+      {R"("a"=dword:123456789)", "3: a bad dword"},
   };
   ASSERT_EQ(Load("REGEDIT4\n[HKEY_LOCAL_MACHINE\\Before]\n"), "");
-  for (const auto& [text, error] : rows) EXPECT_EQ(Load(text), "registry.reg:" + error) << text;
+  for (const char* text : {"", "Windows Registry Editor Version 5.00\n"}) {
+    EXPECT_EQ(Load(text), "registry.reg:1: the file does not begin with REGEDIT4");
+  }
+  for (const auto& [text, error] : rows) {
+    const bool isOfKey = error[0] != '2' && text[0] != '\n';
+    const std::string key = isOfKey ? "[HKEY_LOCAL_MACHINE\\A]\n" : "";
+    EXPECT_EQ(Load("REGEDIT4\n" + key + text + '\n'), "registry.reg:" + error) << text;
+  }
   EXPECT_NE(machine::FindKey(machine::LocalMachine(), "before"), nullptr);
+}
+
+TEST(Registry, IsStricterThanWindowsAndLaxerOnTheOldFamily) {
+  TestMachine pc;
+  SetRegistryText("SOFTWARE\\A", "v", "C:\\x");
+  MakeRegistryKey("SOFTWARE\\A\\B\\C");
+  {
+    RegistryKey key;
+    ASSERT_TRUE(key.Open(HKEY_LOCAL_MACHINE, "SOFTWARE\\A", KEY_READ | KEY_WRITE));
+    // Nothing stands behind a text stored without its NUL.
+    char data[8] = "before";
+    DWORD size = sizeof(data);
+    EXPECT_EQ(
+        RegQueryValueExA(key.get(), "v", nullptr, nullptr, reinterpret_cast<BYTE*>(data), &size),
+        0);
+    EXPECT_STREQ(data, "C:\\xre");
+    // Names that the file can't hold.
+    EXPECT_EQ(RegSetValueExA(key.get(), "line\nbreak", 0, REG_SZ, nullptr, 0),
+              ERROR_INVALID_PARAMETER);
+    EXPECT_FALSE(key.Create(HKEY_LOCAL_MACHINE, std::string(256, 'n').c_str()));
+  }
+  EXPECT_EQ(RegDeleteKeyA(HKEY_LOCAL_MACHINE, ""), ERROR_ACCESS_DENIED);
+  machine::CurrentSettings().ntFamily = false;
+  EXPECT_TRUE(HasRegistryKey("\\SOFTWARE\\A"));
+  EXPECT_EQ(RegDeleteKeyA(HKEY_LOCAL_MACHINE, "SOFTWARE\\A"), 0);
+  EXPECT_FALSE(HasRegistryKey("SOFTWARE\\A"));
+  pc.Restart();
+  EXPECT_FALSE(HasRegistryKey("SOFTWARE\\A"));
+  EXPECT_EQ(machine::Stop(), "");
 }
 
 }  // namespace

@@ -1,7 +1,8 @@
-// The user's script: what it may say, what it prints, and what makes a run a failure.
+// The user's script: what it may say, what it does to the dialog and prints, and what makes a run a
+// failure; and what this machine alone shows of the controls that a program draws. What dialogs do
+// anywhere is in tests/contract/, how boxes and steps go together in the scenarios.
 #include "machine/scripted_user.h"
 
-#include "machine/open_objects.h"
 #include "machine/user_script.h"
 #include "tests/support/test_dialog.h"
 
@@ -9,41 +10,47 @@ namespace {
 
 using testing::ExitedWithCode;
 
+constexpr uint32_t kHiddenControl = kShownControl & ~uint32_t{WS_VISIBLE};
+
 class ScriptedUser : public DialogTest {
  protected:
-  ScriptedUser() { GTEST_FLAG_SET(death_test_style, "threadsafe"); }
   ~ScriptedUser() override { machine::ForgetUser(); }
 
-  std::string ReadError(const std::string& script) {
-    pc.Write("script", script);
-    std::string error;
-    EXPECT_FALSE(machine::ReadUserScript(pc.Host("script"), &error)) << script;
-    const std::string path = pc.Host("script").string();
-    EXPECT_EQ(error.substr(0, path.size()), path);
-    return error.substr(std::min(error.size(), path.size()));
-  }
-
-  // A dialog that command 2 ends and whose button 10 asks a question.
-  void Play(const std::string& script) {
-    Run({Control("Button", 10), Control("Button", 11, kShownControl & ~0x10000000u),
-         Control("Button", 12, kShownControl | WS_DISABLED), Control("Edit", 13)},
-        script, [](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-          if (message != WM_COMMAND) return FALSE;
-          if (LOWORD(wParam) == 10) MessageBoxA(dialog, "Sure?", "Question", MB_YESNO);
-          if (LOWORD(wParam) == IDCANCEL) EndDialog(dialog, 1);
-          return FALSE;
-        });
+  // Plays the script on a dialog that command 2 or 3 ends and whose button 10 asks a question;
+  // `prepare` runs at its start. Returns the commands in their order, each as "ID/NOTIFICATION ".
+  std::string Play(const std::string& script,
+                   const std::vector<machine::TemplateItem>& controls = {Control("Button", 10)},
+                   const std::function<void(HWND dialog)>& prepare = nullptr) {
+    std::string seen;
+    Run(controls, script, [&](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
+      if (message == WM_INITDIALOG && prepare) prepare(dialog);
+      if (message != WM_COMMAND) return FALSE;
+      seen += std::to_string(LOWORD(wParam)) + "/" + std::to_string(HIWORD(wParam)) + " ";
+      if (LOWORD(wParam) == 10 && HIWORD(wParam) == 0) {
+        MessageBoxA(dialog, "Sure?", "Question", MB_YESNO);
+      }
+      if (LOWORD(wParam) == IDCANCEL || LOWORD(wParam) == 3) EndDialog(dialog, 1);
+      return FALSE;
+    });
+    return seen;
   }
 };
 
 TEST_F(ScriptedUser, BadLinesAreNamed) {
-  EXPECT_EQ(ReadError("# a comment\n\n  wait\nsleep 5\n"),
-            ":4: sleep 5: not a line of a user's script");
-  for (const char* const line :
+  const auto readError = [this](const std::string& script) {
+    pc.Write("script", script);
+    std::string error;
+    EXPECT_FALSE(machine::ReadUserScript(pc.Host("script"), &error)) << script;
+    return error;
+  };
+  const std::string path = pc.Host("script").string();
+  EXPECT_EQ(readError("# a comment\n\n  wait\nsleep 5\n"),
+            path + ":4: sleep 5: not a line of a user's script");
+  for (const std::string line :
        {"wait now", "press", "press OK", "press 1 2", "press 1234567", "press -1", "type",
         "type some text", "answer", "answer maybe", "answer-late", "pick", "key", "at-poll wait",
         "at-poll 0 wait", "at-poll 1", "at-poll 1 answer yes", "at-poll 1 pick none", "Wait"}) {
-    EXPECT_EQ(ReadError(line), std::string(":1: ") + line + ": not a line of a user's script");
+    EXPECT_EQ(readError(line), path + ":1: " + line + ": not a line of a user's script");
   }
   std::string error;
   EXPECT_FALSE(machine::ReadUserScript(pc.Host("absent"), &error));
@@ -51,88 +58,133 @@ TEST_F(ScriptedUser, BadLinesAreNamed) {
 }
 
 TEST_F(ScriptedUser, ScriptThatDoesNotFitTheRunEndsTheProcess) {
-  const struct {
-    const char* script;
-    const char* message;
-  } rows[] = {
-      {"wait\n", "user.txt: the script ends while the dialog is open"},
-      {"escape\nwait\n", "user.txt:2: wait: left over"},
-      {"answer no\nescape\n", "user.txt:1: answer no: left over"},
-      {"pick none\nescape\n", "user.txt:1: pick none: left over"},
-      {"escape\nclick-during 10\n", "user.txt:2: click-during 10: left over"},
-      {"until-during Sure\nescape\n", "user.txt:1: until-during Sure: the step never said that"},
-      {"click-during 99\nescape\n", "user.txt:1: click-during 99: there is no such control"},
-      {"at-poll 1 escape\nescape\n", "user.txt:1: at-poll 1 escape: the run polled 0 times only"},
-      {"press 10\n", "user.txt: no answer to box \"Question\" \"Sure\\?\""},
-      {"press 99\n", "user.txt:1: press 99: no user could click"},
-      {"press 11\n", "user.txt:1: press 11: no user could click"},
-      {"press 12\n", "user.txt:1: press 12: no user could click"},
-      {"type 11 text\n", "user.txt:1: type 11 text: no user could click"},
-      {"keyboard \"text\"\n", "user.txt:1: keyboard \"text\": nothing that takes the key has"},
-      {"type 10 text\n", "user.txt:1: type 10 text: not an edit field"},
+  const std::vector<machine::TemplateItem> controls = {
+      Control("Button", 10), Control("Button", 11, kHiddenControl),
+      Control("Button", 12, kShownControl | WS_DISABLED), Control("Edit", 13)};
+  const std::pair<const char*, const char*> rows[] = {
+      {"wait\n", ": the script ends while the dialog is open"},
+      {"escape\nwait\n", ":2: wait: left over"},
+      {"answer no\nescape\n", ":1: answer no: left over"},
+      {"pick none\nescape\n", ":1: pick none: left over"},
+      {"escape\nclick-during 10\n", ":2: click-during 10: left over"},
+      {"until-during Sure\nescape\n", ":1: until-during Sure: the step never said that"},
+      {"click-during 99\nescape\n", ":1: click-during 99: there is no such control"},
+      {"at-poll 1 escape\nescape\n", ":1: at-poll 1 escape: the run polled 0 times only"},
+      {"press 10\n", ": no answer to box \"Question\" \"Sure\\?\""},
+      {"press 99\n", ":1: press 99: no user could click"},
+      {"press 11\n", ":1: press 11: no user could click"},
+      {"press 12\n", ":1: press 12: no user could click"},
+      {"type 11 text\n", ":1: type 11 text: no user could click"},
+      {"keyboard \"text\"\n", ":1: keyboard \"text\": nothing that takes the key has"},
+      {"type 10 text\n", ":1: type 10 text: not an edit field"},
   };
-  for (const auto& row : rows) EXPECT_EXIT(Play(row.script), ExitedWithCode(2), row.message);
-}
-
-TEST_F(ScriptedUser, DialogNeedsSomebody) {
+  for (const auto& [script, message] : rows) {
+    EXPECT_EXIT(Play(script, controls), ExitedWithCode(2), std::string("user.txt") + message);
+  }
   machine::ForgetUser();
-  const auto open = [] {
-    DialogBoxParamA(
-        nullptr, MAKEINTRESOURCEA(116), nullptr,
-        [](HWND, UINT, WPARAM, LPARAM) -> INT_PTR { std::abort(); }, 0);
-  };
-  EXPECT_EXIT(open(), ExitedWithCode(2), "nobody can use the dialog");
+  EXPECT_EXIT(DialogBoxParamA(nullptr, MAKEINTRESOURCEA(116), nullptr, nullptr, 0),
+              ExitedWithCode(2), "nobody can use the dialog");
 }
 
 TEST_F(ScriptedUser, ShowQuotesTextsAndTellsOfAListWithoutAChoice) {
-  Run({Control("Static", 901, 0x50000000, "\"\xE9\"\r\n\\"),
-       Control("ComboBox", 918, kShownControl | kOwnerDrawnList), Control("Button", 907)},
-      "press 907\nshow\nescape\n", [](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-        if (message == WM_COMMAND && LOWORD(wParam) == 907) DestroyWindow(GetDlgItem(dialog, 907));
-        if (message == WM_COMMAND && LOWORD(wParam) == IDCANCEL) EndDialog(dialog, 1);
-        return FALSE;
-      });
+  Play("show\ntype 13 by \xC3\xA9 user \nshow 13\nescape\n",
+       {Control("Static", 901, 0x50000000, "\"\xE9\"\r\n\\"),
+        Control("Button", 907, kShownControl | WS_DISABLED),
+        Control("ComboBox", 918, kShownControl | kOwnerDrawnList), Control("Edit", 13)});
   EXPECT_EQ(shown,
             "dialog \"Title\" focus 918 default none\n"
             "901 Static shown enabled \"\\\"\xC3\xA9\\\"\\r\\n\\\\\"\n"
-            "918 ComboBox shown enabled none\n");
+            "907 Button shown disabled \"\"\n"
+            "918 ComboBox shown enabled none\n13 Edit shown enabled \"\"\n"
+            "13 Edit shown enabled \"by \xC3\xA9 user \"\n");
 }
 
-// Escape is a key of the dialog's own loop; the close box also works through a step's.
+TEST_F(ScriptedUser, OnlyADisabledButtonStopsEscapeAndCloseBox) {
+  for (const std::string key : {"escape\n", "close\n"}) {
+    EXPECT_EQ(Play(key), "2/0 ");
+    EXPECT_EQ(Play(key, {Control("Button", IDCANCEL, kHiddenControl)}), "2/0 ");
+    EXPECT_EQ(Play(key + "press 3\n", {Control("Button", IDCANCEL, kShownControl | WS_DISABLED),
+                                       Control("Button", 3)}),
+              "3/0 ");
+  }
+  EXPECT_EQ(Play("type 13 x\nescape\n", {Control("Edit", 13)}), "13/1024 13/768 2/0 ");
+}
+
+// Escape is a key of the dialog's own loop; the close box also works through a step's. A box that
+// is answered at once dispatches nothing of what waits.
 TEST_F(ScriptedUser, EscapeHasNoEffectOnAStepThatPolls) {
   std::string order;
-  Run({Control("Button", 10)}, "at-poll 1 escape\nat-poll 2 close\npress 10\nescape\n",
+  Run({Control("Button", 10)}, "at-poll 1 escape\nat-poll 2 close\nanswer no\npress 10\nescape\n",
       [&order](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
         if (message != WM_COMMAND) return FALSE;
         order += std::to_string(LOWORD(wParam)) + ' ';
-        if (LOWORD(wParam) == IDCANCEL && order.ends_with("end 2 ")) EndDialog(dialog, 1);
+        if (LOWORD(wParam) == IDCANCEL && order.ends_with("77 2 ")) EndDialog(dialog, 1);
         if (LOWORD(wParam) != 10) return FALSE;
         for (int poll = 1; poll <= 2; ++poll) {
           order += "poll ";
           MSG posted = {};
           if (PeekMessageA(&posted, nullptr, 0, 0, PM_REMOVE) != FALSE) DispatchMessageA(&posted);
         }
-        order += "end ";
+        PostMessageA(dialog, WM_COMMAND, 77, 0);
+        order += MessageBoxA(dialog, "?", "Q", MB_YESNO) == IDNO ? "no end " : "yes ";
         return FALSE;
       });
-  EXPECT_EQ(order, "10 poll poll 2 end 2 ");
+  EXPECT_EQ(order, "10 poll poll 2 no end 77 2 ");
 }
 
-TEST_F(ScriptedUser, StartedProcessLeavesTwoHandlesToClose) {
-  pc.Write("drive_c/browser.exe", "");
-  char command[] = "C:\\browser.exe";
-  STARTUPINFOA startup = {};
-  PROCESS_INFORMATION process = {};
-  const auto start = [&] {
-    return CreateProcessA(nullptr, command, nullptr, nullptr, FALSE, 0, nullptr, nullptr, &startup,
-                          &process);
+TEST_F(ScriptedUser, OneDialogAtATimeOfKnownControls) {
+  Play("escape\n", {},
+       [](HWND) { EXPECT_EQ(machine::RunDialog(machine::DialogTemplate(), nullptr, 0), -1); });
+  EXPECT_EQ(Run({Control("ListBox", 10)}, "",
+                [](HWND, UINT, WPARAM, LPARAM) -> INT_PTR { return FALSE; }),
+            -1);
+}
+
+TEST_F(ScriptedUser, ControlsDrawThemselvesWhenTheyAreShownAndHaveChanged) {
+  std::string drawings;
+  const auto draw = [&](const DRAWITEMSTRUCT& item) {
+    const HBRUSH brush = CreateSolidBrush(0x6400);
+    const HGDIOBJ old = SelectObject(item.hDC, brush);
+    PatBlt(item.hDC, 1, 2, 30, 40, PATCOPY);
+    SelectObject(item.hDC, old);
+    DeleteObject(brush);
+    SetTextColor(item.hDC, 0xFF0000);
+    RECT area = item.rcItem;
+    DrawTextA(item.hDC, "caf\xE9 or more", 4, &area, DT_VCENTER);
+    drawings += std::to_string(item.CtlID) + ' ' + std::to_string(static_cast<int>(item.itemID)) +
+                ": " + std::to_string(item.itemData) + " high " + std::to_string(area.bottom) +
+                ((item.itemState & (ODS_SELECTED | ODS_FOCUS)) != 0 ? " focus; " : "; ");
   };
-  EXPECT_EQ(start(), FALSE);  // the record doesn't tell its size
-  startup.cb = sizeof(startup);
-  EXPECT_EQ(start(), TRUE);
-  EXPECT_EQ(machine::OpenObjects(), "2 process handles");
-  EXPECT_EQ(CloseHandle(process.hProcess), TRUE);
-  EXPECT_EQ(CloseHandle(process.hThread), TRUE);
+  const std::vector<machine::TemplateItem> controls = {
+      Control("Static", 10, kShownControl | SS_OWNERDRAW), Control("Button", 12),
+      Control("ComboBox", 11, kShownControl | kOwnerDrawnList)};
+  Run(controls, "wait\nwait\npress 12\nwait\nescape\n",
+      [&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+        const HWND text = GetDlgItem(dialog, 10);
+        const HWND list = GetDlgItem(dialog, 11);
+        if (message == WM_MEASUREITEM) {
+          reinterpret_cast<MEASUREITEMSTRUCT*>(lParam)->itemHeight = 19;
+        }
+        if (message == WM_INITDIALOG) SendMessageA(list, CB_ADDSTRING, 0, 900);
+        if (message == WM_DRAWITEM) draw(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam));
+        if (message == WM_COMMAND && LOWORD(wParam) == 12) {
+          EXPECT_EQ(machine::FindWindowByHandle(text)->drawing.calls,
+                    (std::vector<std::string>{"fill 1,2 30x40 006400",
+                                              "text \"caf\xC3\xA9\" 0,0 format 4 0000FF on face"}));
+          SetWindowTextA(text, "changed");
+          SetFocus(list);
+          SendMessageA(list, CB_SETCURSEL, 0, 0);
+        }
+        if (message == WM_COMMAND && LOWORD(wParam) == IDCANCEL) {
+          ShowWindow(text, SW_HIDE);
+          SetWindowTextA(text, "hidden");
+          EndDialog(dialog, 1);
+        }
+        return FALSE;
+      });
+  EXPECT_EQ(drawings,
+            "10 0: 0 high 26; 11 -1: 0 high 19; 10 0: 0 high 26; 11 0: 900 high 19 focus; ");
+  EXPECT_EQ(machine::Stop(), "");
 }
 
 }  // namespace

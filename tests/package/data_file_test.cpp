@@ -12,7 +12,7 @@ namespace {
 constexpr char kName[] = "C:\\a.bin";
 constexpr char kHostName[] = "drive_c/a.bin";
 
-std::string ReadAll(DataFile& file, uint32_t count) {
+std::string Read(DataFile& file, uint32_t count) {
   std::string bytes(count, '?');
   bytes.resize(file.Read(bytes.data(), count));
   return bytes;
@@ -36,55 +36,48 @@ INSTANTIATE_TEST_SUITE_P(Ways, DataFileByEitherWay, testing::Bool(), [](const au
   return std::string(way.param ? "Descriptor" : "Handle");
 });
 
-TEST_P(DataFileByEitherWay, BytesPassUnchanged) {
+TEST_P(DataFileByEitherWay, BytesPassUnchangedAndOnlyCreateMakesAFileOrCutsOne) {
+  EXPECT_EQ(file.OpenForRead() + file.OpenForWrite(), 0);
+  EXPECT_FALSE(pc.Has(kHostName));
   std::string bytes = "\n\r\n\x1A";
   for (int byte = 0; byte < 256; ++byte) bytes += static_cast<char>(byte);
   ASSERT_EQ(file.Create(), 1);
   EXPECT_TRUE(Write(file, bytes));
   EXPECT_EQ(file.Tell(), static_cast<int32_t>(bytes.size()));
   EXPECT_EQ(file.SeekTo(0), 1);
-  EXPECT_EQ(ReadAll(file, 1000), bytes) << "a file made can be read too";
-  EXPECT_EQ(ReadAll(file, 1000), "") << "at its end";
+  EXPECT_EQ(Read(file, 1000), bytes) << "a file made can be read too";
+  EXPECT_EQ(Read(file, 1000), "") << "at its end";
   EXPECT_EQ(file.Close(), 1);
   EXPECT_EQ(pc.Read(kHostName), bytes);
 
-  ASSERT_EQ(file.OpenForRead(), 1);
-  EXPECT_EQ(ReadAll(file, 4), "\n\r\n\x1A");
-  EXPECT_EQ(ReadAll(file, 0), "");
-  EXPECT_EQ(file.Read(nullptr, 4), 0u);
-  EXPECT_EQ(file.Tell(), 4);
-  EXPECT_FALSE(Write(file, "x")) << "open for reading alone";
+  ASSERT_EQ(file.OpenForWrite(), 1);
+  EXPECT_EQ(Read(file, 1), "") << "open for writing alone";
+  EXPECT_EQ(file.SeekToEnd(), 1);
+  EXPECT_TRUE(Write(file, "er"));
+  EXPECT_EQ(file.Close(), 1);
+  EXPECT_EQ(pc.Read(kHostName), bytes + "er");
+  ASSERT_EQ(file.Create(), 1);
+  EXPECT_EQ(file.GetSize(), 0u);
 }
 
 TEST_P(DataFileByEitherWay, PositionsStayWhereASeekOrAnOpenIsRefused) {
   pc.Write(kHostName, "0123456789");
   ASSERT_EQ(file.OpenForRead(), 1);
+  EXPECT_FALSE(Write(file, "x")) << "open for reading alone";
+  EXPECT_EQ(Read(file, 0), "");
+  EXPECT_EQ(file.Read(nullptr, 4), 0u);
   EXPECT_EQ(file.SeekTo(7), 1);
   EXPECT_EQ(file.Create() + file.OpenForWrite() + file.OpenForRead(), 0) << "it is open";
-  EXPECT_EQ(file.SeekTo(-1), 0);
-  EXPECT_EQ(file.SeekTo(INT32_MIN), 0);
+  EXPECT_EQ(file.SeekTo(-1) + file.SeekTo(INT32_MIN), 0);
   EXPECT_EQ(file.Tell(), 7);
   EXPECT_EQ(file.GetSize(), 10u);
   EXPECT_EQ(file.SeekTo(INT32_MAX), 1) << "beyond the end";
   EXPECT_EQ(file.Tell(), INT32_MAX);
 }
 
-TEST_P(DataFileByEitherWay, OnlyCreateMakesAFileOrCutsOne) {
-  EXPECT_EQ(file.OpenForRead() + file.OpenForWrite(), 0);
-  EXPECT_FALSE(pc.Has(kHostName));
-  pc.Write(kHostName, "old text");
-  ASSERT_EQ(file.OpenForWrite(), 1);
-  EXPECT_EQ(ReadAll(file, 1), "") << "open for writing alone";
-  EXPECT_EQ(file.SeekToEnd(), 1);
-  EXPECT_TRUE(Write(file, "er"));
-  EXPECT_EQ(file.Close(), 1);
-  EXPECT_EQ(pc.Read(kHostName), "old texter");
-  ASSERT_EQ(file.Create(), 1);
-  EXPECT_EQ(file.GetSize(), 0u);
-}
-
 TEST_P(DataFileByEitherWay, AFileMadeCanBeWrittenAgainAndDeletedWhileOpen) {
   ASSERT_EQ(file.Create(), 1);
+  EXPECT_EQ(file.Write(nullptr, 4) + file.Write("x", 0), 0u);
   FailCall(GetParam() ? "_close" : "CloseHandle");
   EXPECT_EQ(file.Close(), 0) << "the system's verdict; it is closed anyway";
   EXPECT_EQ(file.Tell(), -1);
@@ -105,7 +98,7 @@ TEST_F(DataFileTest, AClosedOneKnowsItsSizeAndANamelessOneNothing) {
   DataFile empty("");
   DataFile none(nullptr);
   for (DataFile* file : {&withoutMemory, &closed, &empty, &none}) {
-    EXPECT_EQ(ReadAll(*file, 4), "");
+    EXPECT_EQ(Read(*file, 4), "");
     EXPECT_FALSE(Write(*file, "x"));
     EXPECT_EQ(file->SeekTo(0) + file->SeekToEnd(), 0);
     EXPECT_EQ(file->Tell(), -1);
@@ -123,37 +116,36 @@ TEST_F(DataFileTest, TheFirstWayExcludesAndTheSecondShares) {
   ASSERT_EQ(first.OpenForRead(), 1);
   EXPECT_EQ(second.OpenForRead(), 0);
   EXPECT_EQ(first.Close(), 1);
-
   FailAllCalls("CreateFileA");
   ASSERT_EQ(first.OpenForRead(), 1);
   ASSERT_EQ(second.OpenForRead(), 1);
-  EXPECT_EQ(ReadAll(first, 4) + ReadAll(second, 4), "texttext");
+  EXPECT_EQ(Read(first, 4) + Read(second, 4), "texttext");
 }
 
 TEST_F(DataFileTest, FailuresOfTheSystemAreCountsOfNothing) {
   pc.Write(kHostName, "text");
   DataFile file(kName);
-  ASSERT_EQ(file.OpenForRead(), 1);
-  FailAllCalls("ReadFile");
-  EXPECT_EQ(ReadAll(file, 4), "");
-  FailAllCalls("GetFileSize");
-  EXPECT_EQ(file.GetSize(), 0u);
-  FailAllCalls("SetFilePointer");
-  EXPECT_EQ(file.SeekTo(1), 0);
-  EXPECT_EQ(file.SeekToEnd(), 0);
-  EXPECT_EQ(file.Tell(), -1);
-  EXPECT_EQ(file.Close(), 1);
-
+  for (const char* openFault : {"none", "CreateFileA"}) {
+    FailAllCalls(openFault);
+    ASSERT_EQ(file.OpenForRead(), 1);
+    machine::SetFaults({{.function = "ReadFile"},
+                        {.function = "_read"},
+                        {.function = "GetFileSize"},
+                        {.function = "_tell"},
+                        {.function = "SetFilePointer", .fromThenOn = true},
+                        {.function = "_lseek", .fromThenOn = true}});
+    EXPECT_EQ(Read(file, 4), "");
+    EXPECT_EQ(file.GetSize(), 0u);
+    EXPECT_EQ(file.SeekTo(1) + file.SeekToEnd(), 0);
+    EXPECT_EQ(file.Tell(), -1);
+    EXPECT_EQ(file.Close(), 1);
+  }
   FailAllCalls("CreateFileA");
   EXPECT_EQ(DataFile("C:\\windows").Create(), 0);
   EXPECT_EQ(machine::CallCount("_chmod"), 0) << "what can't be made keeps its attributes";
-  ASSERT_EQ(file.OpenForRead(), 1);
-  FailAllCalls("_read");
-  EXPECT_EQ(ReadAll(file, 4), "");
-  FailAllCalls("_lseek");
-  EXPECT_EQ(file.GetSize(), 0u);
-  FailAllCalls("_tell");
-  EXPECT_EQ(file.Tell(), -1);
+  machine::SetFaults({{.function = "CreateFileA"}, {.function = "_setmode"}});
+  EXPECT_EQ(file.Create(), 0);
+  EXPECT_FALSE(pc.Has(kHostName)) << "a file in text mode is none";
 }
 
 }  // namespace

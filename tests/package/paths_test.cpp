@@ -10,25 +10,19 @@ using Paths = ProductTest;
 
 TEST_F(Paths, AFileIsNoDirectoryAndADirectoryNoFile) {
   pc.Write("drive_c/a/b.txt", "");
-  struct Row {
-    const char* path;
-    int file;
-    int directory;
-  };
-  const Row rows[] = {{"C:\\a\\b.txt", 1, 0}, {"C:\\a", 0, 1},         {"C:\\a\\", 0, 1},
-                      {"C:", 0, 1},           {"C:\\a\\*", 0, 0},      {"", 0, 0},
-                      {nullptr, 0, 0},        {"C:\\a\\b.txt\\", 0, 0}};
-  for (const Row& row : rows) {
-    const char* const name = row.path != nullptr ? row.path : "null";
-    EXPECT_EQ(FileExists(row.path), row.file) << name;
-    EXPECT_EQ(DirectoryExists(row.path), row.directory) << name;
+  EXPECT_EQ(FileExists("C:\\a\\b.txt"), 1);
+  EXPECT_EQ(DirectoryExists("C:\\a\\b.txt"), 0);
+  for (const char* directory : {"C:\\a", "C:\\a\\", "C:"}) {
+    EXPECT_EQ(FileExists(directory), 0) << directory;
+    EXPECT_EQ(DirectoryExists(directory), 1) << directory;
   }
-  EXPECT_EQ(DeleteFileChecked("C:\\a"), 0);
-  EXPECT_EQ(RemoveDirectoryChecked("C:\\a\\b.txt"), 0);
-  for (const char* none : {static_cast<const char*>(nullptr), ""}) {
-    EXPECT_EQ(DeleteFileChecked(none), StatusBadArgument);
-    EXPECT_EQ(RemoveDirectoryChecked(none), StatusBadArgument);
+  for (const char* none : {"C:\\a\\*", "C:\\a\\b.txt\\", "", static_cast<const char*>(nullptr)}) {
+    EXPECT_EQ(FileExists(none) + DirectoryExists(none), 0);
+    const StatusCode refused = IsMissingOrEmpty(none) ? StatusBadArgument : 0;
+    EXPECT_EQ(DeleteFileChecked(none), refused);
+    EXPECT_EQ(RemoveDirectoryChecked(none), refused);
   }
+  EXPECT_EQ(DeleteFileChecked("C:\\a") + RemoveDirectoryChecked("C:\\a\\b.txt"), 0);
 }
 
 TEST_F(Paths, TheWindowsDirectoryFitsOrLeavesTheBufferAlone) {

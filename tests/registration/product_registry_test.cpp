@@ -1,14 +1,18 @@
 // The library of the product's registry tree.
 #include "registration/product_registry.h"
 
+#include <sstream>
 #include <string>
-#include <vector>
 
 #include "engine/browsers.h"
 #include "registration/registered_product.h"
+#include "tests/support/allocation_faults.h"
 #include "tests/support/product_test.h"
+#include "ui/side_commands.h"
 
 namespace {
+
+using namespace std::string_literals;
 
 const std::string kRoot = "SOFTWARE\\Zeb\\Moriv";
 const std::string kServices = kRoot + "\\Services";
@@ -24,11 +28,9 @@ class ProductRegistry : public ProductTest {
     MakeRegistryKey(kServices + "\\" + name + "\\Applications\\" + application);
   }
 
-  static std::vector<std::string> Names(KeyNameNode* list) {
-    std::vector<std::string> names;
-    for (const KeyNameNode* node = list; node != nullptr; node = node->next) {
-      names.emplace_back(node->name);
-    }
+  static std::string Names(KeyNameNode* list) {
+    std::string names;
+    for (auto* node = list; node != nullptr; node = node->next) names += node->name + " "s;
     ProductFreeList(list);
     return names;
   }
@@ -42,39 +44,55 @@ class ProductRegistry : public ProductTest {
   }
 };
 
-using Strings = std::vector<std::string>;
-
-TEST_F(ProductRegistry, EveryRangeOfItemsHasItsKey) {
-  MakeService("Sky", "home", "mail");
-  const struct {
-    int32_t item;
-    const char *service, *subKey;
-  } rows[] = {
-      {3, nullptr, nullptr}, {76, "Sky", nullptr}, {135, "Sky", "home"}, {203, "Sky", "mail"}};
-  for (const auto& [item, service, subKey] : rows) {
-    const std::string text = "item " + std::to_string(item);
-    EXPECT_EQ(ProductSetItem(item, service, subKey, text.c_str()), 1);
-    EXPECT_EQ(Get(item, service, subKey), text);
+TEST_F(ProductRegistry, EveryItemHasItsNumberItsKeyAndItsName) {
+  MakeService("Sky", "home", "home");
+  const std::string sky = kServices + "\\Sky";
+  // From the number of the first one in a row on.
+  const std::pair<int32_t, const char*> rows[] = {
+      {1, "InstallDir Language Version"},
+      {11,
+       "InstallDir CdromEdition CdromRelease CdromIniFile CdromPath ConfFile ExeConfFile "
+       "CacheFile Version"},
+      {21, "ShortName LongName MainViewerName SmallIcon LargeIcon Country Language"},
+      {31,
+       "InstallId ServiceActivated SaiId EnvId Connection BootIdf NavigatorIdf LastId "
+       "LastIdKey LastIdDate"},
+      {51, "CurrentProfile HelpProfile PopBookFile PhonebookName PhonebookFile Keys CompDll"},
+      {71, "ContentSound InformationSound ApplicativeSound HelpSound EffectSound BackgroundSound"},
+      {101,
+       "NetworkType DomainName Stats ZebAddress DnsAddress PopAddress SmtpAddress NewsAddress "
+       "ProxyAddress"},
+      {111, "FromCountry FromZipcode FromTown FromPabx FromPhone FromPrefix"},
+      {121, "ToPrefix ToPhone ToPostfix ToName ToTechno ToType"},
+      {131, "PPPScript Pulse Modem DelayPrefix DelayPostfix"},
+      {201, "Connection BootIdf NavigatorIdf"}};
+  int32_t next = -1;
+  const auto expectNoneBefore = [&](int32_t item) {
+    for (; next < item; ++next) {
+      const bool hasNoKey = next < 1 || next % 100 == 0 || next == 10 || next > 299;
+      EXPECT_EQ(Get(next, "Sky", "home"), hasNoKey ? "null, old" : "null, ") << next;
+      EXPECT_EQ(ProductSetItem(next, "Sky", "home", "text"), -1) << next;
+    }
+  };
+  for (const auto& [first, words] : rows) {
+    expectNoneBefore(first);
+    const std::string key = first < 10    ? kRoot
+                            : first < 100 ? sky
+                            : first < 200 ? sky + "\\NetProfiles\\home"
+                                          : sky + "\\Applications\\home";
+    std::istringstream names(words);
+    for (std::string name; names >> name; ++next) {
+      const std::string text = std::to_string(next);
+      EXPECT_EQ(ProductSetItem(next, "Sky", "home", text.c_str()), 1) << next;
+      EXPECT_EQ(Get(next, "Sky", "home"), text);
+      EXPECT_EQ(GetRegistryBytes(key, name.c_str()), text) << name << " without its NUL";
+    }
   }
-  char text[32];
-  DWORD size = sizeof(text);
-  EXPECT_EQ(ReadRegistryValue(HKEY_LOCAL_MACHINE, kRoot.c_str(), "Version", text, &size), 1);
-  EXPECT_EQ(size, 6u) << "a text is stored without its NUL";
-}
-
-TEST_F(ProductRegistry, RefusedItemsAndAbsentOnesAreToldApart) {
-  MakeService("Sky", "home", "mail");
-  for (const int32_t item : {-1, 0, 10, 100, 200, 300}) {
-    EXPECT_EQ(Get(item, "Sky", "x"), "null, old") << item;
-    EXPECT_EQ(ProductSetItem(item, "Sky", "x", "text"), -1) << item;
-  }
-  for (const int32_t item : {4, 20, 50, 77, 110, 136, 204}) {
-    EXPECT_EQ(Get(item, "Sky", "x"), "null, ") << item;
-    EXPECT_EQ(ProductSetItem(item, "Sky", "x", "text"), -1) << item;
-  }
+  expectNoneBefore(320);
   EXPECT_EQ(Get(101, "Sky"), "null, ") << "a profile's item without a profile";
   EXPECT_EQ(Get(11), "null, ") << "a service's item without a service";
   EXPECT_EQ(ProductSetItem(11, "NoSuch", nullptr, "text"), 0) << "a write makes no key";
+  EXPECT_EQ(ProductSetItem(1, nullptr, nullptr, nullptr), -1);
 }
 
 TEST_F(ProductRegistry, EitherKindTakesAnyItemOfASubKey) {
@@ -98,57 +116,66 @@ TEST_F(ProductRegistry, EitherKindTakesAnyItemOfASubKey) {
 
 TEST_F(ProductRegistry, NamesHaveTheirLengths) {
   for (const std::string& bad : {std::string("ab"), std::string(64, 's'), std::string()}) {
-    EXPECT_EQ(ProductCreateTree(bad.c_str()), -1) << bad;
-    EXPECT_EQ(ProductDeleteTree(bad.c_str()), -1) << bad;
-    EXPECT_EQ(ProductSetItem(11, bad.c_str(), nullptr, "x"), -1) << bad;
-    EXPECT_EQ(ProductDeleteNetProfile(bad.c_str(), "x"), -1) << bad;
+    EXPECT_EQ((Results{ProductCreateTree(bad.c_str()), ProductDeleteTree(bad.c_str()),
+                       ProductSetItem(11, bad.c_str(), nullptr, "x"),
+                       ProductDeleteNetProfile(bad.c_str(), "x")}),
+              Results(4, -1))
+        << bad;
   }
   for (const std::string& good : {std::string("abc"), std::string(63, 's')}) {
-    EXPECT_EQ(ProductCreateTree(good.c_str()), 1) << good;
-    EXPECT_EQ(ProductRootExists(good.c_str()), 1) << good;
-    EXPECT_EQ(ProductDeleteTree(good.c_str()), 1) << good;
+    EXPECT_EQ((Results{ProductCreateTree(good.c_str()), ProductRootExists(good.c_str()),
+                       ProductDeleteTree(good.c_str())}),
+              Results(3, 1))
+        << good;
   }
-  EXPECT_EQ(ProductDeleteApplication("Sky", ""), -1);
   // "SOFTWARE\Zeb\Moriv\Services\Sky\NetProfiles\" has 44 of the 127 characters of a key's path.
   const std::string fits(83, 'p');
   MakeService("Sky", fits, "mail");
-  EXPECT_EQ(ProductKeyExists("Sky", kKindNetProfile, fits.c_str()), 1);
-  EXPECT_EQ(ProductKeyExists("Sky", kKindNetProfile, (fits + "p").c_str()), -1);
-  EXPECT_EQ(ProductSetItem(101, "Sky", (fits + "p").c_str(), "x"), -1);
+  // A deletion takes a name of 63 characters at most.
+  MakeService("Sky", std::string(63, 'p'), "mail");
+  EXPECT_EQ((Results{ProductKeyExists("Sky", kKindNetProfile, fits.c_str()),
+                     ProductDeleteNetProfile("Sky", std::string(63, 'p').c_str())}),
+            Results(2, 1));
+  EXPECT_EQ((Results{ProductKeyExists("Sky", kKindNetProfile, (fits + "p").c_str()),
+                     ProductSetItem(101, "Sky", (fits + "p").c_str(), "x"),
+                     ProductDeleteNetProfile("Sky", std::string(64, 'p').c_str()),
+                     ProductDeleteApplication("Sky", ""), ProductDeleteApplication(nullptr, "x"),
+                     ProductKeyExists("Sky", 3, "x"), ProductDeleteSubKey("Sky", 3, "x")}),
+            Results(7, -1));
 }
 
 TEST_F(ProductRegistry, ValuesEndWhereTheRegistrySaysOrAt510Characters) {
-  SetRegistryText(kRoot, "Version", std::string(511, 'v'));
-  EXPECT_EQ(Get(3), std::string(510, 'v'));
-  SetRegistryText(kRoot, "Version", std::string(512, 'v'));
-  EXPECT_EQ(Get(3), "null, ");
+  for (const size_t size : {510u, 511u, 512u}) {
+    SetRegistryText(kRoot, "Version", std::string(size, 'v'));
+    EXPECT_EQ(Get(3), size < 512 ? std::string(510, 'v') : "null, ");
+  }
   SetRegistryText(kRoot, "Version", "4.1.7");
   EXPECT_EQ(Get(3, nullptr, nullptr, 4), "4.1");
+  EXPECT_EQ(Get(3, nullptr, nullptr, 0), "null, old");
   char* const owned = ProductGetItem(3, nullptr, nullptr, nullptr, 0);
   EXPECT_STREQ(owned, "4.1.7");
   delete[] owned;
+  FailAllocation(1);
+  EXPECT_EQ(ProductGetItem(3, nullptr, nullptr, nullptr, 0), nullptr);
 }
 
 TEST_F(ProductRegistry, AServiceComesAndGoesWithItsEntries) {
   MakeService("Sky", "b", "bapp");
   MakeService("Sky", "a", "aapp");  // keys that are there are fine
-  EXPECT_EQ(Names(ProductListServices()), Strings{"Sky"});
-  EXPECT_EQ(Names(ProductListNetProfiles("Sky")), (Strings{"b", "a"}));
-  EXPECT_EQ(Names(ProductListApplications("Sky")), (Strings{"bapp", "aapp"}));
-  EXPECT_EQ(ProductListNetProfiles(nullptr), nullptr);
-  EXPECT_EQ(ProductEnumKeys("Sky", 3), nullptr) << "there is no third kind";
-  EXPECT_EQ(ProductKeyExists("Sky", 3, "x"), -1);
-  EXPECT_EQ(ProductDeleteSubKey("Sky", 3, "x"), -1);
-  EXPECT_EQ(ProductDeleteNetProfile("Sky", "b"), 1);
-  EXPECT_EQ(ProductDeleteNetProfile("Sky", "b"), 0);
-  EXPECT_EQ(ProductDeleteTree(nullptr), -1) << "a service is left";
-  EXPECT_TRUE(HasRegistryKey(kServices + "\\Sky\\NetProfiles\\a"));
-  EXPECT_EQ(ProductDeleteTree("Sky"), 1);
-  EXPECT_FALSE(HasRegistryKey(kServices + "\\Sky"));
-  EXPECT_EQ(ProductDeleteTree(nullptr), 1);
-  EXPECT_FALSE(HasRegistryKey(kRoot));
-  EXPECT_TRUE(HasRegistryKey("SOFTWARE\\Zeb"));
-  EXPECT_EQ(ProductCreateTree("Sky"), 0) << "no Services key to stand in";
+  EXPECT_EQ(Names(ProductListServices()), "Sky ");
+  EXPECT_EQ(Names(ProductListNetProfiles("Sky")), "b a ");
+  EXPECT_EQ(Names(ProductListApplications("Sky")), "bapp aapp ");
+  EXPECT_EQ(Names(ProductListNetProfiles(nullptr)) + Names(ProductListApplications(nullptr)) +
+                Names(ProductEnumKeys("Sky", 3)),
+            "");
+  // The root stays as long as a service is left, and without Services a service has no place.
+  EXPECT_EQ(
+      (Results{ProductDeleteNetProfile("Sky", "b"), ProductDeleteNetProfile("Sky", "b"),
+               ProductDeleteTree(nullptr), HasRegistryKey(kServices + "\\Sky\\NetProfiles\\a"),
+               ProductDeleteTree("Sky"), HasRegistryKey(kServices + "\\Sky"),
+               ProductDeleteTree(nullptr), HasRegistryKey(kRoot), HasRegistryKey("SOFTWARE\\Zeb"),
+               ProductCreateTree("Sky"), ProductDeleteTree("Sky")}),
+      (Results{1, 0, -1, 1, 1, 0, 1, 0, 1, 0, 0}));
 }
 
 TEST_F(ProductRegistry, LanguagesAreReadInEveryForm) {
@@ -160,26 +187,41 @@ TEST_F(ProductRegistry, LanguagesAreReadInEveryForm) {
     SetRegistryText(kRoot, "Language", text);
     EXPECT_EQ(ProductGetLanguage(nullptr), number) << text;
   }
-  EXPECT_EQ(ProductSetLanguage(nullptr, 7), 1);
-  EXPECT_EQ(Get(2), "");
-  ASSERT_EQ(ProductCreateTree("Sky"), 1);
-  EXPECT_EQ(ProductGetLanguage("Sky"), 1000);
-  EXPECT_EQ(ProductSetLanguage("Sky", ProductSpanish), 1);
-  EXPECT_EQ(Get(27, "Sky"), "ES");
+  EXPECT_EQ((Results{ProductSetLanguage(nullptr, 7), ProductCreateTree("Sky"),
+                     ProductGetLanguage("Sky"), ProductSetLanguage("Sky", ProductSpanish)}),
+            (Results{1, 1, 1000, 1}));
+  EXPECT_EQ(Get(2) + Get(27, "Sky"), "ES");
 }
 
-TEST_F(ProductRegistry, JoinedNamesFitOrLeaveTheBufferAloneAndEndWithTheLastWholeOne) {
+TEST_F(ProductRegistry, IsReadWithoutTheRightToWrite) {
+  MakeService("Sky", "home", "mail");
+  SetRegistryText(kRoot, "Version", "4.1.7");
+  SetRegistryText(AppPathsKey("Opera.exe"), "Path", "C:\\windows");
+  char text[260];
+  for (const std::string scheme : {"htmlfile", "http"}) {
+    machine::CurrentSettings().hasReadOnlyRegistry = false;
+    SetRegistryText("SOFTWARE\\Classes\\" + scheme + "\\shell\\open\\command", "", scheme);
+    machine::CurrentSettings().hasReadOnlyRegistry = true;
+    EXPECT_EQ(ReadBrowserCommand(text, 260), 1);
+    EXPECT_EQ(text, scheme);
+  }
+  EXPECT_EQ((Results{ProductRootExists(nullptr), FindOperaPluginDir(text, 260),
+                     ProductSetItem(3, nullptr, nullptr, "5")}),
+            (Results{1, 1, 0}));
+  EXPECT_EQ(Get(3) + Names(ProductListServices()), "4.1.7Sky ");
+}
+
+TEST_F(ProductRegistry, ServicesAreToldAsFarAsTheirNamesFitAndEachBlocksARemoval) {
   char names[520] = "as it was";
   MakeRegistryKey(kServices + "\\Sky");
   MakeRegistryKey(kServices + "\\A");
-  EXPECT_EQ(CheckDependingServices(nullptr, 0), 0);
-  EXPECT_EQ(CheckDependingServices(names, 5), 0);
+  EXPECT_EQ(CheckDependingServices(nullptr, 0) + CheckDependingServices(names, 5), 0);
   EXPECT_STREQ(names, "as it was");
   EXPECT_EQ(CheckDependingServices(names, 6), 0);
   EXPECT_STREQ(names, "Sky,A");
   for (char c = 'a'; c < 'k'; ++c) MakeRegistryKey(kServices + "\\" + std::string(63, c));
   EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 0);
-  EXPECT_EQ(std::string(names).size(), 6u + 8 * 63 + 7);
+  EXPECT_EQ(std::string(names).size(), 6u + 8 * 63 + 7) << "ends with the last whole one";
 }
 
 TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {

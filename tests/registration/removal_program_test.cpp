@@ -1,13 +1,15 @@
-// The trimmed copy of the image that removes the product.
+// What an install leaves for the product's removal, and a removal for the system's next start.
 #include "registration/removal_program.h"
 
 #include "engine/install_pass.h"
+#include "registration/uninstall_entries.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
 
 namespace {
 
 constexpr char kProgram[] = "drive_c/windows/MorivRmv.exe";
+const std::string kCurrentVersion = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\";
 
 class RemovalProgram : public ProductTest {
  protected:
@@ -32,20 +34,44 @@ TEST_F(RemovalProgram, TellsItsPathWhereThatFitsAndKeepsTheRestOfTheHeader) {
 
 TEST_F(RemovalProgram, FailuresLeaveNoPartOfIt) {
   EXPECT_EQ(WriteRemovalProgram(nullptr, nullptr, 0), StatusBadArgument);
-  const std::pair<const char*, StatusCode> rows[] = {{"GetFileVersionInfoSizeA", StatusBadRecord},
-                                                     {"WriteFile", StatusWriteRemovalFailed},
-                                                     {"ReadFile", StatusWriteRemovalFailed}};
-  for (const auto& [function, status] : rows) {
-    FailAllCalls(function);
-    EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), status) << function;
-    EXPECT_FALSE(pc.Has(kProgram)) << function;
+  const struct {
+    std::vector<machine::Fault> faults;
+    StatusCode status;
+  } rows[] = {
+      {{{.function = "GetFileVersionInfoSizeA"}}, StatusBadRecord},
+      {{{.function = "WriteFile"}}, StatusWriteRemovalFailed},
+      {{{.function = "WriteFile", .call = 2}}, StatusWriteRemovalFailed},
+      {{{.function = "WriteFile", .call = 3}}, StatusWriteRemovalFailed},
+      {{{.function = "ReadFile"}}, StatusWriteRemovalFailed},
+      // Both ways of opening are refused: for the image, then for the copy.
+      {{{.function = "CreateFileA"}, {.function = "_sopen"}}, StatusOpenFailed},
+      {{{.function = "CreateFileA", .call = 2}, {.function = "_creat"}}, StatusCreateFileFailed}};
+  for (const auto& [faults, status] : rows) {
+    machine::SetFaults(faults);
+    EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), status) << faults[0].function;
+    EXPECT_FALSE(pc.Has(kProgram)) << faults[0].function;
   }
-  // Both ways of opening are refused: for the image, then for the copy.
-  machine::SetFaults({{.function = "CreateFileA"}, {.function = "_sopen"}});
-  EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), StatusOpenFailed);
-  machine::SetFaults({{.function = "CreateFileA", .call = 2}, {.function = "_creat"}});
-  EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), StatusCreateFileFailed);
-  EXPECT_FALSE(pc.Has(kProgram));
+}
+
+using UninstallEntries = ProductTest;
+
+TEST_F(UninstallEntries, AreStoredWithTheirNulAndFitOrAreLeftOut) {
+  context.currentLanguage = kLanguageFrench;
+  EXPECT_EQ(WriteUninstallEntry(&context), 1);
+  EXPECT_EQ(GetRegistryBytes(kCurrentVersion + "Uninstall\\Moriv", "DisplayName"),
+            std::string("ZEB Machine virtuelle Moriv", 28));
+  EXPECT_EQ(GetRegistryBytes(kCurrentVersion + "Uninstall\\Moriv", "UninstallString"),
+            std::string("C:\\windows\\MorivRmv.exe", 24));
+  EXPECT_EQ(CancelRunOnceCommand(), 0) << "there is none";
+  // Around the path the command has 79 characters of its 519.
+  for (const size_t length : {size_t{440}, size_t{441}}) {
+    EXPECT_EQ(WriteRunOnceCommand(std::string(length, 'p').c_str()), length == 440) << length;
+    EXPECT_EQ(GetRegistryBytes(kCurrentVersion + "RunOnce", "MorivCommand").size(), 520u);
+  }
+  EXPECT_EQ(WriteRunOnceCommand("") + WriteRunOnceCommand(nullptr), 0);
+  EXPECT_EQ(CancelRunOnceCommand(), 1);
+  EXPECT_EQ(DeleteUninstallEntry(), 1);
+  EXPECT_EQ(DeleteUninstallEntry(), 0);
 }
 
 }  // namespace

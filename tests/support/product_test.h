@@ -10,7 +10,11 @@
 #include "machine/faults.h"
 #include "package/package_reader.h"
 #include "platform/registry_key.h"
+#include "tests/support/allocation_faults.h"
 #include "tests/support/test_machine.h"
+
+// What calls in a row have given.
+using Results = std::vector<int64_t>;
 
 // The n-th call of a function of the system from now on fails.
 inline void FailCall(const char* function, int call = 1) {
@@ -38,6 +42,17 @@ inline void MakeRegistryKey(const std::string& key) {
   ASSERT_TRUE(opened.Create(HKEY_LOCAL_MACHINE, key.c_str())) << key;
 }
 
+// The bytes of a value, its NUL too if it has one; "none" when it isn't there.
+inline std::string GetRegistryBytes(const std::string& key, const char* name) {
+  RegistryKey opened;
+  char bytes[600];
+  DWORD size = sizeof(bytes);
+  const bool isThere = opened.Open(HKEY_LOCAL_MACHINE, key.c_str(), KEY_READ) &&
+                       RegQueryValueExA(opened.get(), name, nullptr, nullptr,
+                                        reinterpret_cast<BYTE*>(bytes), &size) == ERROR_SUCCESS;
+  return isThere ? std::string(bytes, size) : "none";
+}
+
 inline bool HasRegistryKey(const std::string& key) {
   RegistryKey opened;
   return opened.Open(HKEY_LOCAL_MACHINE, key.c_str(), KEY_READ);
@@ -63,6 +78,7 @@ class ProductTest : public testing::Test {
     FailNothing();
     EXPECT_EQ(CloseSetup(&context), 1);
     EXPECT_EQ(machine::Stop(), "");
+    EXPECT_EQ(LiveAllocations(), 0);
   }
 
   // The run's events as "CODE/SEVERITY TEXT".

@@ -2,6 +2,7 @@
 // package.
 #pragma once
 
+#include <algorithm>
 #include <cstring>
 #include <random>
 #include <string>
@@ -40,54 +41,94 @@ inline std::string VersionedProgram(const std::string& version) {
                          : ProgramWithStrings({{"FileVersion", version}});
 }
 
+// A text of a record, which has no NUL when it fills its field.
+template <size_t N>
+std::string FieldText(const char (&field)[N]) {
+  return {field, std::find(field, field + N, '\0')};
+}
+
+template <size_t N>
+void SetField(char (&field)[N], std::string_view text) {
+  std::memset(field, 0, N);
+  text.copy(field, N);
+}
+
+// An image piece by piece: made from nothing or taken apart, changed at will, and put together.
 class ImageBuilder {
  public:
+  struct Piece {
+    FileRecord record = {};
+    std::string stream;
+  };
+
   explicit ImageBuilder(const std::string& version = "4.1.7")
       : executable_(VersionedProgram(version)) {
-    header_.headerSize = sizeof(PackageHeader);
-    std::memcpy(header_.magic, kPackageMagic, sizeof(header_.magic));
     header_.defaultLanguage = -1;
+  }
+
+  // The pieces that a walk over the records reaches: from `offset` on, at most `count`, as long as
+  // they are whole. The last stream may be cut short; what follows it is dropped.
+  static ImageBuilder TakenApart(const std::string& bytes, uint64_t offset, size_t count) {
+    ImageBuilder image;
+    image.header_ = HeaderOf(bytes);
+    image.executable_ = bytes.substr(0, offset);
+    while (count-- > 0 && offset <= bytes.size() && bytes.size() - offset >= sizeof(FileRecord)) {
+      Piece& piece = image.pieces_.emplace_back();
+      bytes.copy(reinterpret_cast<char*>(&piece.record), sizeof(FileRecord), offset);
+      offset += sizeof(FileRecord);
+      if (offset < bytes.size()) piece.stream = bytes.substr(offset, piece.record.storedSize);
+      offset += piece.record.storedSize;
+    }
+    return image;
+  }
+
+  // The same from where its header says.
+  static ImageBuilder TakenApart(const std::string& bytes) {
+    const PackageHeader header = HeaderOf(bytes);
+    return TakenApart(bytes, header.dataOffset, header.recordCount);
   }
 
   // A file with a version of 4.1.7.
   ImageBuilder& Add(std::string_view name, std::string_view destination, std::string_view bytes) {
-    AddStream(name, destination, PackStream(bytes));
-    records_.back().fileSize = static_cast<uint32_t>(bytes.size());
+    Piece& piece = pieces_.emplace_back();
+    SetField(piece.record.fileName, name);
+    SetField(piece.record.destination, destination);
+    piece.record.versionFirst = 4;
+    piece.record.versionSecond = 1;
+    piece.record.versionThird = 7;
+    piece.record.fileSize = static_cast<uint32_t>(bytes.size());
+    piece.stream = PackStream(bytes);
     return *this;
   }
 
-  ImageBuilder& AddStream(std::string_view name, std::string_view destination,
-                          std::string_view stream) {
-    FileRecord record = {};
-    record.recordSize = sizeof(FileRecord);
-    name.copy(record.fileName, sizeof(record.fileName));
-    destination.copy(record.destination, sizeof(record.destination));
-    record.versionFirst = 4;
-    record.versionSecond = 1;
-    record.versionThird = 7;
-    record.storedSize = static_cast<uint32_t>(stream.size());
-    records_.push_back(record);
-    streams_.emplace_back(stream);
-    return *this;
-  }
-
-  // To be changed at will before the image is made.
-  PackageHeader& header() { return header_; }
-  FileRecord& LastRecord() { return records_.back(); }
   std::string& executable() { return executable_; }
+  std::vector<Piece>& pieces() { return pieces_; }
+  PackageHeader& header() { return header_; }
 
-  std::string Bytes() const {
+  // As it stands, whatever its fields say.
+  std::string RawBytes() const {
     std::string image = executable_;
-    for (size_t i = 0; i < records_.size(); ++i) {
-      image.append(reinterpret_cast<const char*>(&records_[i]), sizeof(FileRecord));
-      image += streams_[i];
+    for (const Piece& piece : pieces_) {
+      image.append(reinterpret_cast<const char*>(&piece.record), sizeof(FileRecord));
+      image += piece.stream;
     }
-    PackageHeader header = header_;
-    header.recordCount = static_cast<uint16_t>(records_.size());
-    header.dataOffset = static_cast<uint32_t>(executable_.size());
-    header.packageLength =
-        static_cast<uint32_t>(image.size() + sizeof(PackageHeader) - executable_.size());
-    return image.append(reinterpret_cast<const char*>(&header), sizeof(PackageHeader));
+    return image.append(reinterpret_cast<const char*>(&header_), sizeof(PackageHeader));
+  }
+
+  // With the magic and all sizes, counts and offsets put right.
+  std::string Bytes() const {
+    ImageBuilder image = *this;
+    for (Piece& piece : image.pieces_) {
+      piece.record.recordSize = sizeof(FileRecord);
+      piece.record.storedSize = static_cast<uint32_t>(piece.stream.size());
+    }
+    image.header_.headerSize = sizeof(PackageHeader);
+    SetField(image.header_.magic, kPackageMagic);
+    image.header_.recordCount = static_cast<uint16_t>(pieces_.size());
+    image.header_.dataOffset = static_cast<uint32_t>(executable_.size());
+    image.header_.packageLength =
+        static_cast<uint32_t>(image.RawBytes().size() - executable_.size());
+    return image.RawBytes();
   }
 
   // Writes the image as C:\setup.exe and starts the machine anew for it.
@@ -97,8 +138,15 @@ class ImageBuilder {
   }
 
  private:
+  // The last bytes; of an image that is shorter than a header zeros follow.
+  static PackageHeader HeaderOf(const std::string& bytes) {
+    PackageHeader header = {};
+    const size_t size = std::min(bytes.size(), sizeof(header));
+    bytes.copy(reinterpret_cast<char*>(&header), size, bytes.size() - size);
+    return header;
+  }
+
   std::string executable_;
+  std::vector<Piece> pieces_;
   PackageHeader header_ = {};
-  std::vector<FileRecord> records_;
-  std::vector<std::string> streams_;
 };

@@ -3,15 +3,15 @@
 #include "tools/image/image_verifier.h"
 
 #include <algorithm>
-#include <cstring>
 #include <functional>
 #include <string>
+#include <utility>
 
 #include "tests/tools/tool_bench.h"
 
 namespace {
 
-class ImageVerifier : public ToolBench {
+class ImageVerifier : public SampleBench {
  protected:
   std::vector<std::string> WrongIn(const std::string& image) const {
     std::vector<std::string> wrong;
@@ -20,27 +20,16 @@ class ImageVerifier : public ToolBench {
     }
     return wrong;
   }
-
-  // image.exe as it is now has this one thing wrong.
-  void ExpectWrong(const std::string& part) const {
-    const std::vector<std::string> wrong = WrongIn("image.exe");
-    ASSERT_EQ(wrong.size(), 1u) << part << ": " << (wrong.empty() ? "" : wrong[1 % wrong.size()]);
-    EXPECT_NE(wrong[0].find(part), std::string::npos) << wrong[0];
-    const ToolRun run = RunImage({"verify", "@image.exe"});
-    EXPECT_EQ(run.status, 1);
-    EXPECT_NE(run.out.find("wrong  " + wrong[0] + "\n"), std::string::npos);
-  }
 };
 
 }  // namespace
 
 TEST_F(ImageVerifier, FindsNothingInAGoodImageAndListsIt) {
-  PackSample();
-  const ToolRun verified = RunImage({"verify", "@image.exe"});
+  const ToolRun verified = Run({"verify", "@image.exe"});
   EXPECT_EQ(verified.status, 0);
   EXPECT_EQ(verified.out.find("wrong"), std::string::npos) << verified.out;
   EXPECT_EQ(std::count(verified.out.begin(), verified.out.end(), '\n'), 6);
-  const ToolRun listed = RunImage({"list", "@image.exe"});
+  const ToolRun listed = Run({"list", "@image.exe"});
   EXPECT_EQ(listed.status, 0);
   for (const char* part : {"setup image", "48056", "french (10000)", "\"C:\\Program Files\\Moriv\"",
                            "4.1.7", "\"040c04b0\"", "\"readme.txt\"", "-.-.-"}) {
@@ -48,114 +37,96 @@ TEST_F(ImageVerifier, FindsNothingInAGoodImageAndListsIt) {
   }
 }
 
-TEST_F(ImageVerifier, FindsEachChangeOfTheHeader) {
-  using Change = void (*)(PackageHeader*);
-  const struct {
-    Change change;
-    const char* part;
-  } rows[] = {
-      {[](PackageHeader* h) { h->removalImageFlag = 2; }, "removalImageFlag is 2"},
-      {[](PackageHeader* h) { h->spaceNeeded++; }, "spaceNeeded is 48057"},
-      {[](PackageHeader* h) { h->packageLength--; }, "packageLength"},
-      {[](PackageHeader* h) { std::memset(h->defaultDirectory + 200, 'x', 60); },
-       "defaultDirectory"},
-      {[](PackageHeader* h) { std::strcpy(h->defaultDirectory, "C:\\Program Files\\..\\x"); },
-       "\"..\""},
-      {[](PackageHeader* h) { h->defaultLanguage = 5; }, "defaultLanguage 5"},
-      {[](PackageHeader* h) { h->reserved[259] = 1; }, "reserved"},
-      {[](PackageHeader* h) { h->recordCount = 4; }, "record 4 at offset"},
-      {[](PackageHeader* h) { h->dataOffset++; }, "recordSize"},
-      {[](PackageHeader* h) { h->dataOffset = 0xFFFFFFFF; }, "dataOffset 4294967295"},
-      {[](PackageHeader* h) { h->headerSize = 567; }, "no package header"},
-      {[](PackageHeader* h) { h->magic[25] = 'x'; }, "no package header"},
+// Each row changes one thing: of the header, of the second record, of the rest.
+TEST_F(ImageVerifier, FindsEachChange) {
+  using Header = PackageHeader&;
+  using Record = FileRecord&;
+  using Image = ImageBuilder&;
+  const auto inHeader = [](void (*change)(Header)) {
+    return [change](Image image) { change(image.header()); };
   };
-  for (const auto& row : rows) {
-    PackSample();
-    ChangeHeader(row.change);
-    ExpectWrong(row.part);
-  }
-}
-
-TEST_F(ImageVerifier, FindsEachChangeOfARecord) {
-  using Change = void (*)(FileRecord*);
-  const struct {
-    Change change;
-    const char* part;
-  } rows[] = {
-      {[](FileRecord* r) { r->recordSize = 695; }, "recordSize of 695"},
-      {[](FileRecord* r) { r->fileName[31] = 'x'; }, "fileName does not end"},
-      {[](FileRecord* r) { r->destination[259] = 'x'; }, "destination does not end"},
-      {[](FileRecord* r) { r->versionLanguage[127] = 'x'; }, "versionLanguage does not end"},
-      {[](FileRecord* r) { r->versionLanguage[0] = 'G'; }, "versionLanguage \"G4"},
-      {[](FileRecord* r) { r->reserved[0] = 1; }, "reserved"},
-      {[](FileRecord* r) { r->fileName[0] = '/'; }, "fileName \"/"},
-      {[](FileRecord* r) { std::memset(r->destination, 0, 260); }, "nowhere"},
-      {[](FileRecord* r) { r->storedSize = 0xFFFFFFFF; }, "reaches into the header"},
-      {[](FileRecord* r) {
-         std::strcpy(r->fileName, "a.exe");
-         std::strcpy(r->destination, "\\");
-         std::memset(r->destination + 1, 0, 259);
-       },
+  const auto inRecord = [](void (*change)(Record)) {
+    return [change](Image image) { change(image.pieces()[1].record); };
+  };
+  const auto withSize = [](uint32_t size) {
+    return [size](Image image) {
+      image.pieces()[1].record.fileSize = size;
+      image.header().spaceNeeded += size - 3000;
+    };
+  };
+  const std::pair<std::function<void(Image)>, const char*> rows[] = {
+      {inHeader([](Header h) { h.removalImageFlag = 2; }), "removalImageFlag is 2"},
+      {inHeader([](Header h) { h.spaceNeeded++; }), "spaceNeeded is 48057"},
+      {inHeader([](Header h) { h.packageLength--; }), "packageLength"},
+      {inHeader([](Header h) { h.defaultDirectory[259] = 'x'; }), "defaultDirectory"},
+      {inHeader([](Header h) { SetField(h.defaultDirectory, "C:\\..\\x"); }), "\"..\""},
+      {inHeader([](Header h) { h.defaultLanguage = 5; }), "defaultLanguage 5"},
+      {inHeader([](Header h) { h.reserved[259] = 1; }), "reserved"},
+      {inHeader([](Header h) { h.recordCount = 4; }), "record 4 at offset"},
+      {inHeader([](Header h) { h.dataOffset++; }), "recordSize"},
+      {inHeader([](Header h) { h.dataOffset = 0xFFFFFFFF; }), "dataOffset 4294967295"},
+      {inHeader([](Header h) { h.headerSize = 567; }), "no package header"},
+      {inHeader([](Header h) { h.magic[25] = 'x'; }), "no package header"},
+      {inRecord([](Record r) { r.recordSize = 695; }), "recordSize of 695"},
+      {inRecord([](Record r) { r.fileName[31] = 'x'; }), "fileName does not end"},
+      {inRecord([](Record r) { r.destination[259] = 'x'; }), "destination does not end"},
+      {inRecord([](Record r) { r.versionLanguage[127] = 'x'; }), "versionLanguage does not end"},
+      {inRecord([](Record r) { r.versionLanguage[0] = 'G'; }), "versionLanguage \"G4"},
+      {inRecord([](Record r) { r.reserved[0] = 1; }), "reserved"},
+      {inRecord([](Record r) { r.fileName[0] = '/'; }), "fileName \"/"},
+      {inRecord([](Record r) { SetField(r.destination, ""); }), "nowhere"},
+      {inRecord([](Record r) { r.storedSize = 0xFFFFFFFF; }), "reaches into the header"},
+      {inRecord([](Record r) {
+         SetField(r.fileName, "a.exe");
+         SetField(r.destination, "\\");
+       }),
        "filled already"},
+      {withSize(2999), "expands to more than"},
+      {withSize(3001), "expands to 3000 bytes"},
+      {withSize(0x80000000), "2 GiB or more"},
+      {[](Image image) { image.pieces()[1].stream[0] = 'p'; }, "does not begin with"},
+      {[](Image image) {
+         image.pieces()[2].stream += '\0';
+         image.header().packageLength++;
+       },
+       "1 bytes stand between"},
+      {[](Image image) { image.executable()[0] = 'X'; }, "no version resource"},
+      {[](Image image) {
+         image.executable().clear();
+         image.header().dataOffset = 0;
+       },
+       "no executable"},
   };
-  for (const auto& row : rows) {
-    PackSample();
-    ChangeRecord(1, row.change);
-    ExpectWrong(row.part);
-  }
-}
-
-TEST_F(ImageVerifier, ComparesStreamsWithTheirSizes) {
-  const std::pair<uint32_t, const char*> rows[] = {{2999, "expands to more than"},
-                                                   {3001, "expands to 3000 bytes"},
-                                                   {0x80000000, "2 GiB or more"}};
-  for (const auto& [size, part] : rows) {
-    PackSample();
-    ChangeRecord(1, [size](FileRecord* record) { record->fileSize = size; });
-    ChangeHeader([size](PackageHeader* header) { header->spaceNeeded += size - 3000; });
-    ExpectWrong(part);
-  }
-}
-
-TEST_F(ImageVerifier, FindsBadStreamsGapsAndMissingPrograms) {
-  const struct {
-    std::function<void(std::string*)> change;
-    std::function<void(PackageHeader*)> adapt;
-    const char* part;
-  } rows[] = {
-      {[this](std::string* image) { (*image)[RecordOffset("image.exe", 1) + 696] = 'p'; },
-       [](PackageHeader*) {}, "does not begin with"},
-      {[](std::string* image) { image->insert(image->size() - 568, 1, '\0'); },
-       [](PackageHeader* header) { ++header->packageLength; }, "1 bytes stand between"},
-      {[](std::string* image) { (*image)[0] = 'X'; }, [](PackageHeader*) {}, "no version resource"},
-      {[this](std::string* image) { image->erase(0, HeaderOf("image.exe").dataOffset); },
-       [](PackageHeader* header) { header->dataOffset = 0; }, "no executable"},
-  };
-  for (const auto& row : rows) {
-    PackSample();
-    std::string image = Read("image.exe");
-    row.change(&image);
-    Write("image.exe", image);
-    ChangeHeader(row.adapt);
-    ExpectWrong(row.part);
+  for (const auto& [change, part] : rows) {
+    ImageBuilder image = sample;
+    change(image);
+    Write("image.exe", image.RawBytes());
+    const std::vector<std::string> wrong = WrongIn("image.exe");
+    ASSERT_EQ(wrong.size(), 1u) << part << ": " << (wrong.empty() ? "" : wrong[1]);
+    EXPECT_NE(wrong[0].find(part), std::string::npos) << part << ": " << wrong[0];
+    const ToolRun run = Run({"verify", "@image.exe"});
+    EXPECT_EQ(run.status, 1);
+    EXPECT_NE(run.out.find("wrong  " + wrong[0] + "\n"), std::string::npos);
   }
 }
 
 TEST_F(ImageVerifier, KnowsTheRulesOfRemovalPrograms) {
-  PackSample();
-  const ToolRun run =
-      RunImage({"removal", "@image.exe", "-o", "@removal.exe", "--language", "german"});
+  const ToolRun run = Run({"removal", "@image.exe", "-o", "@removal.exe", "--language", "german"});
   ASSERT_EQ(run.status, 0) << run.err;
-  const PackageHeader header = HeaderOf("removal.exe");
-  EXPECT_EQ(Read("removal.exe").size(), header.dataOffset + 3 * 696u + 568u);
-  EXPECT_EQ(header.defaultLanguage, 20000);
-  EXPECT_STREQ(RecordOf("removal.exe", 1).destination, RecordOf("image.exe", 1).destination);
   EXPECT_TRUE(WrongIn("removal.exe").empty());
-  ExpectRefused(RunImage({"removal", "@removal.exe", "-o", "@again.exe"}));
+  ExpectRefused(Run({"removal", "@removal.exe", "-o", "@again.exe"}));
+  // It is the image without its streams, and says so.
+  ImageBuilder expected = sample;
+  expected.header().removalImageFlag = 1;
+  expected.header().packageLength = 3 * sizeof(FileRecord);
+  sample.header() = expected.header();
+  expected.header().defaultLanguage = 20000;
+  for (ImageBuilder::Piece& piece : expected.pieces()) {
+    piece.stream.clear();
+    piece.record.storedSize = 0;
+  }
+  EXPECT_TRUE(Read("removal.exe") == expected.RawBytes());
 
-  ChangeHeader([](PackageHeader* image) {
-    image->removalImageFlag = 1;
-    image->packageLength = 3 * 696;
-  });
+  Write("image.exe", sample.RawBytes());
   EXPECT_EQ(WrongIn("image.exe").size(), 3u);  // each record has a stream
 }

@@ -1,12 +1,12 @@
 // What moriv-image explain says: every exit code has its words, in every form that tools show, and
 // a log is judged by its last run. Which event goes with which code is held against the scenarios
-// (tests/scenarios/explained_logs.py).
+// (tests/player/explained_log.py) and the fault loops.
 
 #include "tools/image/run_explainer.h"
 
-#include <cstdio>
-#include <fstream>
+#include <set>
 
+#include "tests/support/documented_codes.h"
 #include "tests/tools/tool_bench.h"
 #include "tools/image/run_outcomes.h"
 
@@ -14,28 +14,32 @@ namespace {
 
 using RunExplainer = ToolBench;
 
-TEST_F(RunExplainer, HasWordsForEveryStatus) {
-  std::ifstream header(MORIV_SOURCE_DIR "/src/core/status.h");
-  size_t declared = 0;
-  for (std::string line; std::getline(header, line);) {
-    char name[32] = {};
-    int code = 0;
-    constexpr char kDeclaration[] = "inline constexpr StatusCode %31[A-Za-z] = %d;";
-    if (std::sscanf(line.c_str(), kDeclaration, name, &code) != 2) continue;
-    ++declared;
-    const image::RunOutcome* outcome = image::FindRunOutcome(code);
-    ASSERT_NE(outcome, nullptr) << line;
-    EXPECT_STREQ(outcome->name, name);
-    EXPECT_STRNE(outcome->meaning, "");
-    EXPECT_STRNE(outcome->remedy, "");
+// The header declares it, the document has it in its table, and the tool has words for it.
+TEST_F(RunExplainer, KnowsEveryStatusAsItIsDocumented) {
+  std::ostringstream header;
+  header << std::ifstream(MORIV_SOURCE_DIR "/src/core/status.h").rdbuf();
+  const std::string text = header.str();
+  const std::regex declaration("StatusCode (Status\\w+ = -?\\d+);");
+  std::set<std::string> declared;
+  for (std::sregex_iterator at(text.begin(), text.end(), declaration), end; at != end; ++at)
+    declared.insert((*at)[1]);
+  std::set<std::string> documented;
+  for (const DocumentedCode& row : ReadDocumentedCodes()) {
+    documented.insert(row.name + " = " + std::to_string(row.code));
+    const std::string form = (row.code < 0 ? " = " + row.unsignedForm : "") + " = " +
+                             row.hexadecimal + ", " + row.name + "\nmeaning     ";
+    EXPECT_NE(Run({"explain", std::to_string(row.code)}).out.find(form), std::string::npos) << form;
+    EXPECT_EQ(std::stoul(row.unsignedForm), static_cast<uint32_t>(row.code));
   }
-  // 0, after the help, is no status.
-  EXPECT_EQ(image::RunOutcomes().size(), declared + 1);
+  EXPECT_EQ(documented, declared);
+  EXPECT_EQ(image::RunOutcomes().size(), declared.size() + 1);  // 0, after the help, is no status
+  for (const image::RunOutcome& outcome : image::RunOutcomes())
+    EXPECT_TRUE(*outcome.meaning != '\0' && *outcome.remedy != '\0') << outcome.code;
 }
 
 TEST_F(RunExplainer, TakesACodeInEveryForm) {
   for (const char* code : {"-1000020", "4293967276", "0xFFF0BDAC", "0xfff0bdac"}) {
-    const ToolRun run = RunImage({"explain", code});
+    const ToolRun run = Run({"explain", code});
     EXPECT_EQ(run.status, 0) << run.err;
     EXPECT_TRUE(
         run.out.starts_with("exit code   -1000020 = 4293967276 = 0xFFF0BDAC, StatusNoDiskSpace\n"
@@ -44,7 +48,7 @@ TEST_F(RunExplainer, TakesACodeInEveryForm) {
   }
   for (const char* code :
        {"100003", "2", "-1000022", "4294967296", "-2147483649", "0x", "0x-1", "1x", ""}) {
-    ExpectRefused(RunImage({"explain", code}));
+    ExpectRefused(Run({"explain", code}));
   }
 }
 
@@ -58,20 +62,20 @@ TEST_F(RunExplainer, JudgesTheLastRunOfALog) {
                               "1- Unistalling Moriv from the system \r\n"
                               "2- Moriv registration removed from the registry \r\n";
   Write("removed", failed + removed);
-  EXPECT_EQ(RunImage({"explain", "@removed"}).out,
+  EXPECT_EQ(Run({"explain", "@removed"}).out,
             "run         Monday, 01 June 2026 at : 01h 02m 03s\n"
             "event       2- Moriv registration removed from the registry\n"
             "exit code   1 = 0x00000001, StatusOk\n"
             "meaning     Success: all is done.\n"
             "to do       Nothing.\n");
   Write("failed", removed + failed);
-  const std::string told = RunImage({"explain", "@failed"}).out;
+  const std::string told = Run({"explain", "@failed"}).out;
   EXPECT_NE(told.find("1- Fatal Error : Error copying destination file :  C:\\é.\n"
                       "exit code   -1000021 "),
             std::string::npos)
       << told;
   Write("text", "1- Fatal Error : Cannot allocate memory . \r\n");
-  ExpectRefused(RunImage({"explain", "@text"}), "no log of the setup program");
+  ExpectRefused(Run({"explain", "@text"}), "no log of the setup program");
 }
 
 }  // namespace

@@ -3,15 +3,13 @@
 
 #include <gtest/gtest.h>
 
-#include <cstdint>
-#include <filesystem>
-#include <functional>
-#include <iosfwd>
+#include <algorithm>
+#include <sstream>
 #include <string>
 #include <vector>
 
-#include "package/package_format.h"
-#include "tests/support/test_machine.h"
+#include "tests/support/test_image.h"
+#include "tools/image/image_command_line.h"
 
 // What a tool said and how it ended.
 struct ToolRun {
@@ -23,32 +21,85 @@ struct ToolRun {
 class ToolBench : public testing::Test, protected TemporaryFolder {
  protected:
   // Names of all that stands in a folder, sorted.
-  std::vector<std::string> NamesIn(const std::string& folder) const;
+  std::vector<std::string> NamesIn(const std::string& folder) const {
+    std::vector<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(Host(folder)))
+      names.push_back(entry.path().filename().string());
+    std::ranges::sort(names);
+    return names;
+  }
 
-  // Runs moriv-image; an argument "@name" is a path in the test's folder. A run that is refused
-  // says so in one line and leaves the folder as it was.
-  ToolRun RunImage(const std::vector<std::string>& arguments) const;
-  // The same with moriv-machine.
-  ToolRun RunMachine(const std::vector<std::string>& arguments) const;
+  // Runs a tool, moriv-image unless told; an argument "@name" is a path in the test's folder. A run
+  // that is refused says so in one line and leaves the folder as it was.
+  using Tool = int(int, const char* const*, std::ostream&, std::ostream&);
+  ToolRun Run(std::vector<std::string> arguments, Tool tool = image::RunImageTool) const {
+    std::vector<const char*> argv = {"tool"};
+    for (std::string& argument : arguments) {
+      if (argument.starts_with('@')) argument = Host(argument.substr(1)).string();
+      argv.push_back(argument.c_str());
+    }
+    const std::vector<std::string> before = NamesIn(".");
+    std::ostringstream out;
+    std::ostringstream err;
+    const int status = tool(static_cast<int>(argv.size()), argv.data(), out, err);
+    if (status == 2) {
+      EXPECT_EQ(err.str().find('\n'), err.str().size() - 1) << err.str();
+      EXPECT_EQ(NamesIn("."), before) << err.str();
+    }
+    return {status, out.str(), err.str()};
+  }
 
   // It was refused, and this is a part of what it said.
-  static void ExpectRefused(const ToolRun& run, const std::string& said = "");
+  static void ExpectRefused(const ToolRun& run, const std::string& said = "") {
+    EXPECT_EQ(run.status, 2) << said;
+    EXPECT_NE(run.err.find(said), std::string::npos) << said << ": " << run.err;
+  }
+};
 
-  // Writes stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (random), empty.txt and setup.toml,
-  // and packs them as image.exe, which must succeed.
-  void PackSample() const;
-  static const char* SampleDescription();
+// Holds stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (3000 bytes, random), empty.txt and
+// setup.toml, and all of it packed as image.exe.
+class SampleBench : public ToolBench {
+ protected:
+  static constexpr char kDescription[] = R"([package]
+default_directory = 'C:\Program Files\Moriv'
+default_language = "french"
 
-  // Changes the header or one record of image.exe, a good image of the sample.
-  void ChangeHeader(const std::function<void(PackageHeader*)>& change) const;
-  void ChangeRecord(size_t number, const std::function<void(FileRecord*)>& change) const;
-  PackageHeader HeaderOf(const std::string& image) const;
-  FileRecord RecordOf(const std::string& image, size_t number) const;
+[[file]]
+source = "a.exe"
+destination = '%INSTALL_DIR%'
 
-  // Offset of a record, counted from 0, in an image.
-  size_t RecordOffset(const std::string& image, size_t number) const;
+[[file]]
+source = "b.dll"
+destination = '%SYS_DIR%\moriv;%PLUGIN_ALL_DIR%'
+version = "1.2.3"
+language = "040904b0"
 
- private:
-  using Tool = int (*)(int, const char* const*, std::ostream&, std::ostream&);
-  ToolRun Run(Tool tool, std::vector<std::string> arguments) const;
+[[file]]
+source = "empty.txt"
+destination = '%INSTALL_DIR%\docs'
+name = "readme.txt"
+)";
+
+  SampleBench() {
+    Write("stub.exe", VersionedProgram("1.0.0"));
+    std::string program = VersionedProgram("4.1.7");
+    program.resize(45056);
+    Write("a.exe", program);
+    Write("b.dll", RandomBytes(3000, 1));
+    Write("empty.txt", "");
+    Write("setup.toml", kDescription);
+    const ToolRun run = Pack("@setup.toml", "@stub.exe", "@image.exe");
+    EXPECT_EQ(run.status, 0) << run.err;
+    sample = ImageBuilder::TakenApart(Read("image.exe"));
+  }
+
+  // Packs a description, which is a text or the "@name" of a file.
+  ToolRun Pack(const std::string& description, const std::string& stub = "@stub.exe",
+               const std::string& output = "@new.exe") const {
+    const bool isFile = description.starts_with('@');
+    if (!isFile) Write("text.toml", description);
+    return Run({"pack", isFile ? description : "@text.toml", "--stub", stub, "-o", output});
+  }
+
+  ImageBuilder sample;  // image.exe taken apart
 };

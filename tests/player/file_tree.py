@@ -1,0 +1,72 @@
+"""The files of a machine's drives, and what a run changed among them.
+
+A machine's folder has one folder a drive, drive_c and so on. Paths are the machine's own
+(C:\\a\\b); a directory's ends with a backslash.
+"""
+
+import os
+import shutil
+import stat
+from pathlib import Path
+
+
+class FileTree:
+    def __init__(self, machine_folder):
+        self.folder = Path(machine_folder)
+
+    def host(self, path):
+        """Host path of one of the machine's, which need not exist."""
+        drive, _, rest = path.partition(':')
+        return self.folder / f'drive_{drive.lower()}' / rest.strip('\\').replace('\\', '/')
+
+    def read(self, path):
+        return self.host(path).read_bytes()
+
+    def write(self, path, content, read_only=False):
+        """Makes a file and the directories that lead to it."""
+        host = self.host(path)
+        host.parent.mkdir(parents=True, exist_ok=True)
+        if host.exists():
+            host.chmod(0o644)
+        host.write_bytes(content)
+        if host.suffix.lower() == '.exe':
+            host.chmod(0o755)
+        if read_only:
+            host.chmod(0o444)
+
+    def delete(self, path):
+        host = self.host(path)
+        if host.is_dir() and not host.is_symlink():
+            shutil.rmtree(host)
+        else:
+            host.unlink(missing_ok=True)
+
+    def snapshot(self):
+        """Every path with a stamp that differs when the file was written or made anew."""
+        stamps = {}
+        for drive in sorted(self.folder.glob('drive_?')):
+            self._walk(drive, f'{drive.name[-1].upper()}:\\', stamps)
+        return stamps
+
+    def _walk(self, folder, path, stamps):
+        for entry in os.scandir(folder):
+            status = entry.stat(follow_symlinks=False)
+            if entry.is_dir(follow_symlinks=False):
+                stamps[f'{path}{entry.name}\\'] = None
+                self._walk(entry.path, f'{path}{entry.name}\\', stamps)
+            else:
+                stamps[path + entry.name] = (status.st_size, status.st_ino, status.st_ctime_ns,
+                                             stat.S_IMODE(status.st_mode))
+
+
+def changes(before, after):
+    """What differs between two snapshots: a sign by path; '+' new, '-' gone, '~' written anew."""
+    signs = {path: '-' for path in before.keys() - after.keys()}
+    signs |= {path: '+' for path in after.keys() - before.keys()}
+    signs |= {path: '~' for path in before.keys() & after.keys() if before[path] != after[path]}
+    return dict(sorted(signs.items()))
+
+
+def is_writable(stamp):
+    """Whether the file of a snapshot can be deleted."""
+    return stamp[3] & stat.S_IWUSR != 0

@@ -1,0 +1,179 @@
+"""pytest's plugin for scenarios: each scenario is an item, played in the world of the session."""
+
+import os
+import shutil
+from concurrent.futures import ThreadPoolExecutor
+from pathlib import Path
+
+import pytest
+
+from scenario_play import ScenarioFailure, Tools, play
+from scenario_text import ScenarioError, parse
+from worlds import StandIn, Wine, WorldError, require
+
+ROOT = Path(__file__).resolve().parent.parent.parent
+SCENARIOS = ROOT / 'tests' / 'scenarios'
+PROGRAMS = ROOT / 'tests' / 'player'
+BUILD = ROOT / 'build'
+LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
+
+
+def pytest_addoption(parser):
+    group = parser.getgroup('scenarios')
+    group.addoption('--world', choices=['stand-in', 'wine64', 'wine32'], default='stand-in')
+    group.addoption('--fail-fast', action='store_const', const=1, dest='maxfail',
+                    help='end at the first failure')
+    group.addoption('--accept', action='store_true',
+                    help='print what a run does in the form of checks, where its checks do not hold')
+    group.addoption('--native', type=Path, default=BUILD / 'native', help='the native build')
+    group.addoption('--wine', type=Path, default=BUILD / 'wine', help='folder for Wine prefixes')
+
+
+def pytest_configure(config):
+    config.player = Player(config.option)
+    names = config.option.file_or_dir or ['scenarios']
+    config.args = [path for name in names for path in _paths(name)]
+
+
+def _paths(name):
+    """What pytest has to collect for a name of the command line."""
+    if name in ('all', 'scenarios'):
+        return [str(SCENARIOS), str(PROGRAMS)] if name == 'all' else [str(SCENARIOS)]
+    base, bracket, row = name.partition('[')
+    found = [*SCENARIOS.rglob(f'{base}.scenario'), *PROGRAMS.glob(f'{base}_test.py')]
+    if found:
+        return [f'{found[0]}::{name}' if bracket else str(found[0])]
+    if (SCENARIOS / name).is_dir():
+        return [str(SCENARIOS / name)]
+    if Path(name.partition('::')[0]).exists():
+        return [name]
+    raise pytest.UsageError(f'no scenario and no folder {name}')
+
+
+def pytest_collect_file(file_path, parent):
+    if file_path.suffix == '.scenario':
+        return ScenarioFile.from_parent(parent, path=file_path)
+    return None
+
+
+class ScenarioFile(pytest.File):
+    def collect(self):
+        try:
+            scenarios = parse(self.path.stem, self.path.read_text(encoding='utf-8'), self.path.name)
+        except ScenarioError as error:
+            raise self.CollectError(str(error)) from error
+        for scenario in scenarios:
+            item = ScenarioItem.from_parent(self, name=scenario.name)
+            item.scenario = scenario
+            yield item
+
+
+class ScenarioItem(pytest.Item):
+    outcome = None  # of a play that has begun beside others
+
+    def runtest(self):
+        player = self.config.player
+        if not player.can_play(self.scenario):
+            pytest.skip(f'only {self.scenario.only}: {self.scenario.reason}')
+        if self.outcome:
+            self.outcome.result()
+        else:
+            player.play(self.scenario)
+
+    def repr_failure(self, excinfo):
+        if isinstance(excinfo.value, (ScenarioError, ScenarioFailure, WorldError)):
+            return f'{self.scenario.title}\n{excinfo.value}'
+        return super().repr_failure(excinfo)
+
+    def reportinfo(self):
+        return self.path, None, self.name
+
+
+def pytest_collection_finish(session):
+    """The world is had when all that it is for is known. Where several machines can be had at once,
+    scenarios are played beside each other, in the order in which their outcomes are asked for."""
+    player = session.config.player
+    if session.config.option.collectonly or not session.items or session.testsfailed:
+        return
+    player.open()
+    if player.world.at_once > 1:
+        player.pool = ThreadPoolExecutor(player.world.at_once)
+        for item in session.items:
+            if isinstance(item, ScenarioItem) and player.can_play(item.scenario):
+                item.outcome = player.pool.submit(player.play, item.scenario)
+
+
+def pytest_sessionfinish(session):
+    session.config.player.close()
+
+
+def pytest_terminal_summary(terminalreporter, config):
+    counts = {kind: len(terminalreporter.stats.get(kind, [])) for kind in
+              ('passed', 'failed', 'error', 'skipped')}
+    counts['failed'] += counts.pop('error')
+    config.player.tell(', '.join(f'{count} {kind}' for kind, count in counts.items()))
+
+
+@pytest.fixture(scope='session')
+def player(request):
+    return request.config.player
+
+
+class Player:
+    """One world, and what scenarios are played with in it."""
+
+    def __init__(self, options):
+        self.options = options
+        self.work = options.native / 'scenarios'
+        self.world = self._make_world()
+        images = self.work / f'{self.world.name}-images'
+        kinds = {'sample': BUILD / 'win32' / 'samples', 'real': images.with_name(f'{images.name}-real')}
+        self.tools = Tools(self.world.stub, options.native / 'moriv-image', kinds, images)
+        self.pool = None
+        self.is_open = False
+
+    def open(self):
+        if reason := self.world.missing():
+            self.tell(f'left out: {reason}')
+            # Only what the host can't do and what was asked for is left out without a failure.
+            asked_for = os.environ.get('MORIV_WINE') == 'none' or self.world.name == 'wine32'
+            pytest.exit(reason, LEFT_OUT if asked_for else 1)
+        try:
+            require(self.tools.image_tool)
+            self.is_open = True
+            self.world.open()
+        except WorldError as error:
+            pytest.exit(str(error), 2)
+        shutil.rmtree(self.tools.images, ignore_errors=True)
+
+    def close(self):
+        if self.pool:
+            self.pool.shutdown(cancel_futures=True)
+        if self.is_open:
+            self.world.close()
+
+    def tell(self, line):
+        """Prints the closing line, and keeps it for tools/test, which tells all worlds' at its end."""
+        line = f'scenarios: {self.world.name}: {line}'
+        print(line)
+        self.work.mkdir(parents=True, exist_ok=True)
+        (self.work / f'scenarios.{self.world.name}.count').write_text(line + '\n')
+
+    def can_play(self, scenario):
+        return self.world.name.lower().startswith(scenario.only.lower())
+
+    def play(self, scenario):
+        """Raises what play() raises; the stand-in machine of a scenario that failed stays."""
+        machine = self.world.machine(scenario.name)
+        try:
+            play(scenario, machine, self.tools, self.options.accept)
+        except (ScenarioFailure, ScenarioError) as failure:
+            raise type(failure)(f'{failure}{machine.keep()}') from failure
+        machine.discard()
+
+    def _make_world(self):
+        if self.options.world == 'stand-in':
+            return StandIn(self.options.native, self.work / 'stand-in')
+        bits = int(self.options.world.removeprefix('wine'))
+        return Wine(bits, BUILD / f'win{bits}', ROOT / 'tools' / 'wine',
+                    self.options.wine / f'scenarios{bits}')
