@@ -149,6 +149,10 @@ void PkzExpander::GiveOut() {
 
 void PkzFileExpander::ExpandBlock(const uint8_t* bytes, uint32_t count) {
   if (failed() != 0) return;
+  if (bytes == nullptr) {
+    Fail();
+    return;
+  }
   if (magicSeen_) {
     Expand(bytes, count);
     return;

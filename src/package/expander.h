@@ -91,7 +91,7 @@ class PkzFileExpander : public PkzExpander {
   explicit PkzFileExpander(DataFile* output) : output_(output) {}
 
   // Takes the next block of the stream. The first one has to hold the magic whole and one byte
-  // more.
+  // more. A null block fails the stream.
   void ExpandBlock(const uint8_t* bytes, uint32_t count);
 
   // Writes what is collected. The destructor doesn't.

@@ -64,9 +64,12 @@ int32_t ReadFileRecord(DataFile* file, FileRecord* record) {
 
 StatusCode GetImagePath(char* buffer, uint32_t size) {
   if (buffer == nullptr || size == 0) return StatusBadArgument;
-  const auto length = static_cast<int32_t>(GetModuleFileNameA(ModuleHandle(), buffer, size));
-  buffer[size - 1] = '\0';  // systems before Windows Vista leave a path that they cut without one
-  return length > 0 && buffer[0] != '\0' ? StatusOk : StatusNoModulePath;
+  const DWORD length = GetModuleFileNameA(ModuleHandle(), buffer, size);
+  // A path that is cut names another file. The answer is then the size, and systems before Windows
+  // Vista put no NUL.
+  if (length > 0 && length < size && buffer[0] != '\0') return StatusOk;
+  buffer[0] = '\0';
+  return StatusNoModulePath;
 }
 
 void ClosePackageFile(SetupContext* context) {

@@ -27,17 +27,24 @@ bool WriteFormat(DataFile* file, const char* format, Texts... texts) {
   return file->Write(text, length) == length;
 }
 
-bool WriteLines(DataFile* file) {
-  char program[kCatalogTextSize] = {};
-  char log[kCatalogTextSize] = {};
-  LoadCatalogText(nullptr, CatalogRemovalProgram, program);
-  LoadCatalogText(nullptr, CatalogLogName, log);
-  if (program[0] == '\0' || log[0] == '\0') return false;
+// The names of the files that go besides the script.
+struct FileNames {
+  char program[kCatalogTextSize];
+  char log[kCatalogTextSize];
+};
+
+bool LoadFileNames(FileNames* names) {
+  LoadCatalogText(nullptr, CatalogRemovalProgram, names->program);
+  LoadCatalogText(nullptr, CatalogLogName, names->log);
+  return names->program[0] != '\0' && names->log[0] != '\0';
+}
+
+bool WriteLines(DataFile* file, const FileNames& names) {
   return WriteFormat(file, "[%s]\r\n%s=%s\r\n", "Version", "Signature", "$Chicago$") &&
          WriteFormat(file, "%s=%s\r\n", "AdvancedINF", "2.0") &&
          WriteFormat(file, "\r\n[%s]\r\n%s=%s\r\n", kCleanupSection, "DelFiles", kDeleteSection) &&
-         WriteFormat(file, "\r\n[%s]\r\n%s\r\n", kDeleteSection, program) &&
-         WriteFormat(file, "%s\r\n", log) &&        //
+         WriteFormat(file, "\r\n[%s]\r\n%s\r\n", kDeleteSection, names.program) &&
+         WriteFormat(file, "%s\r\n", names.log) &&  //
          WriteFormat(file, "%s\r\n", kFileName) &&  //
          WriteFormat(file, "\r\n[%s]\r\n%s = %s\r\n", "DestinationDirs", kDeleteSection,
                      kWindowsDirNumber);
@@ -46,11 +53,14 @@ bool WriteLines(DataFile* file) {
 }  // namespace
 
 int WriteCleanupScript(char* path, size_t size) {
+  if (path == nullptr) return 0;
   char target[kPathSize] = {};
   if (GetWindowsDir(target, sizeof(target)) != 1) return 0;
   (void)AppendBackslash(target);
   if (!AppendText(target, kFileName) || !CopyText(path, size, target)) return 0;
-  (void)DeleteFileChecked(target);  // one of an earlier removal goes; usually there is none
+  FileNames names = {};
+  if (!LoadFileNames(&names)) return 0;  // before a file is made that would stay empty
+  (void)DeleteFileChecked(target);       // one of an earlier removal goes; usually there is none
   const std::unique_ptr<DataFile> file(new (std::nothrow) DataFile(target));
-  return file != nullptr && file->Create() == 1 && WriteLines(file.get());
+  return file != nullptr && file->Create() == 1 && WriteLines(file.get(), names);
 }

@@ -109,7 +109,7 @@ const char* ItemNameAt(int32_t item, const char* service, const char* subKey) {
 
 int32_t ReadItem(const char* path, const char* name, char* buffer, int32_t size) {
   RegistryKey key;
-  if (buffer == nullptr || size < 0 || !key.Open(HKEY_LOCAL_MACHINE, path, KEY_READ)) return 0;
+  if (!key.Open(HKEY_LOCAL_MACHINE, path, KEY_READ)) return 0;
   DWORD type = 0;
   DWORD count = static_cast<DWORD>(size);
   if (RegQueryValueExA(key.get(), name, nullptr, &type, reinterpret_cast<BYTE*>(buffer), &count) !=
@@ -123,7 +123,7 @@ int32_t ReadItem(const char* path, const char* name, char* buffer, int32_t size)
 
 int32_t WriteItem(const char* path, const char* name, const char* buffer, int32_t size) {
   RegistryKey key;
-  return buffer != nullptr && size >= 0 && key.Open(HKEY_LOCAL_MACHINE, path, KEY_WRITE) &&
+  return key.Open(HKEY_LOCAL_MACHINE, path, KEY_WRITE) &&
          key.SetText(name, buffer, static_cast<DWORD>(size));
 }
 
@@ -178,6 +178,7 @@ int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const
   ProductPath path;
   const char* const name = ItemNameAt(item, service, subKey);
   if (name == nullptr || !BuildProductPath(service, kind, subKey, path)) return -1;
+  if (operation != kOperationDelete && (buffer == nullptr || size < 0)) return -1;
   switch (operation) {
     case kOperationRead:
       return ReadItem(path, name, buffer, size);

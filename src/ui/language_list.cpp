@@ -93,6 +93,7 @@ void DrawEntry(const LanguageListArt& art, const DRAWITEMSTRUCT& item, const Lan
 }  // namespace
 
 int BuildLanguageList(HWND dialog, LanguageListArt* art) {
+  if (art == nullptr) return 0;
   *art = {};
   const HWND list = List(dialog);
   if (list == nullptr) return 0;  // nobody would own the items
@@ -118,6 +119,7 @@ int BuildLanguageList(HWND dialog, LanguageListArt* art) {
 }
 
 int FreeLanguageList(HWND dialog, LanguageListArt* art) {
+  if (art == nullptr) return 0;
   // First, since a flag that could not be taken out of it can't be deleted while it stands.
   if (art->memoryDC != nullptr) DeleteDC(art->memoryDC);
   const HWND list = List(dialog);

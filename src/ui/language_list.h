@@ -27,11 +27,11 @@ struct LanguageListArt {
 };
 
 // Fills the list. Returns 1, or 0 with the list empty and hidden when an item can't be made or
-// added.
+// added; 0 for a null art.
 int BuildLanguageList(HWND dialog, LanguageListArt* art);
 
 // Releases all items and the art. The list's own notices of deleted items find nothing left to do.
-// Returns 1.
+// Returns 1, or 0 for a null art.
 int FreeLanguageList(HWND dialog, LanguageListArt* art);
 
 // The item at an index of the list; null for none.

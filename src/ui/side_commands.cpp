@@ -75,6 +75,7 @@ void OpenLogFile(HWND dialog, const SetupContext*) {
 }
 
 int ReadBrowserCommand(char* buffer, size_t size) {
+  if (buffer == nullptr || size == 0) return 0;
   RegistryKey key;
   if (!key.Open(HKEY_CLASSES_ROOT, "http\\shell\\open\\command", KEY_READ) &&
       !key.Open(HKEY_CLASSES_ROOT, "htmlfile\\shell\\open\\command", KEY_READ)) {

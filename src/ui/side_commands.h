@@ -14,8 +14,8 @@ void OpenWebAddress(HWND dialog, const SetupContext* context);
 // Opens the log with the program that the system has for it.
 void OpenLogFile(HWND dialog, const SetupContext* context);
 
-// The command line that the system registers for web addresses. Returns 1, or 0 when there is none
-// or it doesn't fit.
+// The command line that the system registers for web addresses. Returns 1, or 0 when there is none,
+// it doesn't fit, or there is no buffer.
 int ReadBrowserCommand(char* buffer, size_t size);
 
 // Replaces each occurrence of a character, or drops it when the replacement is 0. Returns 1, or -1
