@@ -7,8 +7,8 @@
 
 #include "core/context.h"
 
-// The text behind the program's name in a process's whole command line. A name in quotes ends at the
-// closing quote, another one at the first blank or tab; blanks and tabs behind it are skipped.
+// The text behind the program's name in a process's whole command line. A name in quotes ends at
+// the closing quote, another one at the first blank or tab; blanks and tabs behind it are skipped.
 // Returns null for null.
 const char* SkipProgramName(const char* commandLine);
 

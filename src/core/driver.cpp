@@ -13,11 +13,6 @@
 
 namespace {
 
-StatusCode GiveUp(SetupContext* context, uint32_t event, const char* text, StatusCode status) {
-  (void)AddEvent(&context->events, event, SeverityFatal, text);
-  return status;
-}
-
 // The log is written after all work; closing frees the events, so it comes last.
 StatusCode FinishSilentRun(SetupContext* context, StatusCode code) {
   WriteLogs(&context->events, context->reportFile);
@@ -29,10 +24,10 @@ StatusCode InstallSilently(SetupContext* context) {
   const TextField defaultDirectory(context->header.defaultDirectory);
   if (ChooseInstallDir(context, context->installDir, sizeof(context->installDir),
                        defaultDirectory.text) != StatusOk) {
-    return GiveUp(context, EventBadDirectory, context->installDir, StatusBadDirectory);
+    return GiveUp(&context->events, EventBadDirectory, context->installDir, StatusBadDirectory);
   }
   if (CheckDiskSpace(context) != StatusOk) {
-    return GiveUp(context, EventNoDiskSpace, context->installDir, StatusNoDiskSpace);
+    return GiveUp(&context->events, EventNoDiskSpace, context->installDir, StatusNoDiskSpace);
   }
   const StatusCode installed = InstallFiles(context);
   if (installed != StatusOk) return installed;
@@ -57,7 +52,7 @@ StatusCode InstallSilently(SetupContext* context) {
 StatusCode RemoveSilently(SetupContext* context) {
   char services[kEventTextSize] = {};
   if (CheckDependingServices(services, sizeof(services)) == 0) {
-    return GiveUp(context, EventServicesRemain, services, StatusServicesRemain);
+    return GiveUp(&context->events, EventServicesRemain, services, StatusServicesRemain);
   }
   Inform(&context->events, EventRemoving);
   if (context->productFound == 1) {

@@ -54,6 +54,11 @@ void Warn(EventList* list, uint32_t code, const char* text) {
   (void)AddEvent(list, code, SeverityWarning, text);
 }
 
+StatusCode GiveUp(EventList* list, uint32_t code, const char* text, StatusCode status) {
+  (void)AddEvent(list, code, SeverityFatal, text);
+  return status;
+}
+
 StatusCode FreeEventList(EventList* list) {
   if (list == nullptr) return StatusBadArgument;
   if (list->count < 1 || list->entries == nullptr) return StatusOk;

@@ -80,6 +80,9 @@ StatusCode AddEvent(EventList* list, uint32_t code, uint32_t severity, const cha
 void Inform(EventList* list, uint32_t code, const char* text = nullptr);
 void Warn(EventList* list, uint32_t code, const char* text = nullptr);
 
+// Adds the fatal event of an operation that gives up, and returns the status that it gives up with.
+StatusCode GiveUp(EventList* list, uint32_t code, const char* text, StatusCode status);
+
 // Frees the entries and leaves the list empty. An empty list is left alone. Returns 1, or
 // StatusBadArgument for a null list.
 StatusCode FreeEventList(EventList* list);

@@ -13,7 +13,7 @@ void ReportNeededSpace(SetupContext* context, const char* sizeText, uint32_t nee
   char text[kEventTextSize] = {};
   (void)FormatText(text, sizeof(text), "%s (%lu bytes)", sizeText,
                    static_cast<unsigned long>(needed));
-  (void)AddEvent(&context->events, EventSpaceNeeded, SeverityInformation, text);
+  Inform(&context->events, EventSpaceNeeded, text);
   WriteReportFile(&context->events, context->reportFile);
 }
 

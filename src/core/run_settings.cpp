@@ -63,7 +63,7 @@ StatusCode FindInstalledProduct(SetupContext* context) {
   context->productFound = ReadRegisteredProduct(&registered) == 1;
   if (context->productFound == 1) {
     (void)CopyText(context->installDir, registered.installDir);  // the same size
-    (void)AddEvent(&context->events, EventFoundRegistered, SeverityInformation, nullptr);
+    Inform(&context->events, EventFoundRegistered);
     return StatusOk;
   }
 
@@ -75,7 +75,7 @@ StatusCode FindInstalledProduct(SetupContext* context) {
   if (!exists) return StatusOk;
   context->productFound = 1;
   (void)CopyText(context->installDir, directory);
-  (void)AddEvent(&context->events, EventFoundDirectory, SeverityInformation, nullptr);
+  Inform(&context->events, EventFoundDirectory);
   return StatusOk;
 }
 

@@ -20,9 +20,8 @@ class InstallPass {
   StatusCode Begin() {
     context_->records = new (std::nothrow) FileRecord[context_->header.recordCount]();
     if (context_->records != nullptr) return StatusOk;
-    (void)AddEvent(&context_->events, EventNoMemory, SeverityFatal, nullptr);
     ClosePackageFile(context_);
-    return StatusNoMemory;
+    return GiveUp(&context_->events, EventNoMemory, nullptr, StatusNoMemory);
   }
 
   FileRecord* RecordAt(int index) { return &context_->records[index]; }
@@ -35,20 +34,15 @@ class InstallPass {
   SetupContext* context_;
 };
 
-StatusCode FailTarget(SetupContext* context, uint32_t event, const char* path, StatusCode status) {
-  (void)AddEvent(&context->events, event, SeverityFatal, path);
-  return status;
-}
-
 // Makes way for a file and names it to the user.
 StatusCode PrepareTarget(SetupContext* context, const char* path) {
   const bool replaces = FileExists(path) == 1;
   if (replaces && DeleteFileChecked(path) != 1) {
-    return FailTarget(context, EventDeleteFailed, path, StatusDeleteFailed);
+    return GiveUp(&context->events, EventDeleteFailed, path, StatusDeleteFailed);
   }
   ShowMessage(context, replaces ? CatalogFileUpdated : CatalogFileCopied, path);
   const StatusCode status = MakeDirectories(path);
-  return status == StatusOk ? status : FailTarget(context, EventNoDirectory, path, status);
+  return status == StatusOk ? status : GiveUp(&context->events, EventNoDirectory, path, status);
 }
 
 }  // namespace
@@ -70,12 +64,12 @@ StatusCode InstallTargets(SetupContext* context, const TargetList* list, uint32_
     if (status != StatusOk) return status;
     if (i == 0) {
       status = ExpandStream(context->packageFile, path, storedSize);
-      if (status != StatusOk) return FailTarget(context, EventExpandFailed, path, status);
+      if (status != StatusOk) return GiveUp(&context->events, EventExpandFailed, path, status);
     } else {
       status = CopyTarget(list->entries[0].path, path);
-      if (status != StatusOk) return FailTarget(context, EventCopyFailed, path, status);
+      if (status != StatusOk) return GiveUp(&context->events, EventCopyFailed, path, status);
     }
-    (void)AddEvent(&context->events, EventFileCopied, SeverityInformation, path);
+    Inform(&context->events, EventFileCopied, path);
   }
   return StatusOk;
 }

@@ -29,8 +29,7 @@ inline bool SkipStream(DataFile* file, const FileRecord& record) {
 
 template <typename Pass>
 StatusCode Fail(SetupContext* context, uint32_t event, const char* text, StatusCode status) {
-  if (Pass::kReports) (void)AddEvent(&context->events, event, SeverityFatal, text);
-  return status;
+  return Pass::kReports ? GiveUp(&context->events, event, text, status) : status;
 }
 
 template <typename Pass>

@@ -28,14 +28,14 @@ class RemovalPass {
   // Tries a directory and logs the attempt, whatever became of it.
   void TryDirectory(const char* path) {
     (void)RemoveDirectoryChecked(path);
-    (void)AddEvent(&context_->events, EventRemovingDirectory, SeverityInformation, path);
+    Inform(&context_->events, EventRemovingDirectory, path);
   }
 
  private:
   void RemoveTarget(const TargetEntry& target) {
     if (FileExists(target.path) != 1) return;
     ShowMessage(context_, CatalogDeletingFile, target.path);
-    (void)AddEvent(&context_->events, EventDeletingFile, SeverityInformation, target.path);
+    Inform(&context_->events, EventDeletingFile, target.path);
     (void)DeleteFileChecked(target.path);  // a file in use or read-only stays
     if (target.directory[0] != '\0') TryDirectory(target.directory);
   }

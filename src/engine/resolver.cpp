@@ -101,10 +101,8 @@ StatusCode FanOut(SetupContext* context, TargetList* list, const char* behindMac
   for (const Browser& browser : kBrowsers) {
     WorkText work = {};
     const bool found = browser.findPluginDir(work, kPathSize) == 1;
-    if (logBrowsers) {
-      (void)AddEvent(&context->events, found ? browser.foundEvent : browser.missingEvent,
-                     found ? SeverityInformation : SeverityWarning, nullptr);
-    }
+    if (logBrowsers && found) Inform(&context->events, browser.foundEvent);
+    if (logBrowsers && !found) Warn(&context->events, browser.missingEvent);
     if (!found) continue;
     char directory[kPathSize] = {};
     const StatusCode composed = ComposePath(work, subpath, record, directory, sizeof(directory));

@@ -58,7 +58,7 @@ int32_t DetectOlderFiles(SetupContext* context) {
   UpdateCheck check;
   const StatusCode status = WalkPackage(context, check);
   if (check.foundOlder()) {
-    (void)AddEvent(&context->events, EventOlderFound, SeverityInformation, nullptr);
+    Inform(&context->events, EventOlderFound);
     return 1;
   }
   return status == StatusOk || IsGivenUp(status) ? 0 : status;

@@ -10,9 +10,8 @@ namespace {
 
 StatusCode RefusePackage(SetupContext* context, const char* path, uint32_t event,
                          StatusCode status) {
-  (void)AddEvent(&context->events, event, SeverityFatal, path);
   ClosePackageFile(context);
-  return status;
+  return GiveUp(&context->events, event, path, status);
 }
 
 bool IsGoodHeader(const PackageHeader& header) {
@@ -32,8 +31,7 @@ StatusCode ReadPackageHeader(SetupContext* context) {
   if (context == nullptr) return StatusBadPackage;
   char path[kPathSize] = {};
   if (GetImagePath(path, sizeof(path)) != StatusOk) {
-    (void)AddEvent(&context->events, EventNoImagePath, SeverityFatal, nullptr);
-    return StatusInternal;
+    return GiveUp(&context->events, EventNoImagePath, nullptr, StatusInternal);
   }
   DataFile* file = new (std::nothrow) DataFile(path);
   if (file == nullptr) return StatusNoMemory;

@@ -112,8 +112,7 @@ int SetUpUpdatePage(SetupContext* context, bool isFree) {
 }
 
 void FailForServices(SetupContext* context, const char* services) {
-  (void)AddEvent(&context->events, EventServicesRemain, SeverityFatal, services);
-  FailRun(context, StatusServicesRemain);
+  FailRun(context, GiveUp(&context->events, EventServicesRemain, services, StatusServicesRemain));
 }
 
 // Shows none when there is nothing to remove, or services stand in the way of a removal.
