@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <map>
 
+#include "platform/entry.h"
 #include "tests/contract/contract.h"
 
 namespace {
@@ -164,10 +165,12 @@ void WaitForEnd(HANDLE) {}
 
 }  // namespace contract
 
-// A command line makes this the program that a case starts: it writes the file of that name.
-int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR commandLine, int) {
-  if (*commandLine != '\0') {
-    contract::WriteText(commandLine, "started");
+// An argument makes this the program that a case starts: it writes the file of that name.
+int RunProgram() {
+  const std::string line = GetCommandLineA();
+  const size_t argument = line.find_first_not_of("\" ", line.find(".exe") + 4);
+  if (argument != std::string::npos) {
+    contract::WriteText(line.substr(argument), "started");
     return 0;
   }
   int failed = 0;
@@ -184,3 +187,9 @@ int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR commandLine, int) {
   std::printf("%d held, %d failed\n", static_cast<int>(Cases().size()) - failed, failed);
   return failed == 0 ? 0 : -1;
 }
+
+#ifdef _WIN32
+int WINAPI WinMain(HINSTANCE, HINSTANCE, LPSTR, int) {
+  return RunProgram();
+}
+#endif

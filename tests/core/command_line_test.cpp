@@ -15,6 +15,22 @@ SetupRequest Parse(const char* line) {
   return request;
 }
 
+TEST(CommandLine, BeginsBehindTheProgramsName) {
+  const std::pair<const char*, const char*> rows[] = {
+      {"\"C:\\My Files\\a.exe\"  /s /r", "/s /r"},
+      {"C:\\\xC9\\moriv-s.exe /u", "/u"},  // a letter above 0x7F belongs to the name
+      {"a.exe\t \t/s ", "/s "},
+      {"\"a.exe\"/s", "/s"},
+      {"\"a b", ""},
+      {"a\"b c\"/s", "c\"/s"},
+      {" /s", "/s"},
+      {"a.exe", ""},
+      {"", ""},
+  };
+  for (const auto& [line, rest] : rows) EXPECT_STREQ(SkipProgramName(line), rest) << line;
+  EXPECT_EQ(SkipProgramName(nullptr), nullptr);
+}
+
 TEST(CommandLine, OptionsCombineFromLeftToRight) {
   // "-" separates behind the last "/" alone.
   const std::pair<const char*, uint32_t> rows[] = {
