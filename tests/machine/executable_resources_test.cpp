@@ -18,6 +18,11 @@ std::span<const uint8_t> Bytes(const std::string& text) {
   return {reinterpret_cast<const uint8_t*>(text.data()), text.size()};
 }
 
+// A file that the fuzz targets have too, behind their bytes of options.
+std::string Seed(const std::string& name, size_t options) {
+  return FileBytes(MORIV_SOURCE_DIR "/tests/fuzz/corpus/" + name).substr(options);
+}
+
 // The version resource of a file of these bytes, "" for none.
 std::string Read(const std::string& file) {
   const auto resource = machine::FindVersionResource(Bytes(file));
@@ -39,9 +44,9 @@ TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 2, {{0, kVersion}})), "");
     EXPECT_EQ(Read(PortableExecutable(is64, 6, 1, {{0, kVersion}})), "");
   }
-  const std::string resources = ResourceFile({{6, 7, 0, "odd"}, {16, 1, 0, kVersion}});
-  EXPECT_EQ(Read(NativeExecutable(".moriv_res", resources) + "a package behind it"), kVersion);
-  EXPECT_EQ(Read(NativeExecutable(".other_res", resources)), "");
+  std::string native = Seed("version/native-program", 1);
+  EXPECT_EQ(Read(native + "a package behind it"), kVersion);
+  EXPECT_EQ(Read(native.replace(native.find(".moriv_res"), 6, ".other")), "");
   const TemporaryFolder folder;
   EXPECT_FALSE(machine::ReadVersionResource(folder.Path()));
   EXPECT_FALSE(machine::ReadVersionResource(folder.Path() / "absent.exe"));
@@ -52,8 +57,7 @@ TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
 TEST(ExecutableResources, OfADamagedFileStayWithinIt) {
   for (const std::string& sound :
        {PortableExecutable(false, 16, 1, {{0, kVersion}}),
-        PortableExecutable(true, 16, 1, {{0, kVersion}}),
-        NativeExecutable(".moriv_res", ResourceFile({{16, 1, 0, kVersion}}))}) {
+        PortableExecutable(true, 16, 1, {{0, kVersion}}), Seed("version/native-program", 1)}) {
     ASSERT_EQ(Read(sound), kVersion);
     for (size_t at = 0; at < sound.size(); ++at) {
       const std::string cut = Read(sound.substr(0, at));
@@ -71,13 +75,9 @@ TEST(ExecutableResources, OfADamagedFileStayWithinIt) {
 }
 
 TEST(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
-  ByteBuilder named;  // passed over
-  named.U32(3).U32(40).Wide("PIC").U16(0).Wide("A").U16(0).Align().PadTo(40).Append("abc").Align();
-  const std::string file = named.bytes() + ResourceFile({{6, 1, 0x40C, "french"},
-                                                         {6, 1, 0, "neutral"},
-                                                         {6, 2, 0x40C, "only"},
-                                                         {6, 2, 0x407, "late"},
-                                                         {14, 1, 0, ""}});
+  // A picture with a name, which is passed over; (6, 1) in French and neutral; (6, 2) in French and
+  // German; (14, 1), which is empty.
+  const std::string file = Seed("resource/names-and-languages", 2);
   const auto find = [&](int type, int id) {
     const auto found = machine::FindInResourceFile(Bytes(file), type, id);
     return found ? std::string(found->begin(), found->end()) : "none";
