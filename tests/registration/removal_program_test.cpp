@@ -63,6 +63,7 @@ TEST_F(UninstallEntries, AreStoredWithTheirNulAndFitOrAreLeftOut) {
   EXPECT_EQ(GetRegistryBytes(kCurrentVersion + "Uninstall\\Moriv", "UninstallString"),
             std::string("C:\\windows\\MorivRmv.exe", 24));
   EXPECT_EQ(CancelRunOnceCommand(), 0) << "there is none";
+  EXPECT_EQ(ScheduleFinalCleanup() + CancelRunOnceCommand(), 2);
   // Around the path the command has 79 characters of its 519.
   for (const size_t length : {size_t{440}, size_t{441}}) {
     EXPECT_EQ(WriteRunOnceCommand(std::string(length, 'p').c_str()), length == 440) << length;
