@@ -38,11 +38,10 @@ TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, kVersion}, {0x407, other}})), kVersion);
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 2, {{0, kVersion}})), "");
     EXPECT_EQ(Read(PortableExecutable(is64, 6, 1, {{0, kVersion}})), "");
-    std::string cut = PortableExecutable(is64, 16, 1, {{0, kVersion}});
-    for (int rest = 0; rest < 4; ++rest) {
-      cut.resize(cut.size() - 64);
-      EXPECT_EQ(Read(cut), "") << "ends within its resource";
-    }
+    std::string file = PortableExecutable(is64, 16, 1, {{0, kVersion}});
+    const size_t sizeField = file.find(ByteBuilder().U32(kVersion.size()).bytes());
+    file.replace(sizeField, 4, ByteBuilder().U32(file.size()).bytes());
+    EXPECT_EQ(Read(file), "") << "reaches beyond its section";
   }
   const std::string resources = ResourceFile({{6, 7, 0, "odd"}, {16, 1, 0, kVersion}});
   EXPECT_EQ(Read(NativeExecutable(".moriv_res", resources) + "a package behind it"), kVersion);

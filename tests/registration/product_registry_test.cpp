@@ -225,6 +225,13 @@ TEST_F(ProductRegistry, ServicesAreToldAsFarAsTheirNamesFitAndEachBlocksARemoval
   EXPECT_EQ(std::string(names).size(), 6u + 8 * 63 + 7) << "ends with the last whole one";
 }
 
+TEST_F(ProductRegistry, WhatCanNotBeDeletedIsRefused) {
+  for (const int call : {1, 2}) {
+    FailCall("RegDeleteKeyA", call);
+    EXPECT_EQ(ProductDeleteTree(nullptr), -1) << call;
+  }
+}
+
 TEST_F(ProductRegistry, AProductIsRegisteredWithADirectoryHoweverShort) {
   for (const char* directory : {"", "a"}) {
     ASSERT_TRUE(CopyText(context.installDir, directory));
