@@ -5,8 +5,8 @@ the machine before the run and from the image that ran.
     removed [DIRECTORY][, listed]
 
 are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
-is not there. Variants: "listed", with the uninstall entry; "not removable", without a removal program;
-"not registered", without a registry. "registered" and "unregistered" are the ends of the two: the last
+is not there. Variants: "listed", with the uninstall entry; "older", after the event of an older file;
+"not removable", without a removal program; "not registered", without a registry. "registered" and "unregistered" are the ends of the two: the last
 events, which follow the scenario's own, the removal program or the INF file, which stands beside the
 scenario's own files, and the registry.
 """
@@ -30,6 +30,7 @@ BROWSERS = {'%PLUGIN_NS_DIR%': 'netscape', '%PLUGIN_IE_DIR%': 'iexplore', '%PLUG
 
 DIRECTORY = r'C:\Program Files\Moriv'
 REMOVAL_PROGRAM = r'C:\windows\MorivRmv.exe'
+OLDER = 'Found an older version on the system, with at least one older or missing file '
 PRODUCT = r'SOFTWARE\Zeb\Moriv'
 CURRENT_VERSION = r'SOFTWARE\Microsoft\Windows\CurrentVersion'
 ENTRY = CURRENT_VERSION + r'\Uninstall\Moriv'
@@ -42,7 +43,7 @@ Before = namedtuple('Before', 'files registry packed dialog')
 Checks = namedtuple('Checks', 'events files registry')
 
 _WORDS = re.compile(r'(installed|registered|removed|unregistered)(?: (\w:[^,]*?))?(?: in (\w+))?'
-                    r'((?:, (?:listed|not removable|not registered))*)')
+                    r'((?:, (?:listed|older|not removable|not registered))*)')
 
 
 def checks_of(words, before):
@@ -52,7 +53,7 @@ def checks_of(words, before):
         raise ValueError(f'no such words: {words}')
     run = _GoodRun(before, match[2] or DIRECTORY)
     if match[1] == 'installed':
-        run.copy_files()
+        run.copy_files('older' in match[4])
     elif match[1] == 'removed':
         run.delete_files()
     if match[1] in ('installed', 'registered'):
@@ -74,8 +75,10 @@ class _GoodRun:
                  for path, sign in file_tree.changes(self.before.files, self.files).items()]
         return Checks(self.events, files, registry_text.changes(self.before.registry, self.registry))
 
-    def copy_files(self):
+    def copy_files(self, told_older):
         found = self._find_product()
+        if told_older:
+            self.events.append(OLDER)
         if self.before.dialog:
             kind = 'Updating the' if found else 'Installing'
             self.events.append(f'{kind} Moriv version on the system ')

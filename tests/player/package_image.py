@@ -50,8 +50,8 @@ class PackedImage:
                 lines[name] = line
             elif line == 'with versions':
                 lines = {name: f'{name} = sample {name} -> %INSTALL_DIR%' for name in lines}
-            elif line == 'allow unknown macros':
-                flags.append('--allow-unknown-macros')
+            elif line in ('allow unknown macros', 'packed best'):
+                flags.append('--' + line.removeprefix('packed ').replace(' ', '-'))
             else:
                 options[name.replace(' ', '_')] = value if value.isdigit() else f"'{value}'"
         parts = [re.fullmatch('(.+?) = (.*) -> (.*)', line).groups() for line in lines.values()]
