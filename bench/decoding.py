@@ -8,7 +8,7 @@ from goals import Figure
 from results import Table
 from timed_runs import output_of, pinned, text_of
 
-DECODERS = {'expander': 'the expander', 'letter': 'decoder to the letter',
+DECODERS = {'expander': 'the expander', 'letter': 'plain decoder',
             'libarchive': 'libarchive, `.Z`', 'zlib': 'zlib inflate, 64 KB buffers'}
 HEADS = ['Decoder', 'Corpus', 'MB/s', "Time / the expander's"]
 PROGRAM = BUILD / 'decode_bench'
@@ -28,7 +28,7 @@ def measure_decoding(corpora, rounds, results):
 
 
 def measure_decoding_under_wine(corpora, rounds, wine, results):
-    """The Windows build of the same program, which has no peers but the decoder to the letter."""
+    """The Windows build of the same program, which has no peers but the plain decoder."""
     keys = {corpus.name: f'expand-wine-{corpus.name}' for corpus in corpora}
     if wine.why_not:
         results.figures |= {key: Figure(why_not=wine.why_not) for key in keys.values()}

@@ -23,19 +23,17 @@ void PostClick(HWND control) {
 }
 
 // Runs `ask` in a dialog that has the focus on its first button. The step that was posted before it
-// runs while the question stands, with the dialog disabled. That a step can end the dialog under it
-// is shown by the scenarios.
+// runs while the question stands, with the dialog disabled.
 void RunAsking(const std::function<void(HWND dialog)>& ask) {
   DWORD style = 0;  // of the dialog under the question
-  RunStanding(
-      [&](HWND dialog) {
-        SetFocus(Item(11));
-        PostMessageA(dialog, kNextStep, 0, 0);
-        ask(dialog);
-        Expect({SetFocus(Item(11)), StyleOf(dialog) & WS_DISABLED, style & WS_DISABLED},
-               {Item(11), 0, WS_DISABLED});
-      },
-      [&](HWND dialog) { style = StyleOf(dialog); });
+  const Check askAfterAStep = [&](HWND dialog) {
+    SetFocus(Item(11));
+    PostMessageA(dialog, kNextStep, 0, 0);
+    ask(dialog);
+    Expect({SetFocus(Item(11)), StyleOf(dialog) & WS_DISABLED, style & WS_DISABLED},
+           {Item(11), 0, WS_DISABLED});
+  };
+  RunStanding(askAfterAStep, [&](HWND dialog) { style = StyleOf(dialog); });
 }
 
 }  // namespace

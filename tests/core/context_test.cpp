@@ -1,5 +1,6 @@
 // The record of a run: its settings, its statuses and its events.
 #include "core/context.h"
+#include "core/help.h"
 
 #include <string>
 
@@ -27,30 +28,14 @@ TEST(Context, OnlyKnownLanguagesAndTheImageKindOfExactlyOneCount) {
   }
 }
 
-TEST(Status, EachHasItsNumberAndItsMessage) {
-  const std::pair<StatusCode, uint32_t> stops[] = {
-      {StatusBadArgument, 1000},      {StatusBufferTooSmall, 1002},     {StatusDeleteFailed, 1011},
-      {StatusCreateFileFailed, 1005}, {StatusWriteRemovalFailed, 1009}, {StatusInternal, 1001},
-      {StatusCreateDirFailed, 1006},  {StatusBadDirectory, 1003},       {StatusNoSystemDir, 1004},
-      {StatusBadRecord, 1007},        {StatusCancelled, 1015},          {StatusDialogAborted, 1000},
-      {StatusBadPackage, 1012},       {StatusNoMemory, 1002},           {StatusOpenFailed, 1008},
-      {StatusReadFailed, 1010},       {StatusExpandFailed, 1013},       {StatusSeekFailed, 1010},
-      {StatusServicesRemain, 1016},   {StatusNoModulePath, 1000},       {StatusNoDiskSpace, 1018},
-      {StatusCopyFailed, 1000}};
-  StatusCode number = -1000000;
-  for (const auto& [status, message] : stops) {
-    EXPECT_EQ(status, number--);
-    EXPECT_EQ(MessageForStatus(status), message) << status;
-  }
-  number = 100001;  // of the soft ones; the third is not in use
-  for (const StatusCode status :
-       {StatusNoVersion, StatusRemovalProgramFailed, 100003, StatusNotRegistered, StatusNoNetscape,
-        StatusNoExplorer, StatusNoOpera}) {
-    EXPECT_EQ(status, number++);
-    EXPECT_EQ(MessageForStatus(status), status == StatusNotRegistered ? 1014 : 1000u) << status;
-  }
-  for (const StatusCode status : {StatusOk, 0, number, -1000022}) {
-    EXPECT_EQ(MessageForStatus(status), 1000u) << status;
+TEST(Status, EachStopHasItsMessage) {
+  const uint32_t messages[] = {1000, 1002, 1011, 1005, 1009, 1001, 1006, 1003, 1004, 1007, 1015,
+                               1000, 1012, 1002, 1008, 1010, 1013, 1010, 1016, 1000, 1018, 1000};
+  StatusCode status = StatusBadArgument;  // counted downwards
+  for (const uint32_t message : messages) EXPECT_EQ(MessageForStatus(status--), message) << status;
+  for (status = -1000024; status <= 100008; ++status) {
+    if (status == -1000021) status = -1;  // to those that stop nothing
+    EXPECT_EQ(MessageForStatus(status), status == StatusNotRegistered ? 1014u : 1000u) << status;
   }
 }
 
@@ -79,6 +64,13 @@ TEST(EventList, EntriesStayAsTheyAreWhileItGrowsAndTextsAreCutTo519Characters) {
 }
 
 using Hooks = ProductTest;
+
+TEST_F(Hooks, AReportFileMayHaveANameOfOneCharacter) {
+  context.options = OptionSilent;
+  ASSERT_TRUE(CopyText(context.reportFile, "a"));
+  ShowHelp(&context);
+  EXPECT_TRUE(pc.Has("drive_c/a"));
+}
 
 TEST_F(Hooks, AskTheSystemNothingWithoutAWindow) {
   FailNothing();  // counts calls from 0

@@ -5,15 +5,14 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <cstdio>
 #include <fstream>
+#include <iostream>
 #include <map>
 #include <set>
 
 #include "core/status.h"
 #include "machine/seam_functions.h"
 #include "tests/faults/faulty_run.h"
-#include "tests/faults/machine_state.h"
 #include "tests/faults/run_judgement.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
@@ -89,10 +88,8 @@ class FaultLoop : public testing::Test {
     TryCalls({.function = kAllocation, .fromThenOn = true});
     if (!kind.workButtons.empty()) TryCalls({.function = kCancel});
     Tell();
-    EXPECT_GE(faults, floor.faults);
-    EXPECT_GE(faults - endedWell, floor.failures);
-    EXPECT_GE(powerLosses, floor.powerLosses);
-    EXPECT_GE(statesRunAgain.size(), floor.statesRunAgain);
+    EXPECT_TRUE(faults >= floor.faults && faults - endedWell >= floor.failures &&
+                powerLosses >= floor.powerLosses && statesRunAgain.size() >= floor.statesRunAgain);
   }
 
  private:
@@ -136,7 +133,8 @@ class FaultLoop : public testing::Test {
     for (injection.call = 1; complaintCount < kMostComplaints; ++injection.call) {
       const RunReport report = RunFrom(before, injection);
       if (report.end == RunEnd::kReturned && report.strikes == 0) return;
-      Count(injection, report);
+      ++(injection.stop ? powerLosses : faults);
+      if (!injection.stop && EndedWell(report.code)) ++endedWell;
       const MachineState left = after;
       const FaultyRun run = {kind, injection, report, before, whole, left, folder};
       Complain(run, JudgeRun(run));
@@ -154,11 +152,6 @@ class FaultLoop : public testing::Test {
     Complain(first, JudgeSecondRun(first, second, after));
   }
 
-  void Count(const Injection& injection, const RunReport& report) {
-    ++(injection.stop ? powerLosses : faults);
-    if (!injection.stop && EndedWell(report.code)) ++endedWell;
-  }
-
   void Complain(const FaultyRun& run, const std::vector<std::string>& complaints) {
     for (const std::string& complaint : complaints) {
       ++complaintCount;
@@ -168,17 +161,16 @@ class FaultLoop : public testing::Test {
 
   // One line, which tools/test shows at the end of all tests.
   void Tell() const {
-    char line[300];
-    std::snprintf(line, sizeof(line),
-                  "faults: %s: %d tried, %d complaints; %d ended well, %d with a failure; "
-                  "%d power losses; run again from %zu states",
-                  kind.name.c_str(), faults, complaintCount, endedWell, faults - endedWell,
-                  powerLosses, statesRunAgain.size());
-    std::printf("%s\n", line);
+    std::ostringstream line;
+    line << "faults: " << kind.name << ": " << faults << " tried, " << complaintCount
+         << " complaints; " << endedWell << " ended well, " << faults - endedWell
+         << " with a failure; " << powerLosses << " power losses; run again from "
+         << statesRunAgain.size() << " states\n";
+    std::cout << line.str();
     fs::create_directories(MORIV_COUNTS_DIR);
     std::string file = kind.name + ".count";
     std::ranges::replace(file, ' ', '-');
-    std::ofstream(fs::path(MORIV_COUNTS_DIR) / file) << line << '\n';
+    std::ofstream(fs::path(MORIV_COUNTS_DIR) / file) << line.str();
   }
 
   TestMachine pc;

@@ -5,6 +5,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <new>
@@ -25,43 +26,28 @@ namespace {
 constexpr int kStopStatus = 4;
 constexpr unsigned kLongestRun = 10;  // seconds
 
+bool Press(int id) {
+  const machine::Window* const control = machine::OpenDialog()->Find(id);
+  if (control == nullptr || !control->IsShown() || !control->IsEnabled()) return false;
+  machine::Click(control->handle);
+  return true;
+}
+
 // Wants the work done and then the dialog closed: presses the end button of an end page, else the
 // button that starts the work, and cancels when that has come to nothing three times.
-class DecidedUser {
- public:
-  DecidedUser(std::vector<int> workButtons, RunReport* report)
-      : workButtons_(std::move(workButtons)), report_(report) {}
-
-  void operator()() {
-    constexpr int kMostTurns = 12;
-    if (++turns_ > kMostTurns) {
-      report_->end = RunEnd::kStuck;
+auto DecidedUser(const std::vector<int>& workButtons, RunReport* report) {
+  return [workButtons, report, turns = 0, tries = 0]() mutable {
+    if (++turns > 12) {
+      report->end = RunEnd::kStuck;
       _exit(EXIT_SUCCESS);
     }
     if (Press(IDOK) || Press(IDC_FAILURE_END)) return;
-    constexpr int kMostTries = 3;
-    for (const int id : workButtons_) {
-      if (tries_ < kMostTries && Press(id)) {
-        ++tries_;
-        return;
-      }
-    }
-    machine::SendCancel();
-  }
-
- private:
-  static bool Press(int id) {
-    const machine::Window* const control = machine::OpenDialog()->Find(id);
-    if (control == nullptr || !control->IsShown() || !control->IsEnabled()) return false;
-    machine::Click(control->handle);
-    return true;
-  }
-
-  std::vector<int> workButtons_;
-  RunReport* report_;
-  int turns_ = 0;
-  int tries_ = 0;
-};
+    if (tries < 3 && std::ranges::any_of(workButtons, Press))
+      ++tries;
+    else
+      machine::SendCancel();
+  };
+}
 
 void InjectFault(const RunKind& kind, const Injection& injection, const fs::path& folder,
                  RunReport* report) {
@@ -70,11 +56,8 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
     report->struckLog |= fs::exists(folder / kLogPath) || fs::exists(folder / kReportPath);
   };
   const auto functionObserver = [observer, name = injection.function](const machine::Fault& fault) {
-    if (fault.function == name) observer();
-    if (name == kCancel) {
-      observer();
-      machine::PostCancel();  // the next poll meets it
-    }
+    if (fault.function == name || name == kCancel) observer();
+    if (name == kCancel) machine::PostCancel();  // the next poll meets it
   };
   std::vector<machine::Fault> faults = kind.always;
   if (injection.function == kAllocation) {
@@ -112,13 +95,6 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
   _exit(EXIT_SUCCESS);
 }
 
-// Memory that this process and the one that it makes both see.
-RunReport* SharedReport() {
-  static void* const memory =
-      mmap(nullptr, sizeof(RunReport), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
-  return new (memory) RunReport();
-}
-
 }  // namespace
 
 // Asked by AddressSanitizer at its start. It keeps the freed blocks of a run, but not those of all
@@ -135,16 +111,18 @@ std::string Describe(const Injection& injection) {
 }
 
 RunReport RunWithFault(const RunKind& kind, const Injection& injection, const fs::path& folder) {
-  RunReport* const report = SharedReport();
+  // In memory that this process and the one that it makes both see.
+  static void* const memory =
+      mmap(nullptr, sizeof(RunReport), PROT_READ | PROT_WRITE, MAP_SHARED | MAP_ANONYMOUS, -1, 0);
+  auto* const report = new (memory) RunReport();
   const pid_t child = fork();
   if (child == 0) RunProgram(kind, injection, folder, report);
   int status = 0;
   if (child < 0 || waitpid(child, &status, 0) != child) return {};
   RunReport result = *report;
-  if (WIFEXITED(status) && WEXITSTATUS(status) == kStopStatus) {
+  if (WIFEXITED(status) && WEXITSTATUS(status) == kStopStatus)
     result.end = RunEnd::kStopped;
-  } else if (!WIFEXITED(status) || WEXITSTATUS(status) != EXIT_SUCCESS) {
+  else if (status != 0)
     result.end = RunEnd::kCrashed;
-  }
   return result;
 }

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "machine/settings.h"
-#include "tests/faults/machine_state.h"
+#include "tests/support/machine_state.h"
 
 enum Work : unsigned { kInstall = 1, kRemoval = 2, kHelp = 4 };
 

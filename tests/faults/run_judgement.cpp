@@ -22,14 +22,11 @@ bool IsOneOf(std::string_view name, std::initializer_list<std::string_view> name
 
 // ---- Exit code and log
 
-void JudgeCode(const FaultyRun& run, Complaints* complaints) {
-  const StatusCode code = run.report.code;
-  const bool isKnown = IsDialog(run.kind) ? code == StatusOk || code == StatusCancelled ||
-                                                code == StatusDialogAborted
-                       : run.kind.work == kHelp
-                           ? code == 0
-                           : IsSilentEnd(code, run.kind.work == kInstall ? "install" : "removal");
-  if (!isKnown) complaints->emplace_back("no exit code of this run");
+bool IsKnownEnd(const RunKind& kind, StatusCode code) {
+  if (IsDialog(kind))
+    return code == StatusOk || code == StatusCancelled || code == StatusDialogAborted;
+  if (kind.work == kHelp) return code == 0;
+  return IsSilentEnd(code, kind.work == kInstall ? "Install" : "Removal");
 }
 
 // A log that has no name, no memory or no directory or can't be made in either way is left out, and
@@ -58,13 +55,6 @@ std::optional<std::vector<bool>> ReadEvents(const std::string& log) {
   return events;
 }
 
-// A reader of the log is told the exit code.
-bool TellsReason(const FaultyRun& run, const char* path) {
-  return run.report.code == StatusOk || run.report.code == 0 ||
-         image::ExplainLog(run.folder / path)
-                 .find("exit code   " + std::to_string(run.report.code) + " ") != std::string::npos;
-}
-
 bool HasRightEvents(const FaultyRun& run, const char* path, const std::vector<bool>& events) {
   // An event that finds no memory is lost, and nothing else.
   if (run.injection.function == kAllocation) return true;
@@ -75,9 +65,11 @@ bool HasRightEvents(const FaultyRun& run, const char* path, const std::vector<bo
     if (fatal == 0 && IsOneOf(run.injection.function, {"SetFilePointer", kCancel})) return true;
     return fatal == (run.report.code == StatusDialogAborted ? 1 : 0);
   }
-  // A silent run gives up at its fatal event.
-  const bool isRight = EndedWell(run.report.code) ? fatal == 0 : fatal == 1 && events.back();
-  return isRight && TellsReason(run, path);
+  // A silent run gives up at its fatal event, and a reader of the log is told the exit code.
+  if (EndedWell(run.report.code) ? fatal != 0 : fatal != 1 || !events.back()) return false;
+  const std::string told = "exit code   " + std::to_string(run.report.code) + " ";
+  return run.report.code == StatusOk || run.report.code == 0 ||
+         image::ExplainLog(run.folder / path).find(told) != std::string::npos;
 }
 
 void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
@@ -89,11 +81,8 @@ void JudgeLog(const FaultyRun& run, const char* path, Complaints* complaints) {
     return;
   }
   const auto events = ReadEvents(log->second);
-  if (!events) {
-    complaints->push_back(std::string("malformed: ") + path);
-  } else if (!HasRightEvents(run, path, *events)) {
-    complaints->push_back(std::string("without the right events: ") + path + log->second);
-  }
+  if (!events || !HasRightEvents(run, path, *events))
+    complaints->push_back(std::string("not as it should be: ") + path + log->second);
 }
 
 // ---- The machine
@@ -130,33 +119,27 @@ bool MayStand(const FaultyRun& run, const std::string& name, const std::string& 
 void JudgeMachine(const FaultyRun& run, Complaints* complaints) {
   for (const auto& [name, content] : run.after.items) {
     if (!Holds(run.before, name, content) && !Holds(run.whole, name, content) &&
-        !MayStand(run, name, content)) {
+        !MayStand(run, name, content))
       complaints->push_back("neither old nor whole: " + name);
-    }
   }
   for (const auto& [name, content] : run.before.items) {
-    if (Holds(run.whole, name, content) && !run.after.items.contains(name)) {
+    if (Holds(run.whole, name, content) && !run.after.items.contains(name))
       complaints->push_back("gone: " + name);
-    }
   }
-  const bool isScheduled =
-      run.after.items.contains(kRunOnce) && !run.before.items.contains(kRunOnce);
-  if (isScheduled && !Holds(run.after, kScript, run.whole.items.at(kScript))) {
+  if (run.after.items.contains(kRunOnce) && !run.before.items.contains(kRunOnce) &&
+      !Holds(run.after, kScript, run.whole.items.at(kScript)))
     complaints->emplace_back("a command without its whole script");
-  }
 }
 
 // ---- The second run
 
 // The folder, or one in it, holds no file.
 bool HoldsEmptyFolder(const MachineState& state, const std::string& folder) {
-  const auto isBelow = [](const std::string& path, const std::string& above) {
-    return path.starts_with(above + "/");
-  };
   return std::ranges::any_of(state.files, [&](const auto& inner) {
-    return inner.second == kFolder && (inner.first == folder || isBelow(inner.first, folder)) &&
+    const std::string below = inner.first + "/";
+    return inner.second == kFolder && below.starts_with(folder + "/") &&
            std::ranges::none_of(state.files, [&](const auto& other) {
-             return other.second != kFolder && isBelow(other.first, inner.first);
+             return other.second != kFolder && other.first.starts_with(below);
            });
   });
 }
@@ -174,10 +157,6 @@ bool IsOutOfSight(const FaultyRun& first, const std::string& name, const std::st
 
 }  // namespace
 
-bool EndedWell(int code) {
-  return code >= 0;
-}
-
 std::vector<std::string> JudgeRun(const FaultyRun& run) {
   Complaints complaints;
   if (run.report.end == RunEnd::kCrashed) complaints.emplace_back("crashed");
@@ -188,7 +167,7 @@ std::vector<std::string> JudgeRun(const FaultyRun& run) {
     const int leaked = run.report.leakedBlocks;
     if (!open.empty()) complaints.push_back("open: " + open);
     if (leaked != 0) complaints.push_back(std::to_string(leaked) + " blocks leaked");
-    JudgeCode(run, &complaints);
+    if (!IsKnownEnd(run.kind, run.report.code)) complaints.emplace_back("no exit code of this run");
     for (const char* path : {kLogPath, kReportPath}) JudgeLog(run, path, &complaints);
   }
   JudgeMachine(run, &complaints);
@@ -199,18 +178,16 @@ std::vector<std::string> JudgeSecondRun(const FaultyRun& first, const RunReport&
                                         const MachineState& after) {
   Complaints complaints;
   const int goal = first.kind.work == kHelp ? 0 : StatusOk;
-  if (second.end != RunEnd::kReturned || second.code != goal) {
+  if (second.end != RunEnd::kReturned || second.code != goal)
     complaints.push_back("a second run gives " + std::to_string(second.code));
-  }
   for (const auto& [name, content] : first.whole.items) {
     // The tree is made only where its root is missing, and does without this key.
     if (name == kServices && first.injection.function == "RegCreateKeyExA") continue;
     if (!Holds(after, name, content)) complaints.push_back("a second run doesn't make " + name);
   }
   for (const auto& [name, content] : after.items) {
-    if (!first.whole.items.contains(name) && !IsOutOfSight(first, name, content)) {
+    if (!first.whole.items.contains(name) && !IsOutOfSight(first, name, content))
       complaints.push_back("a second run leaves " + name);
-    }
   }
   return complaints;
 }

@@ -5,7 +5,6 @@
 #include <vector>
 
 #include "tests/faults/faulty_run.h"
-#include "tests/faults/machine_state.h"
 
 // A run that has met its fault.
 struct FaultyRun {
@@ -18,8 +17,9 @@ struct FaultyRun {
   const std::filesystem::path& folder;  // where `after` stands
 };
 
-// 0 and the codes above it.
-bool EndedWell(int code);
+inline bool EndedWell(int code) {
+  return code >= 0;
+}
 
 // What is wrong, one text each: the end of the run, what it left open, its exit code, its log and
 // report, and the machine. Each thing on that is what it was, what an undisturbed run makes of it,

@@ -1,5 +1,6 @@
 // The command line, on texts that grow at will: what is taken stands in the line, and how the line
 // is cut into options changes nothing else.
+#include <cctype>
 #include <cstring>
 #include <tuple>
 
@@ -17,9 +18,7 @@ SetupRequest Parse(const std::string& line) {
 }
 
 std::string Lower(std::string text) {
-  for (char& letter : text) {
-    if (letter >= 'A' && letter <= 'Z') letter = static_cast<char>(letter + ('a' - 'A'));
-  }
+  for (char& letter : text) letter = static_cast<char>(std::tolower(static_cast<uint8_t>(letter)));
   return text;
 }
 

@@ -7,7 +7,6 @@
 //   rest     the destination
 #include <sstream>
 #include <utility>
-#include <vector>
 
 #include "engine/resolver.h"
 #include "machine/drives.h"
@@ -29,8 +28,8 @@ struct BrowsedMachine : TestMachine {
   }
 };
 
-using Target = std::pair<std::string, std::string>;  // path, directory
-using Resolution = std::pair<StatusCode, std::vector<Target>>;
+// The result, and path and directory of each target.
+using Resolution = std::pair<StatusCode, std::vector<std::pair<std::string, std::string>>>;
 
 Resolution Resolve(const std::string& base, const std::string& name,
                    const std::string& destination) {
@@ -39,8 +38,7 @@ Resolution Resolve(const std::string& base, const std::string& name,
   SetField(record.destination, destination);
   SetupContext context = {};
   TargetList list = {};
-  Resolution resolution;
-  resolution.first = ResolveTargets(&context, &list, base.c_str(), &record, false);
+  Resolution resolution = {ResolveTargets(&context, &list, base.c_str(), &record, false), {}};
   for (int32_t i = 0; i < list.count; ++i)
     resolution.second.emplace_back(list.entries[i].path, list.entries[i].directory);
   FreeTargets(&list);
@@ -55,10 +53,9 @@ std::string WithBackslash(const std::string& text) {
 bool IsPlaceOf(const std::string& element, const std::string& base, const std::string& place) {
   const std::string asItStands = WithBackslash(element);
   if (place == asItStands && element.find(':') != std::string::npos) return true;
-  const std::string directories[] = {base, "C:\\windows", "C:\\windows\\system32",
-                                     "C:\\ns\\Plugins", "C:\\opera\\Plugins"};
-  return std::ranges::any_of(directories, [&](const std::string& directory) {
-    const std::string root = WithBackslash(directory);
+  const std::string roots[] = {WithBackslash(base), "C:\\windows\\", "C:\\windows\\system32\\",
+                               "C:\\ns\\Plugins\\", "C:\\opera\\Plugins\\"};
+  return std::ranges::any_of(roots, [&](const std::string& root) {
     return place.starts_with(root) && asItStands.ends_with(place.substr(root.size()));
   });
 }
@@ -77,14 +74,18 @@ void ExpectInside(const TestMachine& pc, const std::string& path) {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const BrowsedMachine pc;
-  FuzzInput input(data, size);
-  const auto cut = [](std::string text, size_t limit) {
-    text.resize(std::min({text.find('\0'), text.size(), limit}));
-    return text;
+  std::string_view rest = TextOf(data, size);
+  const auto takeLine = [&rest] {
+    const std::string_view line = rest.substr(0, rest.find('\n'));
+    rest.remove_prefix(std::min(line.size() + 1, rest.size()));
+    return line;
   };
-  const std::string base = cut(input.TakeLine(), kPathSize - 1);
-  const std::string name = cut(input.TakeLine(), sizeof(FileRecord::fileName));
-  const std::string destination(cut(std::string(input.rest()), sizeof(FileRecord::destination)));
+  const auto cut = [](std::string_view text, size_t limit) {
+    return std::string(text.substr(0, std::min(text.find('\0'), limit)));
+  };
+  const std::string base = cut(takeLine(), kPathSize - 1);
+  const std::string name = cut(takeLine(), sizeof(FileRecord::fileName));
+  const std::string destination = cut(rest, sizeof(FileRecord::destination));
 
   Resolution inTurn = {StatusOk, {}};
   std::istringstream elements(destination);
@@ -107,7 +108,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   }
   EXPECT_EQ(Resolve(base, name, destination), inTurn);
   ExpectInside(pc, base);
-  ExpectInside(pc, std::string(input.rest()));
+  ExpectInside(pc, std::string(rest));
   EXPECT_EQ(machine::OpenObjects(), "");
   return 0;
 }

@@ -32,12 +32,12 @@ std::string CodesOf(std::string_view units) {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const TestMachine pc;
   static const std::string literals = CodeStream().PutTimes('a', kLiterals).Codes();
-  FuzzInput input(data, size);
-  const uint8_t how = input.TakeByte();
-  std::vector<size_t> sizes(input.TakeByte() & 15);
-  for (size_t& blockSize : sizes) blockSize = input.TakeByte();
+  std::string_view input = TextOf(data, size);
+  const uint8_t how = TakeByte(&input);
+  std::vector<size_t> sizes(TakeByte(&input) & 15);
+  for (size_t& blockSize : sizes) blockSize = TakeByte(&input);
   if (std::ranges::count(sizes, size_t{0}) == std::ssize(sizes)) sizes = {255};
-  const std::string codes = (how & 1) != 0 ? CodesOf(input.rest()) : std::string(input.rest());
+  const std::string codes = (how & 1) != 0 ? CodesOf(input) : std::string(input);
   const auto blocks = SplitStream(codes, sizes, (how & 2) != 0 ? literals : "");
   const size_t writes = ExpandChecked(pc, blocks).size() / 1024;
   if (writes > 0) ExpandChecked(pc, blocks, (writes + 1) / 2);

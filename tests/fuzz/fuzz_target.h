@@ -28,28 +28,14 @@ inline const bool kFailureEndsTheProcess = [] {
   return true;
 }();
 
-// The input, taken from its front. Behind its end there are zeros and empty texts.
-class FuzzInput {
- public:
-  FuzzInput(const uint8_t* data, size_t size) : rest_(reinterpret_cast<const char*>(data), size) {}
+inline std::string_view TextOf(const uint8_t* data, size_t size) {
+  return {reinterpret_cast<const char*>(data), size};
+}
 
-  uint8_t TakeByte() {
-    if (rest_.empty()) return 0;
-    const auto byte = static_cast<uint8_t>(rest_.front());
-    rest_.remove_prefix(1);
-    return byte;
-  }
-
-  // The bytes up to a line feed, which is dropped.
-  std::string TakeLine() {
-    const size_t length = std::min(rest_.find('\n'), rest_.size());
-    std::string line(rest_.substr(0, length));
-    rest_.remove_prefix(std::min(length + 1, rest_.size()));
-    return line;
-  }
-
-  std::string_view rest() const { return rest_; }
-
- private:
-  std::string_view rest_;
-};
+// The input's first byte, which is taken off it; 0 behind its end.
+inline uint8_t TakeByte(std::string_view* input) {
+  if (input->empty()) return 0;
+  const auto byte = static_cast<uint8_t>(input->front());
+  input->remove_prefix(1);
+  return byte;
+}

@@ -4,15 +4,12 @@
 //
 //   0     how it is run: the bits below
 //   1...  the package
-#include <algorithm>
 #include <iterator>
 #include <set>
-#include <sstream>
-#include <vector>
 
 #include "machine/drives.h"
-#include "package/package_format.h"
 #include "tests/fuzz/silent_run.h"
+#include "tests/support/machine_state.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
 
@@ -23,19 +20,19 @@ constexpr uint8_t kByRemovalProgram = 2;
 constexpr uint8_t kHasBrowser = 4;
 
 constexpr char kSettings[] = "[disk C]\nwritable = 200000\n[system]\nplatform = ";
-constexpr char kImage[] = "drive_c/setup.exe";
 constexpr char kRemovalProgram[] = "drive_c/windows/MorivRmv.exe";
 
-using Files = std::map<std::filesystem::path, std::string>;
-using Places = std::set<std::filesystem::path>;
+using Files = std::map<std::string, std::string>;
+using Places = std::set<std::string>;  // paths below the machine's folder
 
 // Wherever on the host the files of the package may go that a walk over it reaches: what a record's
 // element names, with or without the macro in front of it, in any directory that a macro can mean,
 // or the element as it stands.
-Places PlacesOf(const std::string& bytes) {
+Places PlacesOf(const std::string& bytes, const TestMachine& pc) {
   Places places;
-  const auto add = [&places](const std::string& path) {
-    if (const auto location = machine::Locate(path)) places.insert(location->host);
+  const auto add = [&](const std::string& path) {
+    const auto location = machine::Locate(path);
+    if (location) places.insert(location->host.lexically_relative(pc.Path()));
   };
   ImageBuilder image = ImageBuilder::TakenApart(bytes);
   for (const ImageBuilder::Piece& piece : image.pieces()) {
@@ -55,22 +52,24 @@ Places PlacesOf(const std::string& bytes) {
   return places;
 }
 
-// The files that were made, changed or deleted.
+// The files on the drive that are not the same in both.
 Places Differences(const Files& before, const Files& after) {
-  std::vector<Files::value_type> lines;
-  std::ranges::set_symmetric_difference(before, after, std::back_inserter(lines));
+  std::vector<Files::value_type> items;
+  std::ranges::set_symmetric_difference(before, after, std::back_inserter(items));
   Places places;
-  for (const auto& [file, bytes] : lines) places.insert(file);
+  for (const auto& [path, content] : items) {
+    if (path.starts_with("drive_c/") && content != kFolder) places.insert(path);
+  }
   return places;
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  FuzzInput input(data, size);
-  const uint8_t how = input.TakeByte();
+  std::string_view input = TextOf(data, size);
+  const uint8_t how = TakeByte(&input);
   static const std::string executable = VersionedProgram("4.1.7");
-  const std::string image = executable + std::string(input.rest());
+  const std::string image = executable + std::string(input);
 
   TestMachine pc(kSettings + std::string((how & kOldFamily) != 0 ? "9x\n" : "nt\n"));
   if ((how & kHasBrowser) != 0) {
@@ -80,27 +79,24 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   pc.Write(kImage, image);
   pc.Write("drive_c/Moriv/kept.txt", "kept");
   pc.Write("drive_c/windows/system32/kept.dll", "kept");
-  const Files before = FilesOf(pc);
-
+  const Files before = ReadMachine(pc.Path()).files;
   const StatusCode installed = RunSilently(pc, kImage, "/s /r /d:C:\\Moriv");
-  const Files between = FilesOf(pc);
-  const Places places = PlacesOf(image);
-  const Places own = {pc.Host("drive_c/windows/MorivRmv.exe"),
-                      pc.Host("drive_c/windows/MorivLog.txt"),
-                      pc.Host("drive_c/windows/Moriv.INF")};
+  const Files between = ReadMachine(pc.Path()).files;
+  const Places places = PlacesOf(image, pc);
   EXPECT_TRUE(pc.Read(kImage) == image);
 
   const bool byRemovalProgram = (how & kByRemovalProgram) != 0 && pc.Has(kRemovalProgram);
   const StatusCode removed =
       RunSilently(pc, byRemovalProgram ? kRemovalProgram : kImage, "/s /u /r /d:C:\\Moriv");
-  const Files after = FilesOf(pc);
+  const Files after = ReadMachine(pc.Path()).files;
+  const Places own = {kRemovalProgram, kLogPath, "drive_c/windows/Moriv.INF"};
   for (const Files& now : {between, after}) {
-    for (const auto& file : Differences(before, now))
+    for (const std::string& file : Differences(before, now))
       EXPECT_TRUE(places.contains(file) || own.contains(file)) << file;
   }
   if (installed != StatusOk) return 0;
   EXPECT_EQ(removed, StatusOk);
-  for (const auto& file : Differences(before, between))
+  for (const std::string& file : Differences(before, between))
     EXPECT_TRUE(own.contains(file) || !after.contains(file)) << file;
   return 0;
 }

@@ -13,17 +13,6 @@
 
 namespace {
 
-constexpr char kImage[] = "drive_c/setup.exe";
-
-const std::string& Image() {
-  static const std::string image =
-      ImageBuilder()
-          .Add("a.dll", "%INSTALL_DIR%\\bin;%PLUGIN_ALL_DIR%\\sub;%PLUGIN_NS_DIR%", "some bytes")
-          .Add("b.txt", "%PLUGIN_IE_DIR%;%SYS_DIR%", "other bytes")
-          .Bytes();
-  return image;
-}
-
 void AskForPluginDirectories() {
   for (const auto find : {FindNetscapePluginDir, FindExplorerPluginDir, FindOperaPluginDir}) {
     for (const int32_t size : {1, 20, 260}) {
@@ -77,10 +66,15 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   EXPECT_TRUE(machine::ReadRegistryText(written, again, &error)) << error;
   EXPECT_EQ(machine::WriteRegistryText(again), written);
 
+  static const std::string image =
+      ImageBuilder()
+          .Add("a.dll", "%INSTALL_DIR%\\bin;%PLUGIN_ALL_DIR%\\sub;%PLUGIN_NS_DIR%", "some bytes")
+          .Add("b.txt", "%PLUGIN_IE_DIR%;%SYS_DIR%", "other bytes")
+          .Bytes();
   TestMachine pc("[disk C]\nwritable = 200000\n");
   pc.Write("registry.reg", text);
   pc.Write("drive_c/opera/opera.exe", "");
-  pc.Write(kImage, Image());
+  pc.Write(kImage, image);
   pc.Restart();
   AskForPluginDirectories();
   AskForServices();

@@ -45,11 +45,11 @@ void AskForOwnResources(std::string_view bytes) {
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  FuzzInput input(data, size);
-  const int type = input.TakeByte();
-  const int id = input.TakeByte();
+  std::string_view input = TextOf(data, size);
+  const int type = TakeByte(&input);
+  const int id = TakeByte(&input);
   // A block of its own, so that a read behind its end is seen.
-  const std::vector<uint8_t> file(data + (size - input.rest().size()), data + size);
+  const std::vector<uint8_t> file(input.begin(), input.end());
   const auto found = machine::FindInResourceFile(file, type, id);
   if (found && !found->empty()) {
     EXPECT_TRUE(found->data() >= file.data());
@@ -57,6 +57,6 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   }
   const auto dialog = machine::ReadDialogTemplate(file);
   EXPECT_TRUE(!dialog || dialog->controls.size() * 18 <= file.size());
-  AskForOwnResources(input.rest());
+  AskForOwnResources(input);
   return 0;
 }

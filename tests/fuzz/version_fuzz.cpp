@@ -22,8 +22,7 @@ Version Parse(const std::string& text) {
   Version fields = {1, 2, 3};
   EXPECT_EQ(ParseVersionText(text.c_str(), fields.data()),
             text.empty() ? StatusNoVersion : StatusOk);
-  const auto notSet = std::count(fields.begin(), fields.end(), kVersionNotSet);
-  EXPECT_EQ(notSet, text.empty() ? 3 : 0);
+  EXPECT_EQ(std::ranges::count(fields, kVersionNotSet), text.empty() ? 3 : 0);
   return fields;
 }
 
@@ -33,10 +32,9 @@ void CheckText(std::string text) {
     EXPECT_EQ(Parse(text + 'x'), version);
     EXPECT_EQ(Parse(text + std::string(15, 'x') + '1'), version);
   }
-  constexpr std::string_view kSeparators = ".,- ";
-  for (char& letter : text) {
-    if (kSeparators.find(letter) != std::string_view::npos) letter = '.';
-  }
+  const std::string separators = ".,- ";
+  std::ranges::replace_if(
+      text, [&](char c) { return separators.find(c) != std::string::npos; }, '.');
   EXPECT_EQ(Parse(text), version);
 }
 
@@ -45,7 +43,7 @@ Version ReadVersion() {
   FileRecord record;
   const int32_t isComplete = ReadFileRecordFromDisk("C:\\a.exe", &record);
   const Version version = {record.versionFirst, record.versionSecond, record.versionThird};
-  const bool isSet = std::find(version.begin(), version.end(), kVersionNotSet) == version.end();
+  const bool isSet = std::ranges::count(version, kVersionNotSet) == 0;
   EXPECT_EQ(isComplete, isSet && record.versionLanguage[0] != '\0' ? 1 : 0);
   EXPECT_TRUE(isSet || version == kNotSet);
   return version;
@@ -55,11 +53,10 @@ Version ReadVersion() {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const TestMachine pc;
-  FuzzInput input(data, size);
-  const unsigned kind = input.TakeByte() % 3;
+  std::string_view input = TextOf(data, size);
+  const unsigned kind = TakeByte(&input) % 3;
   if (kind == 0) {
-    const std::string_view rest = input.rest();
-    const std::string text(rest.substr(0, rest.find('\0')));
+    const std::string text(input.substr(0, input.find('\0')));
     CheckText(text);
     pc.Write(kFile, PortableExecutable(size % 2 == 0, 16, 1,
                                        {{0x40C, VersionResource({{"FileVersion", text}})}}));
@@ -69,7 +66,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     return 0;
   }
 
-  const std::string bytes(input.rest());
+  const std::string bytes(input);
   pc.Write(kFile, kind == 1 ? PortableExecutable(false, 16, 1, {{0x40C, bytes}}) : bytes);
   (void)ReadVersion();
   const auto resource = machine::ReadVersionResource(pc.Host(kFile));

@@ -1,5 +1,5 @@
-// Version resources in programs of all kinds, sound and damaged, and the version functions. Hostile
-// files of every kind are the business of the fuzz targets.
+// Version resources in programs of all kinds, and the version functions. Hostile files are the
+// business of the fuzz targets.
 #include "machine/executable_resources.h"
 
 #include <gtest/gtest.h>
@@ -16,6 +16,11 @@ const std::string kVersion = VersionResource({{"CompanyName", "ZEB"}, {"FileVers
 
 std::span<const uint8_t> Bytes(const std::string& text) {
   return {reinterpret_cast<const uint8_t*>(text.data()), text.size()};
+}
+
+// A file that the fuzz targets have too, behind their bytes of options.
+std::string Seed(const std::string& name, size_t options) {
+  return FileBytes(MORIV_SOURCE_DIR "/tests/fuzz/corpus/" + name).substr(options);
 }
 
 // The version resource of a file of these bytes, "" for none.
@@ -38,46 +43,23 @@ TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 1, {{0x40C, kVersion}, {0x407, other}})), kVersion);
     EXPECT_EQ(Read(PortableExecutable(is64, 16, 2, {{0, kVersion}})), "");
     EXPECT_EQ(Read(PortableExecutable(is64, 6, 1, {{0, kVersion}})), "");
+    std::string file = PortableExecutable(is64, 16, 1, {{0, kVersion}});
+    const size_t sizeField = file.find(ByteBuilder().U32(kVersion.size()).bytes());
+    file.replace(sizeField, 4, ByteBuilder().U32(file.size()).bytes());
+    EXPECT_EQ(Read(file), "") << "reaches beyond its section";
   }
-  const std::string resources = ResourceFile({{6, 7, 0, "odd"}, {16, 1, 0, kVersion}});
-  EXPECT_EQ(Read(NativeExecutable(".moriv_res", resources) + "a package behind it"), kVersion);
-  EXPECT_EQ(Read(NativeExecutable(".other_res", resources)), "");
+  std::string native = Seed("version/native-program", 1);
+  EXPECT_EQ(Read(native + "a package behind it"), kVersion);
+  EXPECT_EQ(Read(native.replace(native.find(".moriv_res"), 6, ".other")), "");
   const TemporaryFolder folder;
   EXPECT_FALSE(machine::ReadVersionResource(folder.Path()));
   EXPECT_FALSE(machine::ReadVersionResource(folder.Path() / "absent.exe"));
 }
 
-// What comes out of a file with an extreme byte anywhere lies within it. Run under a sanitizer this
-// is the proof that no offset is followed unchecked.
-TEST(ExecutableResources, OfADamagedFileStayWithinIt) {
-  for (const std::string& sound :
-       {PortableExecutable(false, 16, 1, {{0, kVersion}}),
-        PortableExecutable(true, 16, 1, {{0, kVersion}}),
-        NativeExecutable(".moriv_res", ResourceFile({{16, 1, 0, kVersion}}))}) {
-    ASSERT_EQ(Read(sound), kVersion);
-    for (size_t at = 0; at < sound.size(); ++at) {
-      const std::string cut = Read(sound.substr(0, at));
-      EXPECT_TRUE(cut.empty() || (cut == kVersion && at + 64 >= sound.size())) << at;
-      for (const int byte : {0x00, 0x01, 0x7F, 0x80, 0xFF}) {
-        std::string file = sound;
-        file[at] = static_cast<char>(byte);
-        const std::string resource = Read(file);
-        EXPECT_LE(resource.size(), file.size());
-        Query(resource, kPath);
-        Query(resource, "\\VarFileInfo\\Translation");
-      }
-    }
-  }
-}
-
 TEST(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
-  ByteBuilder named;  // passed over
-  named.U32(3).U32(40).Wide("PIC").U16(0).Wide("A").U16(0).Align().PadTo(40).Append("abc").Align();
-  const std::string file = named.bytes() + ResourceFile({{6, 1, 0x40C, "french"},
-                                                         {6, 1, 0, "neutral"},
-                                                         {6, 2, 0x40C, "only"},
-                                                         {6, 2, 0x407, "late"},
-                                                         {14, 1, 0, ""}});
+  // A picture with a name, which is passed over; (6, 1) in French and neutral; (6, 2) in French and
+  // German; (14, 1), which is empty.
+  const std::string file = Seed("resource/names-and-languages", 2);
   const auto find = [&](int type, int id) {
     const auto found = machine::FindInResourceFile(Bytes(file), type, id);
     return found ? std::string(found->begin(), found->end()) : "none";
@@ -112,29 +94,30 @@ TEST(VersionFunctions, FillAndAskABlockOfTheirOwnForm) {
   const TestMachine pc;
   // A text that fills the resource to its last byte, without a NUL, has the tightest copy.
   const std::string tight = VersionBlock("T", true, 9, ByteBuilder().Wide("123456789").bytes(), {});
-  pc.Write("drive_c/a.dll", PortableExecutable(true, 16, 1, {{0, kVersion}}));
-  pc.Write("drive_c/b.dll",
-           PortableExecutable(true, 16, 1,
-                              {{0, VersionBlock("VS_VERSION_INFO", false, 0, "", {tight})}}));
-  for (const char* file : {"C:\\A.DLL", "C:\\B.DLL"}) {
-    const DWORD size = GetFileVersionInfoSizeA(file, nullptr);
+  const std::string tightest = VersionBlock("VS_VERSION_INFO", false, 0, "", {tight});
+  const std::string company = "\\StringFileInfo\\040c04b0\\CompanyName";
+  const struct {
+    std::string resource;
+    std::vector<std::pair<std::string, std::string>> texts;
+  } rows[] = {{kVersion, {{kPath, "4.1.7"}, {company, "ZEB"}}}, {tightest, {{"\\T", "123456789"}}}};
+  for (const auto& [resource, texts] : rows) {
+    pc.Write("drive_c/a.dll", PortableExecutable(true, 16, 1, {{0, resource}}));
+    const DWORD size = GetFileVersionInfoSizeA("C:\\A.DLL", nullptr);
     std::vector<uint8_t> block(size, 0xCD);
-    void *company = nullptr, *value = nullptr;
+    void* value = nullptr;
     UINT length = 0;
     EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &value, &length)) << "not filled";
-    ASSERT_TRUE(GetFileVersionInfoA(file, 0, size, block.data()));
-    const bool isTight = VerQueryValueA(block.data(), "\\T", &value, &length);
-    if (isTight) {
-      EXPECT_STREQ(static_cast<const char*>(value), "123456789");
+    ASSERT_TRUE(GetFileVersionInfoA("C:\\A.DLL", 0, size, block.data()));
+    std::vector<void*> values;
+    for (const auto& [path, text] : texts) {
+      EXPECT_TRUE(VerQueryValueA(block.data(), path.c_str(), &value, &length));
       EXPECT_LE(static_cast<uint8_t*>(value) + length, block.data() + size);
-    } else {  // answers don't share their room
-      EXPECT_TRUE(VerQueryValueA(block.data(), kPath, &value, &length));
-      EXPECT_TRUE(VerQueryValueA(block.data(), "\\StringFileInfo\\040c04b0\\CompanyName", &company,
-                                 &length));
-      EXPECT_STREQ(static_cast<const char*>(value), "4.1.7");
-      EXPECT_STREQ(static_cast<const char*>(company), "ZEB");
+      values.push_back(value);
     }
-    EXPECT_FALSE(GetFileVersionInfoA(file, 0, size - 1, block.data()));
+    for (size_t i = 0; i < texts.size(); ++i) {  // answers don't share their room
+      EXPECT_EQ(static_cast<const char*>(values[i]), texts[i].second);
+    }
+    EXPECT_FALSE(GetFileVersionInfoA("C:\\A.DLL", 0, size - 1, block.data()));
     EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &value, &length));
   }
 }

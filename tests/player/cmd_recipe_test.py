@@ -5,7 +5,7 @@ from pathlib import Path
 
 import pytest
 
-from packed_image import PackedImage
+from package_image import PackedImage
 
 FOLDER = 'C:\\My Recipe\\'
 DOCUMENT = Path(__file__).resolve().parent.parent.parent / 'docs' / 'deployment.md'
@@ -25,7 +25,7 @@ def test_recipe(player, code):
     machine = player.world.machine('recipe')
     setup = player.world.stub.read_bytes()  # without a package: -1000012
     if code != -1000012:
-        setup = PackedImage([], player.tools).make(player.tools.images / f'recipe{code}')
+        setup = PackedImage(player.tools).bytes
     if code == 100002:
         machine.files.host(r'C:\windows\MorivRmv.exe').mkdir()  # in the way of the removal program
     machine.files.write(FOLDER + 'MorivSetup.exe', setup)

@@ -29,10 +29,7 @@ class FileTree:
         if host.exists():
             host.chmod(0o644)
         host.write_bytes(content)
-        if host.suffix.lower() == '.exe':
-            host.chmod(0o755)
-        if read_only:
-            host.chmod(0o444)
+        host.chmod(0o444 if read_only else 0o755 if host.suffix.lower() == '.exe' else 0o644)
 
     def delete(self, path):
         host = self.host(path)
@@ -42,31 +39,31 @@ class FileTree:
             host.unlink(missing_ok=True)
 
     def snapshot(self):
-        """Every path with a stamp that differs when the file was written or made anew."""
+        """Every path with a stamp that differs when the file was written or made anew; a directory's is
+        None."""
         stamps = {}
         for drive in sorted(self.folder.glob('drive_?')):
-            self._walk(drive, f'{drive.name[-1].upper()}:\\', stamps)
+            _walk(drive, f'{drive.name[-1].upper()}:\\', stamps)
         return stamps
 
-    def _walk(self, folder, path, stamps):
-        for entry in os.scandir(folder):
+
+def _walk(folder, path, stamps):
+    for entry in os.scandir(folder):
+        if entry.is_dir(follow_symlinks=False):
+            stamps[f'{path}{entry.name}\\'] = None
+            _walk(entry.path, f'{path}{entry.name}\\', stamps)
+        else:
             status = entry.stat(follow_symlinks=False)
-            if entry.is_dir(follow_symlinks=False):
-                stamps[f'{path}{entry.name}\\'] = None
-                self._walk(entry.path, f'{path}{entry.name}\\', stamps)
-            else:
-                stamps[path + entry.name] = (status.st_size, status.st_ino, status.st_ctime_ns,
-                                             stat.S_IMODE(status.st_mode))
+            stamps[path + entry.name] = status.st_mode, status.st_size, status.st_ino, status.st_ctime_ns
 
 
 def changes(before, after):
     """What differs between two snapshots: a sign by path; '+' new, '-' gone, '~' written anew."""
-    signs = {path: '-' for path in before.keys() - after.keys()}
-    signs |= {path: '+' for path in after.keys() - before.keys()}
-    signs |= {path: '~' for path in before.keys() & after.keys() if before[path] != after[path]}
-    return dict(sorted(signs.items()))
+    return {path: '+' if path not in before else '-' if path not in after else '~'
+            for path in sorted(before | after)
+            if path not in before or path not in after or before[path] != after[path]}
 
 
 def is_writable(stamp):
     """Whether the file of a snapshot can be deleted."""
-    return stamp[3] & stat.S_IWUSR != 0
+    return stamp[0] & stat.S_IWUSR != 0

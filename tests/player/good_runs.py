@@ -5,15 +5,16 @@ the machine before the run and from the image that ran.
     removed [DIRECTORY][, listed]
 
 are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
-is not there. Variants: "listed", with the uninstall entry; "older", the event of an update that has found
-an older or missing file; "not removable", without a removal program; "not registered", without a registry.
-"registered" and "unregistered" are the ends of the two: the last events, which follow the scenario's own,
-the removal program or the INF file, which stands beside the scenario's own files, and the registry.
+is not there. Variants: "listed", with the uninstall entry; "older", after the event of an older file;
+"not removable", without a removal program; "not registered", without a registry. "registered" and "unregistered" are the ends of the two: the last
+events, which follow the scenario's own, the removal program or the INF file, which stands beside the
+scenario's own files, and the registry.
 """
 
 import copy
 import re
 from collections import namedtuple
+from pathlib import PureWindowsPath
 
 import file_tree
 import registry_text
@@ -29,148 +30,131 @@ BROWSERS = {'%PLUGIN_NS_DIR%': 'netscape', '%PLUGIN_IE_DIR%': 'iexplore', '%PLUG
 
 DIRECTORY = r'C:\Program Files\Moriv'
 REMOVAL_PROGRAM = r'C:\windows\MorivRmv.exe'
-INF = r'C:\windows\Moriv.INF'
-PRODUCT = r'SOFTWARE\Zeb\Moriv'
 OLDER = 'Found an older version on the system, with at least one older or missing file '
+PRODUCT = r'SOFTWARE\Zeb\Moriv'
 CURRENT_VERSION = r'SOFTWARE\Microsoft\Windows\CurrentVersion'
 ENTRY = CURRENT_VERSION + r'\Uninstall\Moriv'
 CLEAN_UP = (r'"MorivCommand"="C:\\windows\\system32\\rundll32.exe setupapi.dll,'
             r'InstallHinfSection Uninstall 132 C:\\windows\\Moriv.INF"')
 
-# What was before a run, and what ran: files by path, the registry, the image's path, its files as pairs
-# of name and destination, whether a user was there, whether texts are compared with their NUL.
-Before = namedtuple('Before', 'files registry image packed dialog exact')
-Checks = namedtuple('Checks', 'log files registry')
+# What was before a run, and what ran: files by path, the registry, the files of the image as pairs of
+# name and destination, whether a user was there.
+Before = namedtuple('Before', 'files registry packed dialog')
+Checks = namedtuple('Checks', 'events files registry')
 
 _WORDS = re.compile(r'(installed|registered|removed|unregistered)(?: (\w:[^,]*?))?(?: in (\w+))?'
-                    r'((?:, [a-z ]+)*)')
-VARIANTS = ('listed', 'older', 'not removable', 'not registered')
+                    r'((?:, (?:listed|older|not removable|not registered))*)')
 
 
 def checks_of(words, before):
     """The bodies of the checks; an "(un)registered" gives the lines that come behind the scenario's."""
     match = _WORDS.fullmatch(words)
-    variants = match[4].split(', ')[1:] if match else []
-    if not match or (match[3] or 'French') not in LANGUAGES or not set(variants) <= set(VARIANTS):
+    if not match or (match[3] or 'French') not in LANGUAGES:
         raise ValueError(f'no such words: {words}')
-    word, directory, language = match[1], match[2] or DIRECTORY, match[3] or 'French'
-    targets = _targets(before, directory) if word in ('installed', 'removed') else []
-    if word == 'installed':
-        head = _copies(before, targets, directory, 'older' in variants), _new_files(before, targets)
-    elif word == 'removed':
-        head = _deletions(before, targets, directory)
+    run = _GoodRun(before, match[2] or DIRECTORY)
+    if match[1] == 'installed':
+        run.copy_files('older' in match[4])
+    elif match[1] == 'removed':
+        run.delete_files()
+    if match[1] in ('installed', 'registered'):
+        run.register(match[3] or 'French', match[4])
     else:
-        head = [], []
-    if word in ('installed', 'registered'):
-        tail = _registration(before, directory, language, variants)
-    else:
-        tail = _unregistration(before, variants)
-    return Checks(head[0] + tail.log, head[1] + tail.files, tail.registry)
+        run.unregister(match[4])
+    return run.checks()
 
 
-def _targets(before, directory):
-    """Name, directory and path of each target of each file; a browser that is not there is none."""
-    targets = []
-    for name, destination in before.packed:
-        browser = BROWSERS.get(destination)
-        if browser and not any(browser in key for key in before.registry.keys):
-            continue
-        for place in destination.replace('%INSTALL_DIR%', directory).split(';'):
-            if not place.startswith(directory):
-                raise ValueError(f'{name} goes to {destination}: its log and files have to be written')
-            targets.append((name, place, f'{place}\\{name}'))
-    return targets
+class _GoodRun:
+    def __init__(self, before, directory):
+        self.before, self.directory = before, directory
+        self.events = []
+        self.files = dict(before.files)  # a stamp by path, words for the content of what is written
+        self.registry = copy.deepcopy(before.registry)
 
+    def checks(self):
+        files = [f'{sign} {path}' + (f' = {self.files[path]}' if self.files.get(path) else '')
+                 for path, sign in file_tree.changes(self.before.files, self.files).items()]
+        return Checks(self.events, files, registry_text.changes(self.before.registry, self.registry))
 
-def _found(before, directory):
-    """The event of a product that was there. A dialog may change its directory later."""
-    key = before.registry.keys.get(PRODUCT.lower())
-    value = key.values.get('installdir') if key else None
-    if value and value.type == registry_text.REG_SZ and len(value.data) <= 511:
-        return ['Found a registered version of Moriv ']
-    if not before.dialog and (directory + '\\' in before.files or directory.endswith(':')):
-        return ['Found no registered version but the directory of Moriv ']
-    return []
+    def copy_files(self, told_older):
+        found = self._find_product()
+        if told_older:
+            self.events.append(OLDER)
+        if self.before.dialog:
+            kind = 'Updating the' if found else 'Installing'
+            self.events.append(f'{kind} Moriv version on the system ')
+        for name, place in self._targets():
+            for folder in list(PureWindowsPath(place, name).parents)[:-1]:
+                self.files.setdefault(f'{folder}\\')
+            self.files[f'{place}\\{name}'] = f'original {name}'
+            self.events.append(f'File copied correctly :  {place}\\{name}')
 
+    def register(self, language, variants):
+        if 'not registered' in variants:
+            self.events.append("Couldn't register Moriv in the system registry . (Warning)")
+        else:
+            self.events.append('Moriv registered in the system registry ')
+            if PRODUCT.lower() not in self.registry.keys:
+                self.registry.make(rf'{PRODUCT}\Services')
+            self.registry.apply([
+                f'[{PRODUCT}]', f'"InstallDir"={registry_text.quote(self.directory)} unterminated',
+                f'"Language"="{LANGUAGES[language].word}" unterminated'])
+        if 'not removable' in variants:
+            self.events.append(f'Error installing Uninstall file {REMOVAL_PROGRAM}. (Warning)')
+        else:
+            self.events.append(f'Uninstall file is installed correctly :  {REMOVAL_PROGRAM}')
+            self.files[REMOVAL_PROGRAM] = f'removal program in {language}'
+        if 'listed' in variants:
+            self.registry.apply([
+                f'[{ENTRY}]', f'"DisplayName"="{LANGUAGES[language].tag}ZEB Machine virtuelle Moriv"',
+                f'"UninstallString"={registry_text.quote(REMOVAL_PROGRAM)}'])
+        if self.before.dialog:
+            self.events.append('Installation of Moriv succeded ')
 
-def _written(path, before):
-    return f'{"~" if path in before.files else "+"} {path}'
+    def delete_files(self):
+        """What is there is tried; what is read-only stays, and a directory with it."""
+        found = self._find_product()
+        self.events.append('Unistalling Moriv from the system ')
+        for name, place in self._targets():
+            path = f'{place}\\{name}'
+            if path in self.files:
+                self.events.append(f'Deleteting file :  {path}')
+                if file_tree.is_writable(self.files[path]):
+                    del self.files[path]
+                if place != self.directory:
+                    self._remove_directory(place)
+        if found:
+            self._remove_directory(self.directory)
 
+    def unregister(self, variants):
+        self.events.append('Moriv registration removed from the registry ')
+        self.files[r'C:\windows\Moriv.INF'] = 'the INF file'
+        entry = [f'[-{ENTRY}]'] if 'listed' in variants else []
+        self.registry.apply([f'[-{PRODUCT}]', *entry, rf'[{CURRENT_VERSION}\RunOnce]', CLEAN_UP])
+        if self.before.dialog:
+            self.events.append('Uninstallation of Moriv succeded ')
 
-def _copies(before, targets, directory, older):
-    events = _found(before, directory)
-    kind = 'Updating the' if events else 'Installing'
-    events += [OLDER] if older else []
-    events += [f'{kind} Moriv version on the system '] if before.dialog else []
-    return events + [f'File copied correctly :  {path}' for _, _, path in targets]
+    def _find_product(self):
+        """Whether there was one, which is an event. A dialog may change its directory later."""
+        key = self.before.registry.keys.get(PRODUCT.lower())
+        _, kind, data = key.values.get('installdir', ('', 0, b'')) if key else ('', 0, b'')
+        if kind == registry_text.REG_SZ and len(data) <= 511:
+            self.events.append('Found a registered version of Moriv ')
+        elif not self.before.dialog and (f'{self.directory}\\' in self.files or not self.directory[2:]):
+            self.events.append('Found no registered version but the directory of Moriv ')
+        return bool(self.events)
 
+    def _targets(self):
+        """Name and directory of each target of each file; a browser that is not there is none."""
+        for name, destination in self.before.packed:
+            browser = BROWSERS.get(destination)
+            if browser and not any(browser in key for key in self.registry.keys):
+                continue
+            for place in destination.replace('%INSTALL_DIR%', self.directory).split(';'):
+                if not place.startswith(self.directory):
+                    raise ValueError(f'{name} goes to {destination}: say log and files in full')
+                yield name, place
 
-def _new_files(before, targets):
-    lines = {}
-    for name, place, path in targets:
-        parts = place.split('\\')
-        for end in range(2, len(parts) + 1):
-            folder = '\\'.join(parts[:end]) + '\\'
-            if folder not in before.files:
-                lines[folder] = f'+ {folder}'
-        lines[path] = f'{_written(path, before)} = original {name} of {before.image}'
-    return list(lines.values())
-
-
-def _registration(before, directory, language, variants):
-    events, files, lines = [], [], []
-    if 'not registered' in variants:
-        events.append("Couldn't register Moriv in the system registry . (Warning)")
-    else:
-        events.append('Moriv registered in the system registry ')
-        lines += [f'[{PRODUCT}]', f'"InstallDir"={registry_text.quote(directory)} unterminated',
-                  f'"Language"="{LANGUAGES[language].word}" unterminated']
-        if PRODUCT.lower() not in before.registry.keys:
-            lines.append(rf'[{PRODUCT}\Services]')
-    if 'not removable' in variants:
-        events.append(f'Error installing Uninstall file {REMOVAL_PROGRAM}. (Warning)')
-    else:
-        events.append(f'Uninstall file is installed correctly :  {REMOVAL_PROGRAM}')
-        files.append(f'{_written(REMOVAL_PROGRAM, before)} = '
-                     f'removal program of {before.image} in {language}')
-    if 'listed' in variants:
-        lines += [f'[{ENTRY}]', f'"DisplayName"="{LANGUAGES[language].tag}ZEB Machine virtuelle Moriv"',
-                  f'"UninstallString"={registry_text.quote(REMOVAL_PROGRAM)}']
-    events += ['Installation of Moriv succeded '] if before.dialog else []
-    return Checks(events, files, _registry_changes(before, lines))
-
-
-def _deletions(before, targets, directory):
-    """Events and files: what is there is tried, what is read-only stays, and a directory with it."""
-    found = _found(before, directory)
-    events, left = [*found, 'Unistalling Moriv from the system '], dict(before.files)
-
-    def remove(folder):
-        events.append(f'Removing Directory :  {folder}')
-        if not any(path.startswith(folder + '\\') and path != folder + '\\' for path in left):
-            left.pop(folder + '\\', None)
-
-    for _, place, path in targets:
-        if path in left:
-            events.append(f'Deleteting file :  {path}')
-            if file_tree.is_writable(left[path]):
-                del left[path]
-            if place != directory:
-                remove(place)
-    if found:
-        remove(directory)
-    return events, [f'- {path}' for path in before.files if path not in left]
-
-
-def _unregistration(before, variants):
-    events = ['Moriv registration removed from the registry ',
-              *(['Uninstallation of Moriv succeded '] if before.dialog else [])]
-    entry = [f'[-{ENTRY}]'] if 'listed' in variants else []
-    return Checks(events, [_written(INF, before) + ' = the INF file'],
-                  _registry_changes(before, [f'[-{PRODUCT}]', *entry, rf'[{CURRENT_VERSION}\RunOnce]',
-                                             CLEAN_UP]))
-
-
-def _registry_changes(before, lines):
-    after = copy.deepcopy(before.registry).apply(lines)
-    return registry_text.changes(before.registry, after, before.exact)
+    def _remove_directory(self, folder):
+        self.events.append(f'Removing Directory :  {folder}')
+        if not any(path.startswith(f'{folder}\\') and path != f'{folder}\\' for path in self.files):
+            self.files.pop(f'{folder}\\', None)

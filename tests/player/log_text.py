@@ -1,17 +1,14 @@
-"""Logs as scenarios have them: lines between bars, "heading" for the heading of a log, and one word for
-the three lines of a fatal event."""
+"""Logs as scenarios have them: lines between bars, "heading" for the four lines of a log's heading, and
+one word for the three lines of a fatal event."""
 
 import re
 from datetime import timedelta
 
 
-def number(events, first=1):
-    """Lines of a log."""
+def numbered(events, lines):
+    """The lines of events that stand behind these lines of a log."""
+    first = 1 + sum(bool(re.match(r'\|\d+- ', line)) for line in lines)
     return [f'|{place}- {event}|' for place, event in enumerate(events, first)]
-
-
-def count_events(lines):
-    return sum(bool(re.match(r'\|\d+- |fatal ', line)) for line in lines)
 
 
 def without_words(lines):
@@ -21,36 +18,24 @@ def without_words(lines):
         if line.startswith('fatal '):
             text = line.removeprefix('fatal ')
             blank = '' if ' :' in text else ' '  # without a detail
-            whole += number([f'Fatal Error : {text}{blank}. '], 1 + count_events(whole))
+            whole += numbered([f'Fatal Error : {text}{blank}. '], whole)
             whole += ['||', '| (Application will exit)|']
         else:
             whole.append(line)
     return whole
 
 
-def with_words(lines):
-    text = '\n'.join(lines)
+def with_words(text):
     return re.sub(r'\|\d+- Fatal Error : (.*?\S) ?\. \|\n\|\|\n\| \(Application will exit\)\|',
-                  r'fatal \1', text).split('\n') if lines else []
+                  r'fatal \1', text)
 
 
 def text_lines(text, times):
-    """The lines of a text file. times: before and after each run, for headings; None for a text without."""
-    parts = re.split(r'\r\n\r\nInstalling Moriv : (.*?) \r\n\r\n', text) if times else [text]
-    lines = []
-    for place, part in enumerate(parts):
-        if place % 2 == 1:
-            lines.append(_heading(part, times))
-        elif part:
-            lines += [f'|{line}|' for line in part.split('\r\n')]
-            # What stands behind the last line end: nothing, as it should be.
-            if lines.pop() != '||':
-                lines.append(f'|{part.split(chr(10))[-1]}| without a line end')
-    return lines
-
-
-def _heading(stamp, times):
-    """'heading' if the time is that of a run, else what it is."""
-    good = {(begun + timedelta(seconds=later)).strftime('%A, %d %B %Y at : %Hh %Mm %Ss')
-            for begun, ended in times for later in range(int((ended - begun).total_seconds()) + 1)}
-    return 'heading' if stamp in good else f'heading with the time "{stamp}"'
+    """The lines of a text file. times: before and after each run; a heading of that time is a word."""
+    for begun, ended in times:
+        for later in range(int((ended - begun).total_seconds()) + 1):
+            time = (begun + timedelta(seconds=later)).strftime('%A, %d %B %Y at : %Hh %Mm %Ss')
+            text = text.replace(f'\r\n\r\nInstalling Moriv : {time} \r\n\r\n', '\0\r\n')
+    *lines, rest = text.split('\r\n')
+    return ['heading' if line == '\0' else f'|{line}|' for line in lines] + (
+        [f'|{rest}| without a line end'] if rest else [])

@@ -1,10 +1,15 @@
-"""Setup images as bytes: taken apart, damaged on purpose, and the removal program that one leaves.
+"""Setup images: made of files, taken apart, damaged on purpose, and the removal program that one leaves.
 
 An image is the executable, then for each file a record and its stream, then one header that ends
 the file. All integers are little-endian.
 """
 
+import random
 import re
+import subprocess
+from collections import namedtuple
+from pathlib import Path
+from tempfile import TemporaryDirectory
 
 HEADER_SIZE = 568
 RECORD_SIZE = 696
@@ -21,24 +26,81 @@ RECORD_FIELDS = {
     'versionThird': (426, 2), 'fileSize': (428, 4), 'storedSize': (432, 4), 'reserved': (436, 260),
 }
 
+# The image that a scenario has unless it needs another one.
+USUAL_FILES = ('zebdial.exe = 5000 bytes -> %INSTALL_DIR%', 'zebnet.dll = 3000 bytes -> %INSTALL_DIR%')
 
-class ImageError(Exception):
-    pass
+# What images are made with: host paths of a program without a package, of the tool that packs one, and
+# of folders with real files, by the word for such a file.
+Tools = namedtuple('Tools', 'stub image_tool folders')
+
+_PACKED = {}  # images by all that goes into them: most scenarios have the same
 
 
-def _get(block, place):
-    offset, width = place
-    return int.from_bytes(block[offset:offset + width], 'little')
+class PackedImage:
+    """A setup image as a 'given image' section describes it. Has its files as (name, destination), their
+    contents by name, and the image's bytes."""
+
+    def __init__(self, tools, body=(), usual=True):
+        """usual: the body changes the usual image, a file of the same name takes the other's place."""
+        options = {'default_directory': "'C:\\Program Files\\Moriv'", 'default_language': "'french'"}
+        flags, lines = [], {}  # lines of files, by name
+        for line in [*(USUAL_FILES if usual else ()), *body]:
+            name, _, value = line.partition(' = ')
+            if ' -> ' in line:
+                lines[name] = line
+            elif line == 'with versions':
+                lines = {name: f'{name} = sample {name} -> %INSTALL_DIR%' for name in lines}
+            elif line in ('allow unknown macros', 'packed best'):
+                flags.append('--' + line.removeprefix('packed ').replace(' ', '-'))
+            else:
+                options[name.replace(' ', '_')] = value if value.isdigit() else f"'{value}'"
+        parts = [re.fullmatch('(.+?) = (.*) -> (.*)', line).groups() for line in lines.values()]
+        self.files = [(name, destination) for name, _, destination in parts]
+        self.contents = {name: file_content(words, f'packed {name}', tools) for name, words, _ in parts}
+        key = str((tools.stub, options, flags, self.files)), *self.contents.values()
+        if key not in _PACKED:
+            _PACKED[key] = self._pack(tools, options, flags)
+        self.bytes = _PACKED[key]
+
+    def _pack(self, tools, options, flags):
+        lines = ['[package]', *(f'{name} = {value}' for name, value in options.items())]
+        with TemporaryDirectory() as folder:
+            for name, destination in self.files:
+                Path(folder, name).write_bytes(self.contents[name])
+                lines += ['[[file]]', f"source = '{name}'", f"destination = '{destination}'"]
+            description, image = Path(folder, 'package.toml'), Path(folder, 'image.packed')
+            description.write_text('\n'.join(lines) + '\n', encoding='utf-8')
+            done = subprocess.run([tools.image_tool, 'pack', description, '--stub', tools.stub,
+                                   '-o', image, *flags], capture_output=True, text=True)
+            if done.returncode != 0:
+                raise ValueError(done.stderr.strip())
+            return image.read_bytes()
 
 
-def _set(block, place, data):
-    """Puts a number or bytes into a field; bytes are filled up with zeros."""
-    offset, width = place
-    if isinstance(data, int):
-        data = (data & (1 << 8 * width) - 1).to_bytes(width, 'little')
-    if len(data) > width:
-        raise ImageError(f'{len(data)} bytes for a field of {width}')
-    block[offset:offset + width] = data.ljust(width, b'\0')
+def file_content(words, seed, tools):
+    """The bytes that the words behind a file's '=' stand for: "TEXT", N bytes, or a real file."""
+    kind, _, name = words.partition(' ')
+    if name == 'bytes':
+        return _sample_bytes(seed, int(kind))
+    return (tools.folders[kind] / name).read_bytes() if kind in tools.folders else quoted_bytes(words)
+
+
+def quoted_bytes(words):
+    """The bytes of a "TEXT" in code page 1252, with \\r, \\n, \\t, \\" and \\\\."""
+    if not re.fullmatch('".*"', words):
+        raise ValueError(f'no such content: {words}')
+    escapes = {'r': '\r', 'n': '\n', 't': '\t'}
+    return re.sub(r'\\(.)', lambda m: escapes.get(m[1], m[1]), words[1:-1]).encode('cp1252')
+
+
+def _sample_bytes(seed, size):
+    """Bytes that a packer finds partly easy and partly hard; always the same for the same seed."""
+    source = random.Random(seed)
+    phrase = source.randbytes(23)
+    content = bytearray()
+    while len(content) < size:
+        content += source.choice([phrase * 9, source.randbytes(97), bytes(200), phrase[:7] * 20])
+    return bytes(content[:size])
 
 
 class Image:
@@ -46,33 +108,34 @@ class Image:
 
     def __init__(self, data):
         self.header = bytearray(data[-HEADER_SIZE:])
-        count, offset = (_get(self.header, HEADER_FIELDS[f]) for f in ('recordCount', 'dataOffset'))
+        count, offset = (_number(self.header, HEADER_FIELDS[f]) for f in ('recordCount', 'dataOffset'))
         self.executable = data[:offset]
         self.records, self.streams = [], []
         for _ in range(count):
-            record = bytearray(data[offset:offset + RECORD_SIZE])
+            self.records.append(bytearray(data[offset:offset + RECORD_SIZE]))
             offset += RECORD_SIZE
-            stored = _get(record, RECORD_FIELDS['storedSize'])
-            self.records.append(record)
+            stored = _number(self.records[-1], RECORD_FIELDS['storedSize'])
             self.streams.append(data[offset:offset + stored])
             offset += stored
         if offset != len(data) - HEADER_SIZE:
-            raise ImageError('the packed image is not one whole package')
+            raise ValueError('the packed image is not one whole package')
 
     def bytes(self):
-        files = b''.join(bytes(r) + s for r, s in zip(self.records, self.streams))
-        return bytes(self.executable) + files + bytes(self.header)
+        files = (part for file in zip(self.records, self.streams) for part in file)
+        return b''.join([self.executable, *files, self.header])
+
+    def set_stream(self, index, stream):
+        self.streams[index] = stream
+        _set(self.records[index], RECORD_FIELDS['storedSize'], len(stream))
 
     def removal_program(self, language_offset):
         """What an install of this image in that language leaves as its removal program."""
-        records = [bytearray(record) for record in self.records]
-        for record in records:
-            _set(record, RECORD_FIELDS['storedSize'], 0)
-        header = bytearray(self.header)
-        _set(header, HEADER_FIELDS['removalImageFlag'], 1)
-        _set(header, HEADER_FIELDS['packageLength'], len(records) * RECORD_SIZE)
-        _set(header, HEADER_FIELDS['defaultLanguage'], language_offset)
-        return bytes(self.executable) + b''.join(records) + header
+        for index in range(len(self.records)):
+            self.set_stream(index, b'')
+        for name, value in (('removalImageFlag', 1), ('defaultLanguage', language_offset),
+                            ('packageLength', len(self.records) * RECORD_SIZE)):
+            _set(self.header, HEADER_FIELDS[name], value)
+        return self.bytes()
 
 
 def damage(data, line):
@@ -80,11 +143,10 @@ def damage(data, line):
 
     header FIELD = VALUE            record N FIELD = VALUE       N from 1
     stream N = hex BYTES            another stream; the record's storedSize follows
-    stream N = first COUNT bytes    the same, cut short
     no records                      neither records nor streams, recordCount 0
     no records but N                the first N alone
     executable alone                no package at all
-    cut to COUNT bytes              cut COUNT bytes from the end
+    cut N bytes from the end
     append "TEXT"
 
     A VALUE is a number, a "TEXT", filled "TEXT" (repeated over the field's whole width, so that no
@@ -93,55 +155,54 @@ def damage(data, line):
     for pattern, change in _DAMAGES:
         if match := re.fullmatch(pattern, line):
             return change(data, *match.groups())
-    raise ImageError(f'no such damage: {line}')
+    raise ValueError(f'no such damage: {line}')
 
 
 def _change_field(data, number, name, value):
     """Of the record with this number, of the header without one."""
     image = Image(data)
-    fields = RECORD_FIELDS if number else HEADER_FIELDS
-    if name not in fields:
-        raise ImageError(f'no such field: {name}')
     block = image.records[int(number) - 1] if number else image.header
-    _set(block, fields[name], _field_value(value, fields[name][1]))
+    _set(block, (RECORD_FIELDS if number else HEADER_FIELDS)[name], _value(value))
     return image.bytes()
 
 
-def _change_stream(data, number, value):
+def _change_stream(data, number, stream):
     image = Image(data)
-    index = int(number) - 1
-    if first := re.fullmatch(r'first (\d+) bytes', value):
-        stream = image.streams[index][:int(first[1])]
-    elif value.startswith('hex '):
-        stream = bytes.fromhex(value[4:])
-    else:
-        raise ImageError(f'no such stream: {value}')
-    image.streams[index] = stream
-    _set(image.records[index], RECORD_FIELDS['storedSize'], len(stream))
+    image.set_stream(int(number) - 1, bytes.fromhex(stream))
     return image.bytes()
 
 
 def _drop_records(data, kept):
     image = Image(data)
-    image.records, image.streams = image.records[:kept], image.streams[:kept]
-    _set(image.header, HEADER_FIELDS['recordCount'], kept)
+    image.records = image.records[:int(kept or 0)]
+    _set(image.header, HEADER_FIELDS['recordCount'], len(image.records))
     return image.bytes()
 
 
 _DAMAGES = [
     (r'(?:header|record (\d+)) (\w+) = (.+)', _change_field),
-    (r'stream (\d+) = (.+)', _change_stream),
-    (r'no records(?: but (\d+))?', lambda data, kept: _drop_records(data, int(kept or 0))),
+    (r'stream (\d+) = hex (.+)', _change_stream),
+    (r'no records(?: but (\d+))?', _drop_records),
     (r'executable alone', lambda data: Image(data).executable),
-    (r'cut to (\d+) bytes', lambda data, count: data[:int(count)]),
     (r'cut (\d+) bytes from the end', lambda data, count: data[:-int(count)]),
-    (r'append "(.*)"', lambda data, text: data + text.encode('cp1252')),
+    (r'append (".*")', lambda data, text: data + quoted_bytes(text)),
 ]
 
 
-def _field_value(text, width):
-    if filled := re.fullmatch(r'filled "(.+)"', text):
-        return (filled[1].encode('cp1252') * width)[:width]
-    if re.fullmatch(r'".*"', text):
-        return text[1:-1].encode('cp1252')
+def _value(text):
+    if quoted := re.fullmatch('(filled )?"(.*)"', text):
+        return quoted[2].encode('cp1252') * (260 if quoted[1] else 1)
     return bytes.fromhex(text[4:]) if text.startswith('hex ') else int(text, 0)
+
+
+def _number(block, place):
+    offset, width = place
+    return int.from_bytes(block[offset:offset + width], 'little')
+
+
+def _set(block, place, data):
+    """Puts a number or bytes into a field; bytes are filled up with zeros, or cut off."""
+    offset, width = place
+    if isinstance(data, int):
+        data = (data & (1 << 8 * width) - 1).to_bytes(width, 'little')
+    block[offset:offset + width] = data.ljust(width, b'\0')[:width]

@@ -8,7 +8,7 @@ import os
 
 import pytest
 
-from packed_image import PackedImage
+from package_image import PackedImage
 from worlds import require
 
 FOLDER = 'C:\\Planted\\'
@@ -59,7 +59,7 @@ def test_planted_libraries(player):
     for name in NAMES:
         machine.files.write(f'{FOLDER}{name}.dll', library.read_bytes())
     machine.files.write(LOADER, loader.read_bytes())
-    machine.files.write(SETUP, PackedImage([], player.tools).make(player.tools.images / 'planted'))
+    machine.files.write(SETUP, PackedImage(player.tools).bytes)
     machine.run(LOADER, ' '.join(f'{name}.dll' for name in NAMES))
     loaded = [('careless', None, take_marks(machine))]
     for arguments, script, _, _ in RUNS:

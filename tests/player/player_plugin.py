@@ -1,26 +1,22 @@
 """pytest's plugin for scenarios: each scenario is an item, played in the world of the session."""
 
-import os
-import shutil
 from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
 import pytest
 
-from scenario_play import ScenarioFailure, Tools, play
+from package_image import Tools
+from scenario_play import ScenarioFailure, play
 from scenario_text import ScenarioError, parse
-from worlds import StandIn, Wine, WorldError, require
+from worlds import BUILD, ROOT, WORLDS, WorldError, make_world, require
 
-ROOT = Path(__file__).resolve().parent.parent.parent
 SCENARIOS = ROOT / 'tests' / 'scenarios'
 PROGRAMS = ROOT / 'tests' / 'player'
-BUILD = ROOT / 'build'
-LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
 
 
 def pytest_addoption(parser):
     group = parser.getgroup('scenarios')
-    group.addoption('--world', choices=['stand-in', 'wine64', 'wine32'], default='stand-in')
+    group.addoption('--world', choices=WORLDS, default=WORLDS[0])
     group.addoption('--fail-fast', action='store_const', const=1, dest='maxfail',
                     help='end at the first failure')
     group.addoption('--accept', action='store_true',
@@ -39,21 +35,18 @@ def _paths(name):
     """What pytest has to collect for a name of the command line."""
     if name in ('all', 'scenarios'):
         return [str(SCENARIOS), str(PROGRAMS)] if name == 'all' else [str(SCENARIOS)]
-    base, bracket, row = name.partition('[')
-    found = [*SCENARIOS.rglob(f'{base}.scenario'), *PROGRAMS.glob(f'{base}_test.py')]
+    file_name, bracket, _ = name.partition('[')
+    found = [*SCENARIOS.rglob(f'{file_name}.scenario'), *PROGRAMS.glob(f'{file_name}_test.py'),
+             *SCENARIOS.glob(f'{file_name}/')]
     if found:
         return [f'{found[0]}::{name}' if bracket else str(found[0])]
-    if (SCENARIOS / name).is_dir():
-        return [str(SCENARIOS / name)]
     if Path(name.partition('::')[0]).exists():
         return [name]
     raise pytest.UsageError(f'no scenario and no folder {name}')
 
 
 def pytest_collect_file(file_path, parent):
-    if file_path.suffix == '.scenario':
-        return ScenarioFile.from_parent(parent, path=file_path)
-    return None
+    return ScenarioFile.from_parent(parent, path=file_path) if file_path.suffix == '.scenario' else None
 
 
 class ScenarioFile(pytest.File):
@@ -95,7 +88,12 @@ def pytest_collection_finish(session):
     player = session.config.player
     if session.config.option.collectonly or not session.items or session.testsfailed:
         return
-    player.open()
+    try:
+        require(player.tools.image_tool)
+        player.world.open()
+    except WorldError as error:
+        player.tell(error)
+        pytest.exit(str(error), error.status)
     if player.world.at_once > 1:
         player.pool = ThreadPoolExecutor(player.world.at_once)
         for item in session.items:
@@ -104,14 +102,16 @@ def pytest_collection_finish(session):
 
 
 def pytest_sessionfinish(session):
-    session.config.player.close()
+    player = session.config.player
+    if player.pool:
+        player.pool.shutdown(cancel_futures=True)
+    player.world.close()
 
 
 def pytest_terminal_summary(terminalreporter, config):
-    counts = {kind: len(terminalreporter.stats.get(kind, [])) for kind in
-              ('passed', 'failed', 'error', 'skipped')}
-    counts['failed'] += counts.pop('error')
-    config.player.tell(', '.join(f'{count} {kind}' for kind, count in counts.items()))
+    passed, failed, errors, skipped = (len(terminalreporter.stats.get(kind, [])) for kind in
+                                       ('passed', 'failed', 'error', 'skipped'))
+    config.player.tell(f'{passed} passed, {failed + errors} failed, {skipped} skipped')
 
 
 @pytest.fixture(scope='session')
@@ -123,34 +123,12 @@ class Player:
     """One world, and what scenarios are played with in it."""
 
     def __init__(self, options):
-        self.options = options
+        self.accept = options.accept
         self.work = options.native / 'scenarios'
-        self.world = self._make_world()
-        images = self.work / f'{self.world.name}-images'
-        kinds = {'sample': BUILD / 'win32' / 'samples', 'real': images.with_name(f'{images.name}-real')}
-        self.tools = Tools(self.world.stub, options.native / 'moriv-image', kinds, images)
+        self.world = make_world(options.world, options.native, self.work / 'stand-in', options.wine)
+        folders = {'sample': BUILD / 'win32' / 'samples', 'real': self.work / f'{options.world}-real'}
+        self.tools = Tools(self.world.stub, options.native / 'moriv-image', folders)
         self.pool = None
-        self.is_open = False
-
-    def open(self):
-        if reason := self.world.missing():
-            self.tell(f'left out: {reason}')
-            # Only what the host can't do and what was asked for is left out without a failure.
-            asked_for = os.environ.get('MORIV_WINE') == 'none' or self.world.name == 'wine32'
-            pytest.exit(reason, LEFT_OUT if asked_for else 1)
-        try:
-            require(self.tools.image_tool)
-            self.is_open = True
-            self.world.open()
-        except WorldError as error:
-            pytest.exit(str(error), 2)
-        shutil.rmtree(self.tools.images, ignore_errors=True)
-
-    def close(self):
-        if self.pool:
-            self.pool.shutdown(cancel_futures=True)
-        if self.is_open:
-            self.world.close()
 
     def tell(self, line):
         """Prints the closing line, and keeps it for tools/test, which tells all worlds' at its end."""
@@ -166,14 +144,7 @@ class Player:
         """Raises what play() raises; the stand-in machine of a scenario that failed stays."""
         machine = self.world.machine(scenario.name)
         try:
-            play(scenario, machine, self.tools, self.options.accept)
+            play(scenario, machine, self.tools, self.accept)
         except (ScenarioFailure, ScenarioError) as failure:
             raise type(failure)(f'{failure}{machine.keep()}') from failure
         machine.discard()
-
-    def _make_world(self):
-        if self.options.world == 'stand-in':
-            return StandIn(self.options.native, self.work / 'stand-in')
-        bits = int(self.options.world.removeprefix('wine'))
-        return Wine(bits, BUILD / f'win{bits}', ROOT / 'tools' / 'wine',
-                    self.options.wine / f'scenarios{bits}')

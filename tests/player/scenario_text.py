@@ -14,6 +14,7 @@ WORDS = ('installed', 'registered', 'removed', 'unregistered')
 CHECKS = ('exit', 'shown', 'log', 'text', 'files', 'registry', *WORDS)
 VERBATIM = ('shown', 'log', 'text')
 DEFAULT_IMAGE = r'C:\Setup.exe'
+LOG = r'C:\windows\MorivLog.txt'
 
 _KEYWORD = re.compile(f'({"|".join(WORLDS + PREPARATIONS + ACTIONS + CHECKS)})(?:: |:?$| |(?=,))(.*)')
 
@@ -30,6 +31,13 @@ class Section:
     body: list = field(default_factory=list)
     checks: list = field(default_factory=list)   # of an action
 
+    @property
+    def subject(self):
+        """What a check is of."""
+        if self.keyword == 'text':
+            return 'log' if self.argument == LOG else f'text {self.argument}'
+        return self.keyword
+
 
 @dataclass
 class Scenario:
@@ -44,7 +52,7 @@ def parse(name, text, file_name):
     """The scenario of a file, or one for each row of its table. Raises ScenarioError, which names
     the line."""
     lines = [(f'{file_name}:{number}', line) for number, line in enumerate(text.splitlines(), 1)
-             if not line.lstrip().startswith('#')]
+             if line.strip() and not line.lstrip().startswith('#')]
     title = next((line[1:].strip() for line in text.splitlines() if line.startswith('#')), '')
     rows, lines = _take_table(lines)
     if rows is None:
@@ -61,18 +69,18 @@ def parse(name, text, file_name):
 
 def _take_table(lines):
     """The rows of the table, each a dictionary by the names of its heading, and the other lines."""
-    starts = [index for index, (_, line) in enumerate(lines) if line == 'each']
-    if not starts:
+    begin = next((index for index, (_, line) in enumerate(lines) if line == 'each'), None)
+    if begin is None:
         return None, lines
-    begin = end = starts[0] + 1
-    while end < len(lines) and (lines[end][1].startswith('  ') or not lines[end][1].strip()):
+    end = begin + 1
+    while end < len(lines) and lines[end][1].startswith('  '):
         end += 1
     table = [(place, [cell.strip() for cell in re.split(r'\s\|(?=\s)', line + ' ')])
-             for place, line in lines[begin:end] if line.strip()]
+             for place, line in lines[begin + 1:end]]
     for place, cells in table:
         if len(cells) != len(table[0][1]):
             raise ScenarioError(f'{place}: {len(cells)} cells in a table of {len(table[0][1])}')
-    return [dict(zip(table[0][1], cells)) for _, cells in table[1:]], lines[:begin - 1] + lines[end:]
+    return [dict(zip(table[0][1], cells)) for _, cells in table[1:]], lines[:begin] + lines[end:]
 
 
 def _fill(line, row, place):
@@ -86,13 +94,24 @@ def _fill(line, row, place):
 def _scenario(name, title, lines, file_name):
     sections = []
     for place, line in lines:
+        if not line.strip():
+            continue  # an empty cell was all that it had
         if line.startswith('  ') and sections:
-            if line.strip():
-                last = sections[-1].checks[-1] if sections[-1].checks else sections[-1]
-                last.body.append(_body_line(last, line[2:], place))
-        elif line.strip():
+            _add_line((sections[-1].checks or sections)[-1], line[2:], place)
+        else:
             _add_section(sections, line, place)
-    return _checked(Scenario(name, title, *_world(sections, file_name)), file_name)
+    if not any(section.keyword in ACTIONS for section in sections):
+        raise ScenarioError(f'{file_name}: nothing is run')
+    world = sections.pop(0) if sections[0].keyword in WORLDS else Section('', '', '')
+    only = world.keyword.removeprefix('only ')
+    if only and not world.argument:
+        raise ScenarioError(f'{file_name}: only one world, but no reason')
+    for section in sections:
+        if section.keyword in WORLDS:
+            raise ScenarioError(f'{section.place}: the world stands in the first section')
+        if section.keyword == 'given machine' and only != 'stand-in':
+            raise ScenarioError(f'{section.place}: only the stand-in has settings')
+    return Scenario(name, title, only, world.argument, sections)
 
 
 def _add_section(sections, line, place):
@@ -102,35 +121,17 @@ def _add_section(sections, line, place):
     section = Section(match[1], match[2].strip(), place)
     if section.keyword not in CHECKS:
         sections.append(section)
-    elif sections and sections[-1].keyword in ACTIONS:
-        sections[-1].checks.append(section)
-    else:
+    elif not sections or sections[-1].keyword not in ACTIONS:
         raise ScenarioError(f'{place}: a check stands behind what it checks')
+    elif section.subject in [check.subject for check in sections[-1].checks]:
+        raise ScenarioError(f'{place}: two checks of the same thing')
+    else:
+        sections[-1].checks.append(section)
 
 
-def _body_line(section, line, place):
+def _add_line(section, line, place):
     """A line of a text stands between bars, so that blanks at its end are seen, unless it is a word."""
     if section.keyword in VERBATIM and not re.fullmatch(
             r' *\|.*\||heading|fatal .+|page .+|  - \d+', line):
         raise ScenarioError(f'{place}: a line of text stands between bars: {line}')
-    return line
-
-
-def _world(sections, file_name):
-    """The one world, its reason, and the other sections."""
-    if not sections or sections[0].keyword not in WORLDS:
-        return '', '', sections
-    if not sections[0].argument:
-        raise ScenarioError(f'{file_name}: only one world, but no reason')
-    return sections[0].keyword.removeprefix('only '), sections[0].argument, sections[1:]
-
-
-def _checked(scenario, file_name):
-    for section in scenario.sections:
-        if section.keyword in WORLDS:
-            raise ScenarioError(f'{section.place}: the world stands in the first section')
-        if section.keyword == 'given machine' and scenario.only != 'stand-in':
-            raise ScenarioError(f'{section.place}: only the stand-in has settings')
-    if not any(section.keyword in ACTIONS for section in scenario.sections):
-        raise ScenarioError(f'{file_name}: nothing is run')
-    return scenario
+    section.body.append(line)

@@ -8,15 +8,21 @@ import contextlib
 import errno
 import fcntl
 import os
+import re
 import shutil
 import subprocess
 import time
 from collections import namedtuple
+from datetime import datetime
 from pathlib import Path
 
 from file_tree import FileTree
-from registry_text import Registry, Value
+from registry_text import Registry
 
+ROOT = Path(__file__).resolve().parent.parent.parent
+BUILD = ROOT / 'build'
+WORLDS = ('stand-in', 'wine64', 'wine32')
+LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
 TIME_LIMIT = int(os.environ.get('MORIV_TIME_LIMIT', 60))  # seconds, for one program
 
 # What a program did: its exit code (None when it ended without one), the lines that it showed, and
@@ -25,26 +31,41 @@ Outcome = namedtuple('Outcome', 'exit_code shown trouble')
 
 
 class WorldError(Exception):
-    """The world itself can't be had or broke down."""
+    """The world itself can't be had or broke down. status: what the session ends with."""
+
+    def __init__(self, message, status=2):
+        super().__init__(message)
+        self.status = status
+
+
+def make_world(name, native, work, wine=BUILD / 'wine'):
+    """native: folder of the native build; work: folder for machines; wine: folder for Wine prefixes."""
+    if name == 'stand-in':
+        return StandIn(native, work)
+    bits = name.removeprefix('wine')
+    return Wine(bits, wine / f'scenarios{bits}')
 
 
 class Machine:
     """What the machines of both worlds do alike."""
 
-    def __init__(self, script):
+    codepage = 'cp1252'
+    now = None  # its own time, when it is set
+
+    def __init__(self, files, script):
         """script: file for what the user of the next run does."""
+        self.files = files
         self.script = script
         self.has_user = False
 
     def user(self, lines):
-        """The script of the user of the next run."""
+        """The script of the user of the next run; the one behind it has none."""
         self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
         self.has_user = True
 
-    def take_user(self):
-        """Whether the run that begins now has a user; the one behind it has none."""
+    def run(self, program, arguments):
         had_user, self.has_user = self.has_user, False
-        return had_user
+        return self._run(program, arguments, had_user)
 
 
 class StandIn:
@@ -52,70 +73,67 @@ class StandIn:
     at_once = 2
 
     def __init__(self, native, work):
-        """native: folder of the native build; work: folder for machines."""
         self.stub = native / 'MorivSetup'
-        self.machine_tool = native / 'moriv-machine'
-        self.work = work
-
-    def missing(self):
-        return ''
+        self.tool = native / 'moriv-machine'
+        self.work = work.resolve()
+        self.fresh = self.work / 'fresh'
 
     def open(self):
-        require(self.stub, self.machine_tool)
-        self.fresh = self.work / 'fresh'
+        require(self.stub, self.tool)
         shutil.rmtree(self.work, ignore_errors=True)
         self.work.mkdir(parents=True)
-        _call([self.machine_tool, 'new', self.fresh])
+        _call(self.tool, 'new', self.fresh)
 
     def close(self):
         pass
 
     def machine(self, name):
-        folder = self.work / name
-        shutil.copytree(self.fresh, folder)
-        return StandInMachine(folder, self.machine_tool)
+        return StandInMachine(shutil.copytree(self.fresh, self.work / name), self.tool)
 
 
 class StandInMachine(Machine):
     tells_requests = True  # what the program asks of the system is shown
-    keeps_texts = True     # in the registry, with their NUL or without
 
-    def __init__(self, folder, machine_tool):
-        super().__init__(folder.with_suffix('.user'))
+    def __init__(self, folder, tool):
+        super().__init__(FileTree(folder), folder.with_suffix('.user'))
         self.folder = folder
-        self.machine_tool = machine_tool
-        self.files = FileTree(folder)
+        self.tool = tool
 
     def settings(self, lines):
-        (self.folder / 'machine.ini').write_text('\n'.join(lines) + '\n', encoding='utf-8')
+        text = '\n'.join(lines) + '\n'
+        (self.folder / 'machine.ini').write_text(text, encoding='utf-8')
+        settings = dict(re.findall('^(now|codepage) = (.*)', text, re.M))
+        self.codepage = f'cp{settings.get("codepage", 1252)}'
+        self.now = datetime.fromisoformat(settings['now']) if 'now' in settings else None
 
     def registry(self):
-        text = (self.folder / 'registry.reg').read_bytes().decode('cp1252', 'replace')
-        return Registry().apply(text.splitlines())
+        text = (self.folder / 'registry.reg').read_bytes().decode(self.codepage, 'replace')
+        return Registry(self.codepage).apply(text.splitlines())
 
     def set_registry(self, registry):
-        text = '\n'.join(['REGEDIT4', '', *registry.sections()])
-        (self.folder / 'registry.reg').write_bytes(text.encode('cp1252'))
+        (self.folder / 'registry.reg').write_bytes(registry.regedit4())
 
-    def run(self, program, arguments):
+    def _run(self, program, arguments, has_user):
+        command = [self.files.host(program), *([arguments] if arguments else [])]
+        environment = os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'}
+        if has_user:
+            environment['MORIV_USER'] = str(self.script)
         try:
-            done = self._start([self.files.host(program), *([arguments] if arguments else [])])
+            done = self._start(command, environment)
         except subprocess.TimeoutExpired:
             return Outcome(None, [], f'ended after {TIME_LIMIT} seconds')
         except OSError as error:
             return Outcome(None, [], f'cannot start: {error}')
         code, shown = _split_exit_code(done.stdout.decode('utf-8', 'replace').splitlines())
-        return Outcome(code, shown, _trouble(done, code))
+        errors = done.stderr.decode('utf-8', 'replace').strip()
+        status = 0 if code in (None, 0, 1) or code > 100000 else 1
+        if errors or code is not None and done.returncode != status:
+            errors = f'exit status {done.returncode} for exit code {code}, standard error: {errors}'
+        return Outcome(code, shown, errors)
 
-    def add_drive(self, letter):
-        """A drive exists when its folder does."""
-        (self.folder / f'drive_{letter}').mkdir(exist_ok=True)
-
-    def _start(self, command):
+    def _start(self, command, environment):
         """Another thread's child, before it has become a program of its own, can still hold the new
         file open for writing; then the system refuses to start it, and soon no more."""
-        user = {'MORIV_USER': str(self.script)} if self.take_user() else {}
-        environment = os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'} | user
         for attempt in range(100):
             try:
                 return subprocess.run(command, cwd=self.folder, env=environment,
@@ -125,8 +143,12 @@ class StandInMachine(Machine):
                     raise
                 time.sleep(0.02)
 
+    def add_drive(self, letter):
+        """A drive exists when its folder does."""
+        (self.folder / f'drive_{letter.lower()}').mkdir(exist_ok=True)
+
     def restart(self):
-        _call([self.machine_tool, 'restart', self.folder])
+        _call(self.tool, 'restart', self.folder)
 
     def keep(self):
         return f'\nthe machine is kept in {self.folder}'
@@ -143,20 +165,12 @@ def _split_exit_code(lines):
     return None, lines
 
 
-def _trouble(done, code):
-    """What is wrong beyond the exit code: anything on standard error, or a wrong exit status."""
-    errors = done.stderr.decode('utf-8', 'replace').strip()
-    if errors:
-        return f'standard error (exit status {done.returncode}): {errors}'
-    if code is not None and done.returncode != (0 if code in (0, 1) or code > 100000 else 1):
-        return f'exit status {done.returncode} for exit code {code}'
-    return ''
-
-
 class Wine:
     at_once = 1
+    tool = ROOT / 'tools' / 'wine'
 
-    # All that the program and the scenarios touch; the rest of Wine's registry is not looked at.
+    # All that the program and the scenarios touch; the rest of Wine's registry is not looked at. The
+    # last three are there on a fresh machine.
     WATCHED = (r'SOFTWARE\Zeb', r'SOFTWARE\Netscape',
                r'SOFTWARE\Classes\http\shell\open\command',
                r'SOFTWARE\Classes\htmlfile\shell\open\command',
@@ -164,58 +178,44 @@ class Wine:
                r'SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce',
                r'SOFTWARE\Microsoft\Windows\CurrentVersion\App Paths')
 
-    def __init__(self, bits, build, tool, prefix):
-        """bits: 32 or 64; build: folder of that Windows build; tool: tools/wine."""
+    def __init__(self, bits, prefix):
+        """bits: '32' or '64'."""
+        build = BUILD / f'win{bits}'
         self.name = f'wine{bits}'
         self.bits = bits
         self.stub = build / 'MorivSetup.exe'
         self.agent_program = build / 'tests' / 'scenario_agent.exe'
         self.driver = build / 'tests' / 'dialog_driver.exe'
-        self.tool = tool
         self.prefix = prefix
+        self.files = FileTree(prefix)
         self.agent = None
 
-    def missing(self):
-        """Why this host can't have the world; '' when it can."""
-        answer = subprocess.run([self.tool, 'can-run', str(self.bits)],
-                                capture_output=True, text=True)
-        return '' if answer.returncode == 0 else answer.stdout.strip() or answer.stderr.strip()
-
     def open(self):
+        answer = subprocess.run([self.tool, 'can-run', self.bits], capture_output=True, text=True)
+        if answer.returncode != 0:
+            # Only what the host can't do and what was asked for is left out without a failure.
+            asked_for = os.environ.get('MORIV_WINE') == 'none' or self.bits == '32'
+            raise WorldError(f'left out: {(answer.stdout or answer.stderr).strip()}',
+                             LEFT_OUT if asked_for else 1)
         require(self.stub, self.agent_program, self.driver)
         self.prefix.parent.mkdir(parents=True, exist_ok=True)
         # Two runs in one prefix would see each other's files; the second one waits.
         self.lock = open(f'{self.prefix}.in-use', 'w')
         fcntl.flock(self.lock, fcntl.LOCK_EX)
-        _call([self.tool, 'prefix', self.prefix, str(self.bits)])
-        self.files = FileTree(self.prefix)
+        _call(self.tool, 'prefix', self.prefix, self.bits)
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
         self.agent = Agent([*display, self.tool, 'run', self.prefix, self.agent_program],
                            f'{self.prefix}.agent-log')
-        self.clean_files()
-        for key in self.WATCHED:
-            self.agent.ask(f'delete {key}')
-        # As on a fresh stand-in machine.
+        self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
-            self.agent.ask(f'key {key}')
-
-    def clean_files(self):
-        """Takes away what an earlier scenario left; the first one finds the prefix as made."""
-        listing = self.prefix / 'fresh-files'
-        if not listing.exists():
-            listing.write_text('\n'.join(self.files.snapshot()), encoding='utf-8')
-        fresh = set(listing.read_text(encoding='utf-8').split('\n'))
-        for path in sorted(self.files.snapshot().keys() - fresh):
-            self.files.delete(path)
-        for drive in self.prefix.glob('drive_[!c]'):
-            drive.rmdir()
-            (self.prefix / 'dosdevices' / f'{drive.name[-1]}:').unlink(missing_ok=True)
+            self.fresh_registry.make(key)
+        WineMachine(self).discard()  # what an earlier session left
 
     def close(self):
         if self.agent:
             self.agent.close()
-            _call([self.tool, 'stop', self.prefix])
+            _call(self.tool, 'stop', self.prefix)
 
     def machine(self, name):
         return WineMachine(self)
@@ -223,83 +223,83 @@ class Wine:
 
 class WineMachine(Machine):
     tells_requests = False
-    keeps_texts = False
 
     def __init__(self, world):
-        super().__init__(Path(f'{world.prefix}.user'))
+        super().__init__(world.files, Path(f'{world.prefix}.user'))
         self.world = world
-        self.files = world.files
         self.agent = world.agent
-        self.fresh_registry = self.registry()
 
     def registry(self):
-        registry = Registry()
-        for key in self.world.WATCHED:
-            current = None
-            for line in self.agent.ask(f'dump {key}'):
-                kind, _, rest = line.partition(' ')
-                if kind == 'key':
-                    current = registry.make(rest)
-                else:
-                    _add_dumped_value(current, rest)
+        registry = Registry(terminates=True)
+        for line in [line for key in self.world.WATCHED for line in self.agent.ask(f'dump {key}')]:
+            kind, rest = line.split(' ', 1)
+            if kind == 'key':
+                key = registry.make(rest)
+            else:
+                kind, *texts = rest.split(' ')
+                name, data = (bytes.fromhex(text.strip('-')) for text in texts)
+                registry.put(key, name.decode(self.codepage, 'replace'), int(kind), data)
         return registry
 
     def set_registry(self, registry):
         for key in self.world.WATCHED:
             self.agent.ask(f'delete {key}')
-        watched = tuple(key.lower() for key in self.world.WATCHED)
-        for key in registry.keys.values():
-            if not key.path.lower().startswith(watched):
-                if any((w + '\\').startswith(key.path.lower() + '\\') for w in watched):
+        watched = [f'{key}\\'.lower() for key in self.world.WATCHED]
+        for low, key in registry.keys.items():
+            if not f'{low}\\'.startswith(tuple(watched)):
+                if any(one.startswith(f'{low}\\') for one in watched):
                     continue  # a parent that every machine has
                 raise WorldError(f'not watched under Wine: {key.path}')
             self.agent.ask(f'key {key.path}')
-            for value in key.values.values():
-                name = value.name.encode('cp1252').hex() or '-'
-                self.agent.ask(f'value {value.type} {name} {value.data.hex() or "-"}')
+            for name, kind, data in key.values.values():
+                name = name.encode(self.codepage).hex()
+                self.agent.ask(f'value {kind} {name or "-"} {data.hex() or "-"}')
 
     def add_drive(self, letter):
-        (self.world.prefix / f'drive_{letter}').mkdir(exist_ok=True)
-        link = self.world.prefix / 'dosdevices' / f'{letter}:'
+        drive = f'drive_{letter.lower()}'
+        (self.world.prefix / drive).mkdir(exist_ok=True)
+        link = self.world.prefix / 'dosdevices' / f'{letter.lower()}:'
         if not link.is_symlink():
-            link.symlink_to(f'../drive_{letter}')
+            link.symlink_to(f'../{drive}')
 
-    def run(self, program, arguments):
+    def _run(self, program, arguments, has_user):
         """A user's script is played by tools/windows/dialog_driver.cpp, which writes what is shown."""
-        if not self.take_user():
-            code, rest = _split_exit_code(self.agent.ask(f'run {TIME_LIMIT} {program}\t{arguments}'))
+        if not has_user:
+            code, rest = _split_exit_code(self.agent.run(program, arguments))
             return Outcome(code, [], ' '.join(rest))
         shown = Path(f'{self.world.prefix}.shown')
         shown.write_bytes(b'')
         driver, script, output = (_windows_path(p) for p in (self.world.driver, self.script, shown))
-        answer = self.agent.ask(f'run {TIME_LIMIT} {driver}\t{script} {output} "{program}" {arguments}')
-        code, lines = _split_exit_code(shown.read_bytes().decode('utf-8', 'replace').splitlines())
+        answer = self.agent.run(driver, f'{script} {output} "{program}" {arguments}')
+        code, lines = _split_exit_code(shown.read_text(encoding='utf-8', errors='replace').splitlines())
         trouble = '' if code is not None else f'the driver gave no exit code: {" ".join(answer)}'
         return Outcome(code, lines, trouble)
 
     def restart(self):
         # Only what a start does with one-time commands; the session and the agent stay.
-        _call([self.world.tool, 'run', self.world.prefix, 'wineboot', '-r'])
+        _call(self.world.tool, 'run', self.world.prefix, 'wineboot', '-r')
 
     def keep(self):
         self.discard()
         return ''
 
     def discard(self):
-        self.world.clean_files()
-        self.set_registry(self.fresh_registry)
+        """Takes away what a scenario left; the first one finds the prefix as made."""
+        listing = self.world.prefix / 'fresh-files'
+        if not listing.exists():
+            listing.write_text('\n'.join(self.files.snapshot()), encoding='utf-8')
+        fresh = set(listing.read_text(encoding='utf-8').split('\n'))
+        for path in sorted(self.files.snapshot().keys() - fresh):
+            self.files.delete(path)
+        for drive in self.world.prefix.glob('drive_[!c]'):
+            drive.rmdir()
+            (self.world.prefix / 'dosdevices' / f'{drive.name[-1]}:').unlink(missing_ok=True)
+        self.set_registry(self.world.fresh_registry)
 
 
 def _windows_path(path):
     """Drive Z: of a prefix is the whole host."""
-    return 'Z:' + str(Path(path).resolve()).replace('/', '\\')
-
-
-def _add_dumped_value(key, text):
-    kind, name, data = text.split(' ')
-    name, data = (bytes.fromhex('' if part == '-' else part) for part in (name, data))
-    name = name.decode('cp1252', 'replace')
-    key.values[name.lower()] = Value(name, int(kind), data)
+    return 'Z:' + str(path.resolve()).replace('/', '\\')
 
 
 class Agent:
@@ -310,6 +310,14 @@ class Agent:
         with open(error_log, 'wb') as errors:
             self.process = subprocess.Popen(command, stdin=subprocess.PIPE, stdout=subprocess.PIPE,
                                             stderr=errors)
+
+    def run(self, program, arguments):
+        """A busy host refuses to start a program now and then, with an internal error."""
+        for _ in range(3):
+            answer = self.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
+            if answer != ['cannot start: 1359']:
+                break
+        return answer
 
     def ask(self, command):
         """Sends one command; gives the lines of its answer."""
@@ -337,7 +345,7 @@ def require(*products):
             raise WorldError(f'{product} is missing; run "make" first')
 
 
-def _call(command):
+def _call(*command):
     done = subprocess.run(command, capture_output=True, text=True, timeout=10 * TIME_LIMIT)
     if done.returncode != 0:
         raise WorldError(f'{command[0]}: {(done.stderr or done.stdout).strip()}')

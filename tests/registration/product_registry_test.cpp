@@ -213,6 +213,7 @@ TEST_F(ProductRegistry, IsReadWithoutTheRightToWrite) {
 
 TEST_F(ProductRegistry, ServicesAreToldAsFarAsTheirNamesFitAndEachBlocksARemoval) {
   char names[520] = "as it was";
+  EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 1);
   MakeRegistryKey(kServices + "\\Sky");
   MakeRegistryKey(kServices + "\\A");
   EXPECT_EQ(CheckDependingServices(nullptr, 0) + CheckDependingServices(names, 5), 0);
@@ -222,6 +223,22 @@ TEST_F(ProductRegistry, ServicesAreToldAsFarAsTheirNamesFitAndEachBlocksARemoval
   for (char c = 'a'; c < 'k'; ++c) MakeRegistryKey(kServices + "\\" + std::string(63, c));
   EXPECT_EQ(CheckDependingServices(names, sizeof(names)), 0);
   EXPECT_EQ(std::string(names).size(), 6u + 8 * 63 + 7) << "ends with the last whole one";
+}
+
+TEST_F(ProductRegistry, WhatCanNotBeDeletedIsRefused) {
+  for (const int call : {1, 2}) {
+    FailCall("RegDeleteKeyA", call);
+    EXPECT_EQ(ProductDeleteTree(nullptr), -1) << call;
+  }
+}
+
+TEST_F(ProductRegistry, AProductIsRegisteredWithADirectoryHoweverShort) {
+  for (const char* directory : {"", "a"}) {
+    ASSERT_TRUE(CopyText(context.installDir, directory));
+    EXPECT_EQ(RegisterProduct(&context), *directory != '\0' ? StatusOk : StatusNotRegistered);
+    EXPECT_EQ(Get(1), *directory != '\0' ? "a" : "null, ");
+  }
+  EXPECT_EQ(RegisterProduct(nullptr), StatusNotRegistered);
 }
 
 TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {

@@ -1,6 +1,8 @@
 // What an install leaves for the product's removal, and a removal for the system's next start.
 #include "registration/removal_program.h"
 
+#include <algorithm>
+
 #include "engine/install_pass.h"
 #include "registration/uninstall_entries.h"
 #include "tests/support/product_test.h"
@@ -51,6 +53,14 @@ TEST_F(RemovalProgram, FailuresLeaveNoPartOfIt) {
     EXPECT_EQ(WriteRemovalProgram(&context, nullptr, 0), status) << faults[0].function;
     EXPECT_FALSE(pc.Has(kProgram)) << faults[0].function;
   }
+  FailNothing();
+  Results results;
+  for (int call = 1; call <= 8; ++call) {
+    FailAllocation(call);
+    results.push_back(WriteRemovalProgram(&context, nullptr, 0));
+  }
+  (void)WithdrawAllocationFailure();
+  EXPECT_EQ(std::ranges::count(results, StatusNoMemory), 1);
 }
 
 using UninstallEntries = ProductTest;
@@ -63,6 +73,7 @@ TEST_F(UninstallEntries, AreStoredWithTheirNulAndFitOrAreLeftOut) {
   EXPECT_EQ(GetRegistryBytes(kCurrentVersion + "Uninstall\\Moriv", "UninstallString"),
             std::string("C:\\windows\\MorivRmv.exe", 24));
   EXPECT_EQ(CancelRunOnceCommand(), 0) << "there is none";
+  EXPECT_EQ(ScheduleFinalCleanup() + CancelRunOnceCommand(), 2);
   // Around the path the command has 79 characters of its 519.
   for (const size_t length : {size_t{440}, size_t{441}}) {
     EXPECT_EQ(WriteRunOnceCommand(std::string(length, 'p').c_str()), length == 440) << length;

@@ -54,7 +54,7 @@ std::string DescribeRow(UINT id) {
   return line + "|\n";
 }
 
-TEST(Catalog, HasItsRowsToTheLetterInEverySetAndNoOthers) {
+TEST(Catalog, HasItsRowsInEverySetAndNoOthers) {
   const TestMachine pc;
   std::string rows;
   for (UINT id = 0; id < kFrench; ++id) rows += DescribeRow(id);

@@ -18,28 +18,22 @@ void* liveBlocks[kMostBlocks];
 int liveCount = 0;
 
 bool IsFailingCall() {
-  if (callsToFailure == 0) return false;
-  if (callsToFailure > 1) {
-    --callsToFailure;
-    return false;
-  }
+  if (callsToFailure == 0 || --callsToFailure > 0) return false;
   hasFailed = true;
-  if (!failsFromThenOn) callsToFailure = 0;
+  callsToFailure = failsFromThenOn ? 1 : 0;
   if (failureObserver) failureObserver();
   return true;
-}
-
-void* AllocateCounted(std::size_t size) {
-  if (IsFailingCall() || liveCount == kMostBlocks) return nullptr;
-  void* const block = std::malloc(size != 0 ? size : 1);
-  if (block != nullptr) liveBlocks[liveCount++] = block;
-  return block;
 }
 
 void* Allocate(std::size_t size) {
   void* const block = std::malloc(size != 0 ? size : 1);
   if (block == nullptr) throw std::bad_alloc();
   return block;
+}
+
+void* AllocateCounted(std::size_t size) {
+  if (IsFailingCall() || liveCount == kMostBlocks) return nullptr;
+  return liveBlocks[liveCount++] = Allocate(size);
 }
 
 void Free(void* block) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <cstdio>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -11,7 +12,6 @@ class ByteBuilder {
  public:
   ByteBuilder& U16(uint64_t number) { return Number(number, 2); }
   ByteBuilder& U32(uint64_t number) { return Number(number, 4); }
-  ByteBuilder& U64(uint64_t number) { return Number(number, 8); }
   ByteBuilder& Append(std::string_view bytes) {
     bytes_ += bytes;
     return *this;
@@ -32,9 +32,8 @@ class ByteBuilder {
 
  private:
   ByteBuilder& Number(uint64_t number, int width) {
-    for (int byte = 0; byte < width; ++byte) {
-      bytes_ += static_cast<char>(static_cast<uint8_t>(number >> (8 * byte)));
-    }
+    for (int byte = 0; byte < width; ++byte)
+      bytes_ += static_cast<char>(number >> (8 * byte) & 255);
     return *this;
   }
 
@@ -61,11 +60,8 @@ inline std::string VersionResource(const std::vector<std::pair<std::string, std:
     const std::string wide = ByteBuilder().Wide(text).U16(0).bytes();
     blocks.push_back(VersionBlock(key, true, text.size() + 1, wide, {}));
   }
-  constexpr char kDigits[] = "0123456789abcdef";
-  std::string name;
-  for (const uint16_t part : {language, codePage}) {
-    for (int shift = 12; shift >= 0; shift -= 4) name += kDigits[part >> shift & 15];
-  }
+  char name[9];
+  std::snprintf(name, sizeof(name), "%04x%04x", unsigned{language}, unsigned{codePage});
   std::vector<std::string> children = {
       VersionBlock("StringFileInfo", true, 0, "", {VersionBlock(name, true, 0, "", blocks)})};
   if (translation) {
@@ -75,25 +71,6 @@ inline std::string VersionResource(const std::vector<std::pair<std::string, std:
   }
   const std::string fixed = ByteBuilder().U32(0xFEEF04BD).PadTo(52).bytes();
   return VersionBlock("VS_VERSION_INFO", false, fixed.size(), fixed, children);
-}
-
-struct Resource {
-  uint16_t type;
-  uint16_t id;
-  uint16_t language;
-  std::string data;
-};
-
-// The bytes of a .res file.
-inline std::string ResourceFile(const std::vector<Resource>& resources) {
-  ByteBuilder file;
-  file.U32(0).U32(32).U16(0xFFFF).U16(0).U16(0xFFFF).U16(0).PadTo(32);
-  for (const Resource& resource : resources) {
-    file.U32(resource.data.size()).U32(32);
-    file.U16(0xFFFF).U16(resource.type).U16(0xFFFF).U16(resource.id);
-    file.U32(0).U16(0).U16(resource.language).U32(0).U32(0).Append(resource.data).Align();
-  }
-  return file.bytes();
 }
 
 // A Windows program of headers and one section, which holds the resources of one type and id in
@@ -115,9 +92,8 @@ inline std::string PortableExecutable(
   section.PadTo(12).U16(0).U16(1).U32(type).U32(kDirectory | 24);
   section.PadTo(24 + 12).U16(0).U16(1).U32(id).U32(kDirectory | 48);
   section.PadTo(48 + 12).U16(0).U16(count);
-  for (size_t index = 0; index < count; ++index) {
+  for (size_t index = 0; index < count; ++index)
     section.U32(languages[index].first).U32(leaves + 16 * index);
-  }
   uint64_t data = leaves + 16 * count;
   for (const auto& [language, bytes] : languages) {
     section.U32(kAddress + data).U32(bytes.size()).U32(0).U32(0);
@@ -137,23 +113,4 @@ inline std::string PortableExecutable(
   file.PadTo(optional + optionalSize).Append(".rsrc").PadTo(optional + optionalSize + 8);
   file.U32(section.bytes().size()).U32(kAddress).U32(section.bytes().size()).U32(kPosition);
   return file.PadTo(kPosition).Append(section.bytes()).bytes();
-}
-
-// A native program: ELF header, the section names, the section, the section headers.
-inline std::string NativeExecutable(std::string_view sectionName, std::string_view section) {
-  ByteBuilder names;
-  names.PadTo(1).Append(sectionName).Append(std::string_view("\0", 1));
-  const uint64_t sectionAt = 64 + names.bytes().size();
-  const uint64_t headersAt = sectionAt + section.size();
-  ByteBuilder file;
-  file.Append("\x7F").Append("ELF").Append("\x02\x01\x01").PadTo(40).U64(headersAt);
-  file.PadTo(58).U16(64).U16(3).U16(2).Append(names.bytes()).Append(section);
-  const auto header = [&](uint64_t name, uint64_t offset, uint64_t size) {
-    const size_t start = file.bytes().size();
-    file.U32(name).U32(1).PadTo(start + 24).U64(offset).U64(size).PadTo(start + 64);
-  };
-  header(0, 0, 0);
-  header(1, sectionAt, section.size());
-  header(0, 64, names.bytes().size());
-  return file.bytes();
 }

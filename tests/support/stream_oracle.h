@@ -32,10 +32,3 @@ class StreamOracle {
     return count;
   }};
 };
-
-// What a whole stream expands to; "!" behind it when it is bad.
-inline std::string ExpandByOracle(std::string_view stream) {
-  StreamOracle oracle;
-  oracle.Take(stream);
-  return oracle.output + (oracle.failed() ? "!" : "");
-}

@@ -17,14 +17,8 @@ inline constexpr uint32_t kOwnerDrawnList = 0x13;      // CBS_DROPDOWNLIST | CBS
 
 inline machine::TemplateItem Control(const char* className, uint16_t id,
                                      uint32_t style = kShownControl, const char* text = "") {
-  machine::TemplateItem control;
-  control.className = className;
-  control.id = id;
-  control.style = style;
-  control.text = text;
-  control.width = 40;
-  control.height = 16;
-  return control;
+  return {
+      .style = style, .width = 40, .height = 16, .id = id, .className = className, .text = text};
 }
 
 class DialogTest : public testing::Test {

@@ -12,6 +12,13 @@
 
 #include "machine/machine.h"
 
+// Of a file of the host; empty when there is none.
+inline std::string FileBytes(const std::filesystem::path& file) {
+  std::ostringstream bytes;
+  bytes << std::ifstream(file, std::ios::binary).rdbuf();
+  return bytes.str();
+}
+
 class TemporaryFolder {
  public:
   TemporaryFolder() {
@@ -35,12 +42,7 @@ class TemporaryFolder {
     std::ofstream(Host(path), std::ios::binary) << bytes;
   }
 
-  std::string Read(const std::string& path) const {
-    std::ostringstream bytes;
-    bytes << std::ifstream(Host(path), std::ios::binary).rdbuf();
-    return bytes.str();
-  }
-
+  std::string Read(const std::string& path) const { return FileBytes(Host(path)); }
   bool Has(const std::string& path) const { return std::filesystem::exists(Host(path)); }
 
  private:

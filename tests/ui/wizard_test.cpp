@@ -1,17 +1,15 @@
-// The dialog: its resources, the way from a catalog id to a text, and what whole runs of it leave.
+// The dialog: its resources, the way from a catalog id to a text, and runs that no package reaches.
 #include "ui/wizard.h"
 
 #include <cstdio>
 
-#include "core/driver.h"
 #include "machine/dialog_template.h"
 #include "machine/executable_resources.h"
-#include "machine/owner_drawing.h"
 #include "machine/scripted_user.h"
-#include "machine/windows.h"
 #include "tests/support/product_test.h"
-#include "tests/support/test_image.h"
 #include "ui/catalog.h"
+#include "ui/control_ids.h"
+#include "ui/dialog_look.h"
 #include "ui/side_commands.h"
 
 namespace {
@@ -25,7 +23,7 @@ std::string Describe(const machine::TemplateItem& item) {
   return line;
 }
 
-TEST(DialogResource, IsTheTemplateToTheLetter) {
+TEST(DialogResource, HasItsControlsInTheirPlaces) {
   const auto bytes = machine::OwnResource(5, 116);
   ASSERT_TRUE(bytes);
   const auto dialog = machine::ReadDialogTemplate(*bytes);
@@ -50,12 +48,10 @@ TEST(DialogResource, IsTheTemplateToTheLetter) {
 65535 Static 50001007 49,148 259x1 ()
 921 Static 50020202 216,130 92x11 (0,0 Mo)
 )rows");
-  ;
   EXPECT_EQ(dialog->controls[1].pictureId, 118);
 }
 
-TEST(DialogResource, PicturesStandUnderTheirIdsInTheirSizes) {
-  const TestMachine pc;
+TEST(DialogResource, PicturesStandUnderTheirIdsAndTheProgramIsNoDebugBuild) {
   const std::pair<int, const char*> rows[] = {{118, "logo"},        {120, "flag_united_kingdom"},
                                               {121, "flag_france"}, {122, "flag_germany"},
                                               {123, "flag_italy"},  {124, "flag_spain"}};
@@ -65,11 +61,11 @@ TEST(DialogResource, PicturesStandUnderTheirIdsInTheirSizes) {
     std::ostringstream file;
     file << std::ifstream(std::string(MORIV_SOURCE_DIR "/src/resources/") + name + ".bmp").rdbuf();
     EXPECT_EQ(std::string(bytes->begin(), bytes->end()), file.str().substr(14)) << name;
-    // Width, height and bits for each pixel.
-    EXPECT_EQ((*bytes)[4], id == 118 ? 45 : 26) << id;
-    EXPECT_EQ((*bytes)[8], id == 118 ? 45 : 15) << id;
-    EXPECT_EQ((*bytes)[14], 8) << id;
   }
+  const auto version = machine::OwnResource(16, 1);
+  constexpr size_t kFlags = 40 + 28;  // behind the head of the block
+  ASSERT_TRUE(version && version->size() > kFlags);
+  EXPECT_EQ((*version)[kFlags], 0);
 }
 
 using CatalogLookup = ProductTest;
@@ -100,11 +96,30 @@ TEST_F(CatalogLookup, TextsAreCutToTheBufferAndRowsThatDoNotExistAreEmpty) {
     EXPECT_STREQ(buffer, text) << language << " + " << id << ", " << size;
   }
   LoadCatalogText(nullptr, CatalogCancel, nullptr, 500);
+  for (context.header.spaceNeeded = 0; context.header.spaceNeeded < 2;
+       ++context.header.spaceNeeded) {
+    EXPECT_EQ(ShowSpaceLine(nullptr, &context), StatusOk);
+  }
+  EXPECT_EQ(ShowSpaceLine(nullptr, nullptr), StatusInternal);
   // The system's primary language has 10 bits.
   machine::CurrentSettings().language = 0xFC07;
   EXPECT_EQ(SystemLanguage(), kLanguageGerman);
   machine::CurrentSettings().language = 0x0207;
   EXPECT_EQ(SystemLanguage(), kLanguageFrench);
+}
+
+using Wizard = ProductTest;
+
+TEST_F(Wizard, WithoutAContextItHasAFailurePageAndWithoutMemoryNoLanguages) {
+  machine::SetUser([] {
+    EXPECT_EQ(SendMessageA(GetDlgItem(wizardState.window, IDC_LANGUAGE), CB_GETCOUNT, 0, 0), 0);
+    PostMessageA(wizardState.window, WM_COMMAND, IDC_FAILURE_END, 0);
+  });
+  FailAllocation(2);
+  EXPECT_EQ(RunWizard(nullptr), StatusDialogAborted);
+  machine::ForgetUser();
+  FailCall("DialogBoxParamA");
+  EXPECT_EQ(RunWizard(&context), StatusDialogAborted);
 }
 
 TEST(SideCommands, CharactersAreReplacedOrDropped) {
