@@ -73,8 +73,8 @@ TEST_F(PackageReader, WithoutMemoryOrArgumentsThereIsNoPackageAndNoEvent) {
   }
   EXPECT_EQ(GetImagePath(path, kNeeded), StatusOk);
   EXPECT_STREQ(path, "C:\\setup.exe");
-  EXPECT_EQ(GetImagePath(path, kNeeded - 1), StatusOk) << "cut to its buffer";
-  EXPECT_STREQ(path, "C:\\setup.ex");
+  EXPECT_EQ(GetImagePath(path, kNeeded - 1), StatusNoModulePath) << "a cut path names another file";
+  EXPECT_STREQ(path, "");
 }
 
 }  // namespace
