@@ -1,5 +1,5 @@
-// The record of a run, from the command line to the exit code, and the operations that normalise it
-// before work starts. The driver owns one for the length of a run.
+// All that a run knows: what was asked for, the open package, what has happened; and the operations
+// that put the request in order. There is one, on the driver's stack.
 #pragma once
 
 #include <cstdint>

@@ -1,8 +1,7 @@
 // The two hooks between the passes and the user.
 //
-// The passes run alike in a dialog and in a silent run, and never ask which it is: they show
-// progress and poll for a stop. In a silent run no window exists; then the first does nothing and
-// the second answers 0.
+// A pass calls both wherever it goes on, and needn't know whether a dialog looks on. Without one
+// nothing is shown, and nobody can ask for a stop.
 #pragma once
 
 #include "core/context.h"

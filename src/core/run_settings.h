@@ -20,7 +20,8 @@ StatusCode FindInstalledProduct(SetupContext* context);
 StatusCode ChooseInstallDir(const SetupContext* context, char* directory, size_t size,
                             const char* defaultDirectory);
 
-// The catalog's default directory. Returns 1, or -1 for a null buffer or a text that doesn't fit.
+// The catalog's default directory, empty when the catalog can't be read. Returns 1; -1 when there
+// is no buffer or it is too small.
 int GetDefaultInstallDir(const SetupContext* context, char* buffer, size_t size);
 
 // Returns 1, also when the free space is unknown; StatusNoDiskSpace when the package needs more
@@ -40,7 +41,7 @@ uint32_t GetNeededSpace(SetupContext* context);
 // what stands behind the first ":" is tested, so that a relative path passes.
 int IsValidPath(char* path);
 
-// 1 when the character is in the set, 0 when not, -1 for a character 0 or a null or empty set.
+// Whether the set has the character: 1 or 0; -1 for a character 0 and for a null or empty set.
 int CharInSet(char character, const char* set);
 
 // Megabytes, cut to one decimal behind a comma in every language; a zero decimal isn't shown.

@@ -23,5 +23,5 @@ struct TargetList {
 // StatusBufferTooSmall for a text above 259 characters, StatusNoMemory; the list is unchanged then.
 StatusCode AddTarget(TargetList* list, const char* path, const char* directory);
 
-// Frees the entries and leaves the list empty.
+// Frees the entries; the list is empty afterwards.
 void FreeTargets(TargetList* list);

@@ -1,6 +1,5 @@
-// The removal program: a trimmed copy of the running image in the Windows directory. The same
-// executable and the same records, but no streams, and a flag in the header that turns every run of
-// the copy into a removal.
+// The removal program, which an install leaves in the Windows directory: the running image without
+// its streams, and marked in its header as one that removes.
 #pragma once
 
 #include <cstdint>

@@ -16,5 +16,5 @@ inline constexpr int IDC_BANNER = 910;
 inline constexpr int IDC_LINK = 911;  // web address, clickable
 inline constexpr int IDC_LANGUAGE = 917;
 inline constexpr int IDC_LANGUAGE_LABEL = 918;
-inline constexpr int IDC_DETAILS = 919;  // the middle button on the two end pages
+inline constexpr int IDC_DETAILS = 919;  // on an end page what was the middle button
 inline constexpr int IDC_SPACE = 921;

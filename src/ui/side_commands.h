@@ -11,7 +11,7 @@ void BrowseForDirectory(HWND dialog, SetupContext* context);
 // Starts the default browser with the maker's web address.
 void OpenWebAddress(HWND dialog, const SetupContext* context);
 
-// Opens the log with the program that the system has for it.
+// Opens the log in whatever shows such files to this user.
 void OpenLogFile(HWND dialog, const SetupContext* context);
 
 // The command line that the system registers for web addresses. Returns 1, or 0 when there is none,

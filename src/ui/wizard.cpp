@@ -1,9 +1,8 @@
 // The dialog's messages and commands, and where each leads.
 //
-// The work moves forward through private messages that the dialog posts to itself: a step does one
-// thing, posts the message of the next and gives control back, and between two of them the window
-// paints. A pass runs inside its step and dispatches waiting messages one at a time (PollCancel),
-// so a command can arrive in the middle of one: OnCommand decides which then count.
+// A run is a chain of messages: each has one step, which ends by posting the next, so that the
+// window paints in between. A pass is one long step, and lets waiting messages through at each poll
+// (PollCancel). So a command can arrive in the middle of it: OnCommand decides which then count.
 #include "ui/wizard.h"
 
 #include <type_traits>

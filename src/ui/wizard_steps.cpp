@@ -96,7 +96,7 @@ int SetUpRemovalPage(SetupContext* context) {
   return IDCANCEL;
 }
 
-// From here on, whether a control bears IDC_UPDATE tells an update from a fresh install.
+// The id that a button gets here is what later steps know an update by (Exists).
 int SetUpUpdatePage(SetupContext* context, bool isFree) {
   Renumber(IDC_NEXT, IDC_UPDATE);
   SetText(IDC_UPDATE, CatalogUpdate, *context);
