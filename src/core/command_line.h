@@ -1,8 +1,8 @@
 // The command line: options behind "/" or "-".
 //
-// "/" is the stronger marker: as long as a "/" lies ahead, every "-" is plain text of the current
-// option. Blanks don't separate options and quotes mean nothing, so that a path with blanks needs
-// no quotes. What isn't recognised is dropped in silence.
+// A "-" marks an option only behind the last "/" of the line; in front of it hyphens are text. Nor
+// do blanks end an option, and a quote is a character like any other: a path with blanks needs
+// none. What isn't recognised is dropped in silence.
 #pragma once
 
 #include "core/context.h"

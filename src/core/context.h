@@ -58,5 +58,5 @@ StatusCode ApplyDefaultOptions(uint32_t* options);
 // Any value but the five language offsets becomes kLanguageNone.
 StatusCode ValidateLanguage(int32_t* language);
 
-// A removal program removes, whatever its command line said. Needs the header.
+// Makes the run of a removal program a removal. Needs the header.
 StatusCode ApplyImageKind(SetupContext* context);

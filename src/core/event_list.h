@@ -62,7 +62,7 @@ struct EventEntry {
   char text[kEventTextSize];  // detail, a path or the like; may be empty
 };
 
-// A counted array. `entries` is owned by the list, null while it is empty.
+// A counted array, which the list owns; an empty list has none (null).
 struct EventList {
   int32_t count;
   EventEntry* entries;
@@ -72,7 +72,7 @@ struct EventList {
 StatusCode InitEventList(EventList* list);
 
 // Appends one entry. `text` may be null; a text of 520 bytes or more is cut to 519. Returns 1,
-// StatusBadArgument for a null list, or StatusNoMemory with the list unchanged. Nobody looks at
+// or without a new entry StatusBadArgument for a null list or StatusNoMemory. Nobody looks at
 // the result: for want of an event no work is given up.
 StatusCode AddEvent(EventList* list, uint32_t code, uint32_t severity, const char* text);
 

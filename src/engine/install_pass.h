@@ -8,9 +8,9 @@
 
 // The pass. Needs an open package, a settled installDir and null records; called once a run. Leaves
 // all records in context->records, which the removal program is written from.
-// Returns 1 when all is done. The operation that gives up adds a fatal event; a missing argument, a
-// stop by the user before a record and a stored size of 0 add none. StatusSeekFailed, and
-// StatusNoMemory for the records, leave the package closed.
+// Returns 1 when all is done. Else a fatal event has been added, but for a missing argument, a stop
+// by the user before a record and a stored size of 0. StatusSeekFailed, and StatusNoMemory for the
+// records, leave the package closed.
 StatusCode InstallFiles(SetupContext* context);
 
 // Writes all targets of one record. The package file stands at the record's stream, and after

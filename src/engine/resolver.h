@@ -50,8 +50,8 @@ StatusCode ResolveTargets(SetupContext* context, TargetList* list, const char* b
 StatusCode ResolveElement(char* path, size_t pathSize, char* directory, size_t directorySize,
                           const char* baseDirectory, const FileRecord* record);
 
-// The code and, through `length`, the length of the macro that the text begins with. A missing text
-// gives MacroNone and leaves the length alone.
+// The code and, through `length`, the length of the macro that the text begins with: MacroNone and
+// 0 when it begins with none. For a null text only the code is given.
 MacroCode ClassifyMacro(const char* text, size_t* length);
 
 // 0 for a text with a ':' in it, else 1, also for null.

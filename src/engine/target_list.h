@@ -12,8 +12,8 @@ struct TargetEntry {
                               // and for an absolute directory
 };
 
-// A counted array in the order of the destination's elements. `entries` is owned by the holder of
-// the list, null while it is empty.
+// A counted array in the order of the destination's elements. An empty list has none (null);
+// whoever has the list frees it.
 struct TargetList {
   int32_t count;
   TargetEntry* entries;

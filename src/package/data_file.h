@@ -4,8 +4,7 @@
 // a descriptor of the C runtime that shares it with everybody comes in its place. The 9x family
 // reads a running image only so. Positions and sizes have 32 bits.
 //
-// The class knows nothing of events and status codes: every operation answers a plain count or a
-// truth value (1 or 0).
+// Operations answer a count, or 1 and 0; what a failure means to a run is for their callers to say.
 #pragma once
 
 #include <cstdint>

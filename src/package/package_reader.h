@@ -9,7 +9,7 @@
 
 // Opens the image and fills context->header. The event list begins anew, and is not freed before:
 // it has to be empty, and the package closed.
-// Returns 1 with packageFile open, or with packageFile null: StatusBadPackage (also for a null
+// Returns 1 and leaves packageFile open. Else it is null: StatusBadPackage (also for a null
 // context), StatusOpenFailed, StatusInternal, StatusNoMemory. Adds one fatal event for each failure
 // but a null context and StatusNoMemory.
 StatusCode OpenPackage(SetupContext* context);

@@ -1,4 +1,4 @@
-// The library of the product's registry tree, under HKEY_LOCAL_MACHINE:
+// Access to all that Moriv keeps in the registry, in one tree under HKEY_LOCAL_MACHINE:
 //
 //   SOFTWARE\Zeb\Moriv                                          items 1 to 3
 //   SOFTWARE\Zeb\Moriv\Services                                 one subkey per service
@@ -71,8 +71,8 @@ int32_t ProductSetItem(int32_t item, const char* service, const char* subKey, co
 
 // Keys
 
-// 1 if the key opens for reading, 0 if not. A null service tests the root, a null subKey the
-// service.
+// Whether the key can be read: 1 or 0. It is the service's, or with a subKey the one below it; for
+// a null service the root.
 int32_t ProductKeyExists(const char* service, int32_t kind, const char* subKey);
 int32_t ProductRootExists(const char* service);
 

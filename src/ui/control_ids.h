@@ -1,5 +1,5 @@
-// Control ids of the dialog. They are part of its state: a button keeps its place on the screen and
-// changes its id. IDOK (1) and IDCANCEL (2) take part too.
+// Control ids of the dialog. They change with its state: the same button bears one id after the
+// other, IDOK (1) and IDCANCEL (2) among them.
 #pragma once
 
 #include "core/hooks.h"

@@ -8,7 +8,8 @@
 // Lets the user pick the installation directory with the system's folder picker.
 void BrowseForDirectory(HWND dialog, SetupContext* context);
 
-// Starts the default browser with the maker's web address.
+// Starts the command that this user's registry has for web addresses, with the maker's and with the
+// rights of the program.
 void OpenWebAddress(HWND dialog, const SetupContext* context);
 
 // Opens the log in whatever shows such files to this user.

@@ -1,7 +1,7 @@
 // The flow of the dialog, in the order of a run.
 //
-// There are no pages in the usual sense: one set of controls, which each phase of the run shows,
-// hides, relabels and renumbers.
+// A page is no window of its own: all pages share the controls, and each sets visibility, text and
+// id of those that it uses.
 #include "ui/wizard_steps.h"
 
 #include <initializer_list>
@@ -357,7 +357,7 @@ void AskCancel(SetupContext* context) {
                   MB_YESNO | MB_ICONQUESTION | MB_DEFBUTTON2) == IDNO) {
     return;
   }
-  // Read again: the box's own loop can have run further steps.
+  // Asked only now: behind the question the chain of steps went on.
   if (wizardState.busy == BusyWorking) {
     wizardState.cancelRequested = 1;
   } else {
