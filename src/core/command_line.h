@@ -13,8 +13,8 @@
 const char* SkipProgramName(const char* commandLine);
 
 // Applies each option of the line to the request, from left to right. An option text of 260
-// characters or more has no effect: half a path is worse than none. Returns 1, or
-// 0 for a null argument and for a line without a marker.
+// characters or more has no effect: half a path is worse than none. Returns 1, or 0
+// for a null argument and for a line without a marker.
 int ParseCommandLine(const char* line, SetupRequest* request);
 
 // Applies one option text, without its marker. Does nothing for a null or empty text or a null

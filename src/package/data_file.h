@@ -25,7 +25,7 @@ class DataFile {
   int OpenForWrite();  // the file has to exist
   int Create();        // for reading and writing; an existing file is cut to nothing
 
-  // Bytes moved. 0 when the operation fails, nothing is open or nothing is asked for.
+  // Bytes moved. 0 when that fails, nothing is open, or there is no buffer or nothing to move.
   uint32_t Read(void* buffer, uint32_t count);
   uint32_t Write(const void* buffer, uint32_t count);
 

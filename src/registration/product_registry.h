@@ -13,7 +13,7 @@
 // Limits in characters: service names 3 to 63, key paths 127, values that are read 510.
 // Deletions alone want 1 to 63 characters of a profile or application name: elsewhere the path is
 // its limit, and an empty name is the key that all of its kind lie in. Results: 1 for success; -1
-// for what no registry can answer (a refused item, a bad name or kind, a path too long, a null); 0
+// for what no registry can answer (a refused item, a bad name or kind, a path too long); 0
 // for a key or value that is missing or refused.
 // Each call opens and closes its keys; nothing is kept between calls.
 #pragma once
@@ -52,8 +52,8 @@ struct KeyNameNode {
 
 // Items
 
-// The core of all item operations. A null service selects the root, a null subKey the service's own
-// key. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; a
+// The core of all item operations. Its key is the service's own, with a subKey one below it,
+// without a service the root. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; a
 // text that fills it has no NUL. 2 writes `size` bytes from the buffer; the key must exist. Both
 // give -1 for a null buffer or a negative size. 3 deletes the value; -1 when the registry refuses.
 int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const char* subKey,

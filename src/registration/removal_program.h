@@ -16,8 +16,7 @@ bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]);
 // Writes it, in place of an earlier one. Needs packageFile, and records as an install pass leaves
 // them; changes records and header in memory into those of the removal program.
 //   path  where its full path goes, also for a failure behind that point; may be null. One that
-//   doesn't fit in `size`
-//         bytes leaves the buffer alone.
+//         doesn't fit in `size` bytes leaves the buffer alone.
 // Returns 1, or: StatusBadArgument; StatusBadRecord when the running image has no path or no
 // version resource with a translation and a file version; StatusDeleteFailed for an earlier one
 // that can't go; StatusOpenFailed, StatusNoMemory, StatusCreateFileFailed;

@@ -129,9 +129,9 @@ constexpr MessageRow kMessages[] = {
     {WM_SET_LANGUAGE, OnStep<SetLanguage>},
 };
 
-// Answers 0 to every message of the system's, handled or not; to WM_INITDIALOG: the system
-// then sets no focus, which the page does. The program's own are handled whole: two of them have
-// numbers that the system would act on.
+// Answers 0 to every message of the system's, handled or not. After WM_INITDIALOG the system then
+// sets no focus: the page does. The program's own are handled whole: two of them have numbers that
+// the system would act on.
 INT_PTR CALLBACK DialogProcedure(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
   // DM_SETDEFID has the number of WM_STEP_LOAD; a step carries 0, and no control has that id.
   if (message == DM_SETDEFID && wParam != 0) return FALSE;
