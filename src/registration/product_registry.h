@@ -53,9 +53,10 @@ struct KeyNameNode {
 // Items
 
 // The core of all item operations. Its key is the service's own, with a subKey one below it,
-// without a service the root. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; a
-// text that fills it has no NUL. 2 writes `size` bytes from the buffer; the key must exist. Both
-// give -1 for a null buffer or a negative size. 3 deletes the value; -1 when the registry refuses.
+// without a service the root. Operation 1 reads into the buffer, of `size` bytes: 1 only for a
+// REG_SZ value that fits; a text that fills it has no NUL. 2 writes `size` bytes from the buffer;
+// the key must exist. Both give -1 for a null buffer or a negative size. 3 deletes the value; -1
+// when the registry refuses.
 int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const char* subKey,
                           char* buffer, int32_t size, int32_t operation);
 
