@@ -34,9 +34,8 @@ constexpr RunOutcome kOutcomes[] = {
     {StatusWriteRemovalFailed, "StatusWriteRemovalFailed", "The removal program can't be written.",
      "See to it that the Windows directory can be written, and run it again."},
     {StatusInternal, "StatusInternal",
-     "A record without a stream in a setup image, or a target path of fewer than 4 characters; in "
-     "a "
-     "dialog also no path of the program, or no package for an update.",
+     "A record without a stream in a setup image, or a target path of fewer than 4 characters. "
+     "A dialog also: the program's path can't be had, or an update has no package.",
      kGetAnew},
     {StatusCreateDirFailed, "StatusCreateDirFailed", "A directory of a target path can't be made.",
      "See to it that the drive can be written and that no file bears the name of a directory in "
