@@ -36,7 +36,7 @@ using Content = std::vector<uint8_t>;
 
 std::vector<Decoder> Decoders() {
   std::vector<Decoder> decoders = {{"expander", ".pkz", DecodeByExpander},
-                                   {"letter", ".pkz", DecodeByLetter}};
+                                   {"plain", ".pkz", DecodePlainly}};
   for (const Decoder& peer : PeerDecoders()) decoders.push_back(peer);
   return decoders;
 }

@@ -44,7 +44,7 @@ struct Decoder {
 // The program's expander, in blocks of 1024 bytes as an install reads them.
 bool DecodeByExpander(Bytes stream, Output* output);
 // A plain decoder, step by step as the format is described.
-bool DecodeByLetter(Bytes stream, Output* output);
+bool DecodePlainly(Bytes stream, Output* output);
 
 // Bytes of the heap that one expander takes for itself and its tables; 0 where the C library can't
 // tell.

@@ -8,7 +8,7 @@ from goals import Figure
 from results import Table
 from timed_runs import output_of, pinned, text_of
 
-DECODERS = {'expander': 'the expander', 'letter': 'plain decoder',
+DECODERS = {'expander': 'the expander', 'plain': 'plain decoder',
             'libarchive': 'libarchive, `.Z`', 'zlib': 'zlib inflate, 64 KB buffers'}
 HEADS = ['Decoder', 'Corpus', 'MB/s', "Time / the expander's"]
 PROGRAM = BUILD / 'decode_bench'
@@ -39,7 +39,7 @@ def measure_decoding_under_wine(corpora, rounds, wine, results):
         command = wine.command(wine.build / 'decode_bench.exe', corpus.folder, corpus.streams,
                                rounds)
         seconds = _time_decoders(command, corpus, table)
-        results.figures[keys[corpus.name]] = Figure(seconds['letter'] / seconds['expander'],
+        results.figures[keys[corpus.name]] = Figure(seconds['plain'] / seconds['expander'],
                                                     table.title)
     results.tables.append(table)
 
@@ -53,7 +53,7 @@ def measure_instructions(corpus, results):
                   f'{largest.name}, {size:,} bytes.',
                   ['Decoder', 'Million instructions', 'Instructions a byte'], [], [])
     counts = {}
-    for decoder in ('expander', 'letter'):
+    for decoder in ('expander', 'plain'):
         command = ['valgrind', '--tool=callgrind', '--callgrind-out-file=/dev/null',
                    '--toggle-collect=DecodeOnce', PROGRAM, 'once', decoder, stream]
         counts[decoder] = int(re.search(r'Collected : (\d+)',
@@ -61,7 +61,7 @@ def measure_instructions(corpus, results):
         table.commands.append(text_of(command))
         table.rows.append([DECODERS[decoder], f'{counts[decoder] / 1e6:.1f}',
                            f'{counts[decoder] / size:.1f}'])
-    results.figures['instructions'] = Figure(counts['expander'] / counts['letter'], table.title)
+    results.figures['instructions'] = Figure(counts['expander'] / counts['plain'], table.title)
     results.tables.append(table)
 
 

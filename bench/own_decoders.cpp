@@ -61,7 +61,7 @@ bool DecodeByExpander(Bytes stream, Output* output) {
   return DecodeInBlocks<CountingExpander>(stream, output);
 }
 
-bool DecodeByLetter(Bytes stream, Output* output) {
+bool DecodePlainly(Bytes stream, Output* output) {
   return DecodeInBlocks<CountingPlainExpander>(stream, output);
 }
 

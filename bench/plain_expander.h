@@ -17,7 +17,7 @@ class PlainExpander {
   int32_t failed() const { return failed_; }
   uint32_t bufferFill() const { return bufferFill_; }
 
-  // Takes the next block of the stream, the first one with the magic.
+  // Expands one block; the first begins with the magic.
   void ExpandBlock(const uint8_t* bytes, uint32_t count) {
     if (failed_ != 0) return;
     if (!magicSeen_) {

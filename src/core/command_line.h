@@ -1,8 +1,8 @@
 // The command line: options behind "/" or "-".
 //
-// "/" is the stronger marker: as long as a "/" lies ahead, every "-" is plain text of the current
-// option. Blanks don't separate options and quotes mean nothing, so that a path with blanks needs
-// no quotes. What isn't recognised is dropped in silence.
+// A "-" marks an option only behind the last "/" of the line; in front of it hyphens are text. Nor
+// do blanks end an option, and a quote is a character like any other: a path with blanks needs
+// none. What isn't recognised is dropped in silence.
 #pragma once
 
 #include "core/context.h"
@@ -13,8 +13,8 @@
 const char* SkipProgramName(const char* commandLine);
 
 // Applies each option of the line to the request, from left to right. An option text of 260
-// characters or more has no effect: half a path is worse than none. Returns 1 when the line was
-// walked, 0 when an argument is null or the line holds no marker.
+// characters or more has no effect: half a path is worse than none. Returns 1, or 0
+// for a null argument and for a line without a marker.
 int ParseCommandLine(const char* line, SetupRequest* request);
 
 // Applies one option text, without its marker. Does nothing for a null or empty text or a null

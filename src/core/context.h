@@ -1,5 +1,5 @@
-// The record of a run, from the command line to the exit code, and the operations that normalise it
-// before work starts. The driver owns one for the length of a run.
+// All that a run knows: what was asked for, the open package, what has happened; and the operations
+// that put the request in order. There is one, on the driver's stack.
 #pragma once
 
 #include <cstdint>
@@ -58,5 +58,5 @@ StatusCode ApplyDefaultOptions(uint32_t* options);
 // Any value but the five language offsets becomes kLanguageNone.
 StatusCode ValidateLanguage(int32_t* language);
 
-// A removal program removes, whatever its command line said. Needs the header.
+// Makes the run of a removal program a removal. Needs the header.
 StatusCode ApplyImageKind(SetupContext* context);

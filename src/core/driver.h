@@ -1,5 +1,5 @@
-// The spine of a run: decides the mode from the options and the package's header, and shows the
-// help, hands over to the dialog, or performs one of the two silent sequences.
+// A run as a whole: the help, the dialog, a silent install or a silent removal, by the options and
+// the kind of image.
 #pragma once
 
 #include "core/context.h"

@@ -1,4 +1,4 @@
-// The array grows by exactly one entry at each add, with a full copy: a run has few events.
+// Each event makes a new array, longer by one: a run has few events.
 #include "core/event_list.h"
 
 #include <cstring>

@@ -59,10 +59,10 @@ inline constexpr size_t kEventTextSize = 520;
 struct EventEntry {
   uint32_t code;
   uint32_t severity;
-  char text[kEventTextSize];  // detail, such as a path; empty when there is none
+  char text[kEventTextSize];  // detail, a path or the like; may be empty
 };
 
-// A counted array. `entries` is owned by the list, null while it is empty.
+// A counted array, which the list owns; an empty list has none (null).
 struct EventList {
   int32_t count;
   EventEntry* entries;
@@ -72,8 +72,8 @@ struct EventList {
 StatusCode InitEventList(EventList* list);
 
 // Appends one entry. `text` may be null; a text of 520 bytes or more is cut to 519. Returns 1,
-// StatusBadArgument for a null list, or StatusNoMemory with the list unchanged. Callers don't look
-// at the result: a failure to record never stops a sequence.
+// or without a new entry StatusBadArgument for a null list or StatusNoMemory. Nobody looks at
+// the result: for want of an event no work is given up.
 StatusCode AddEvent(EventList* list, uint32_t code, uint32_t severity, const char* text);
 
 // Add an information, or a warning.
@@ -83,6 +83,5 @@ void Warn(EventList* list, uint32_t code, const char* text = nullptr);
 // Adds the fatal event of an operation that gives up, and returns the status that it gives up with.
 StatusCode GiveUp(EventList* list, uint32_t code, const char* text, StatusCode status);
 
-// Frees the entries and leaves the list empty. An empty list is left alone. Returns 1, or
-// StatusBadArgument for a null list.
+// Frees the entries; the list is empty afterwards. Returns 1, or StatusBadArgument for a null list.
 StatusCode FreeEventList(EventList* list);

@@ -1,8 +1,7 @@
-// The two hooks between the passes and the user.
+// How a pass reaches the user.
 //
-// The passes run alike in a dialog and in a silent run, and never ask which it is: they show
-// progress and poll for a stop. In a silent run no window exists; then the first does nothing and
-// the second answers 0.
+// A pass calls both wherever it goes on, and needn't know whether a dialog looks on. Without one
+// nothing is shown, and nobody can ask for a stop.
 #pragma once
 
 #include "core/context.h"
@@ -10,11 +9,11 @@
 
 inline constexpr int IDC_MESSAGE = 901;  // the dialog's message area
 
-// The dialog's state, one for the process, zero at the start. Only the dialog changes it.
+// The state of the one dialog. Only the dialog changes it; in a silent run it stays all zero.
 struct WizardState {
   HWND window;               // null while no dialog exists
   uint32_t cancelRequested;  // 1: the user has confirmed a stop
-  uint32_t busy;             // phase of the dialog's run, a Busy value of ui/wizard.cpp
+  uint32_t busy;             // phase of the dialog's run, a Busy value of ui/wizard_steps.h
   SetupContext* context;     // not owned
 };
 extern WizardState wizardState;

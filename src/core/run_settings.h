@@ -1,5 +1,5 @@
-// What the silent sequences and the dialog settle before any file is touched: language, installed
-// product, directory, disk space.
+// What a run has to know before it begins to work, silent or not: language, installed product,
+// directory, disk space.
 #pragma once
 
 #include "core/context.h"
@@ -15,16 +15,17 @@ StatusCode ChooseLanguage(SetupContext* context);
 StatusCode FindInstalledProduct(SetupContext* context);
 
 // Makes the directory text valid, in place: itself, else the given default, which may be null and
-// is not tested, else the catalog's. Returns 1; StatusBadArgument for a null text or a size of 0;
+// is not tested, else the catalog's. Returns 1; StatusBadArgument without a buffer;
 // -1 when the catalog's default doesn't fit; StatusBadDirectory when it is no path.
 StatusCode ChooseInstallDir(const SetupContext* context, char* directory, size_t size,
                             const char* defaultDirectory);
 
-// The catalog's default directory. Returns 1, or -1 for a null buffer or a text that doesn't fit.
+// The catalog's default directory, empty when the catalog can't be read. Returns 1; -1 when there
+// is no buffer or it is too small.
 int GetDefaultInstallDir(const SetupContext* context, char* buffer, size_t size);
 
-// Returns 1, also when the free space is unknown; StatusNoDiskSpace when the package needs more
-// than is free on the drive of installDir; StatusBadArgument for a null context.
+// Whether the drive of installDir can take what the package needs: 1, as long as nothing is known
+// against it, or StatusNoDiskSpace. StatusBadArgument for a null context.
 StatusCode CheckDiskSpace(const SetupContext* context);
 
 // Free bytes, available to the caller, on the drive of the path. False when that is unknown, as for
@@ -40,7 +41,7 @@ uint32_t GetNeededSpace(SetupContext* context);
 // what stands behind the first ":" is tested, so that a relative path passes.
 int IsValidPath(char* path);
 
-// 1 when the character is in the set, 0 when not, -1 for a character 0 or a null or empty set.
+// Whether the set has the character: 1 or 0; -1 for a character 0 and for a null or empty set.
 int CharInSet(char character, const char* set);
 
 // Megabytes, cut to one decimal behind a comma in every language; a zero decimal isn't shown.

@@ -1,6 +1,6 @@
-// The result of nearly every operation: 1 for success, a negative code for an operation that
-// stopped, a code above 100000 for a soft failure, where the main work stands and something
-// secondary is missing. The exit code of a run is one of these. 0 is no status.
+// What nearly every operation returns: 1 for success; below 0 it gave up; above 100000 it has done
+// its work but for a part that can be missing. A run's exit code is one of these, or 0 after the
+// help, which is no status.
 #pragma once
 
 #include <cstdint>

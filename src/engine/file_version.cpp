@@ -50,7 +50,7 @@ class VersionData {
 constexpr char kSeparators[] = ".,- ";
 constexpr size_t kTokenSize = 16;
 
-// Decimal digits as far as they go, after white space and a sign; the low 16 bits of the number.
+// White space, a sign, and digits up to the first other character; the low 16 bits of the number.
 // 15 digits fit 64 bits.
 int16_t TokenValue(const char* token) {
   token += strspn(token, "\t\n\v\f\r");
@@ -102,7 +102,7 @@ void ReadVersion(const VersionData& data, FileRecord* record) {
   const void* version = data.Query(block, &length);
   if (version == nullptr) return;
   int16_t fields[3];
-  // An empty text leaves the fields not set, as they are.
+  // Unread: an empty text gives three numbers that aren't set, as the record has them already.
   (void)ParseVersion(static_cast<const char*>(version), length, fields);
   record->versionFirst = fields[0];
   record->versionSecond = fields[1];

@@ -9,16 +9,17 @@
 
 // Fills the record from a file: recordSize, fileSize, storedSize 0, versionLanguage and the
 // version; names stay empty. Returns 1 when language and version are complete, 0 when not (the
-// fields hold what there was), StatusBadArgument for a null or empty path or a null record.
+// fields hold what there was), StatusBadArgument when the path is missing or the record is null.
 int32_t ReadFileRecordFromDisk(const char* path, FileRecord* record);
 
 // The same for the running image, or the status of GetImagePath if that isn't 1.
 int32_t ReadOwnFileRecord(FileRecord* record);
 
-// Reads up to three numbers out of a text such as "4.1.7" or "4,1,7,0" into `fields`, three of
-// them. Every point, comma, hyphen and blank closes a number, even an empty one, which is 0.
-// Returns 1, StatusNoVersion for an empty text (the fields are not set then), StatusBadArgument for
-// a null argument. Of a token the first 15 characters count.
+// Reads a text such as "4.1.7" or "4,1,7,0" into the three `fields`. Every point, comma, hyphen and
+// blank closes a number, even an empty one, which is 0; 0 also stands for one that the text lacks.
+// Of a number the first 15 characters count, and the low 16 bits of its value. Returns 1;
+// StatusNoVersion for an empty text, with kVersionNotSet in all three fields; StatusBadArgument for
+// a null argument, with the fields untouched.
 StatusCode ParseVersionText(const char* text, int16_t* fields);
 
 // Compares names, byte by byte, then versions. The result tells where a differs:

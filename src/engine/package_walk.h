@@ -4,7 +4,8 @@
 // A pass is a type with
 //   static constexpr bool kReports         add the walk's fatal events and the browser events
 //   static constexpr bool kTakesStreams    Work consumes the stream of a record that has targets
-//   StatusCode Begin()                     once, at the first record; not 1 ends the walk
+//   StatusCode Begin()                     once, before the first record and also when there is
+//                                          none; not 1 ends the walk
 //   FileRecord* RecordAt(int index)        where the record goes, cleared
 //   StatusCode Work(const FileRecord&, const TargetList&)
 //                                          1 to go on; anything else ends the walk with that result

@@ -27,9 +27,9 @@ constexpr MacroRow kMacros[] = {
     {"%PLUGIN_ALL_DIR%", MacroAllBrowsers},
 };
 
-// Room for a path in the making: a browser's directory of at most 267 characters, a subpath of at
-// most 260, two backslashes and a file name of at most 32 always fit. A longer base directory is
-// refused.
+// Room for a path in the making. A browser's directory has at most 267 characters, so that with a
+// subpath of 260, a file name of 32 and two backslashes 561 are the most. A system directory of up
+// to 519 and a base directory of any length are taken too, and what they make too long is refused.
 constexpr size_t kWorkSize = 780;
 using WorkText = char[kWorkSize];
 

@@ -1,8 +1,8 @@
 // Turns a record's destination into full paths, on this machine and for this run.
 //
-// A destination is a list of elements, separated by ';'. An element that contains a ':' is an
-// absolute directory, taken as it stands. Any other is a macro, or nothing, followed by a subpath,
-// or nothing; a macro counts at the very start alone, whatever its case:
+// Semicolons divide a destination into elements, a place each. With a ':' in it an element is a
+// directory in full, and nothing is made of it. Else it lies below the directory that it begins
+// with, by one of these names in whatever case, or below the base directory:
 //
 //   %REMOVE_DIR% %REMOVEDIR%             the Windows directory
 //   %INSTALL_DIR% %CURDIR% %CUR_DIR%     the base directory, as for no macro at all
@@ -10,8 +10,8 @@
 //   %PLUGIN_NS_DIR% %PLUGIN_IE_DIR% %PLUGIN_OPERA_DIR%   one browser's plug-in directory
 //   %PLUGIN_ALL_DIR%                     fan-out: each browser's that there is
 //
-// All passes resolve through here, so that they see the same paths. Nothing resolved is ever
-// stored, and nothing is normalised.
+// Install, check and removal ask here, each anew: no path is kept from one run to the next, and
+// none is normalised.
 #pragma once
 
 #include <cstddef>
@@ -50,9 +50,9 @@ StatusCode ResolveTargets(SetupContext* context, TargetList* list, const char* b
 StatusCode ResolveElement(char* path, size_t pathSize, char* directory, size_t directorySize,
                           const char* baseDirectory, const FileRecord* record);
 
-// The code and, through `length`, the length of the macro that the text begins with. A missing text
-// gives MacroNone and leaves the length alone.
+// The code and, through `length`, the length of the macro that the text begins with: MacroNone and
+// 0 when it begins with none. For a null text only the code is given.
 MacroCode ClassifyMacro(const char* text, size_t* length);
 
-// 1 for a text that is missing, empty or has no ':'; else 0.
+// 0 for a text with a ':' in it, else 1, also for null.
 int IsRelativeElement(const char* text);

@@ -12,8 +12,8 @@ struct TargetEntry {
                               // and for an absolute directory
 };
 
-// A counted array in the order of the destination's elements. `entries` is owned by the holder of
-// the list, null while it is empty.
+// A counted array in the order of the destination's elements. An empty list has none (null);
+// whoever has the list frees it.
 struct TargetList {
   int32_t count;
   TargetEntry* entries;
@@ -23,5 +23,5 @@ struct TargetList {
 // StatusBufferTooSmall for a text above 259 characters, StatusNoMemory; the list is unchanged then.
 StatusCode AddTarget(TargetList* list, const char* path, const char* directory);
 
-// Frees the entries and leaves the list empty.
+// Frees the entries; the list is empty afterwards.
 void FreeTargets(TargetList* list);

@@ -60,7 +60,7 @@ constexpr size_t kHeadingSize = 260;
 constexpr size_t kLineSize = 780;  // the longest table text and a detail of 519 bytes fit
 
 void WriteText(DataFile* file, const char* text) {
-  // Unread: a log that can't be written is left out.
+  // Unread: what the log lacks, no run is judged by.
   (void)file->Write(text, static_cast<uint32_t>(strlen(text)));
 }
 

@@ -18,8 +18,8 @@ bool FindLogPath(char (&path)[kLogPathSize]);
 
 // Writes one block, a heading with the local time and a line for each event, to the file at `path`,
 // or to the standard log for a null or empty path. A list that is null or has no events leaves the
-// file as it was. A log that can't be written is left out without a word: the work of the run is
-// done by then.
+// file as it was. A file that can't be made or written costs the log and nothing else: what the
+// run had to do has been done.
 void WriteEventLog(const EventList* list, const char* path, LogMode mode);
 
 // Appends the block to the report file; does nothing for a null or empty path.

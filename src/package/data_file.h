@@ -1,12 +1,10 @@
-// A file name bound to an open file.
+// One file: its name, and what it is open through.
 //
-// A file is open in one of two ways: through a Win32 handle, asked for first, with exclusive
-// access; or through a descriptor of the runtime's low-level layer, asked for only when the first
-// way fails, which shares the file with anyone. On systems of the 9x family the running image can
-// be read in the second way alone. Positions and sizes have 32 bits.
+// Every open tries a Win32 handle that shares the file with nobody. Where the system refuses that,
+// a descriptor of the C runtime that shares it with everybody comes in its place. The 9x family
+// reads a running image only so. Positions and sizes have 32 bits.
 //
-// The class knows nothing of events and status codes: every operation answers a plain count or a
-// truth value (1 or 0).
+// Operations answer a count, or 1 and 0; what a failure means to a run is for their callers to say.
 #pragma once
 
 #include <cstdint>
@@ -27,7 +25,7 @@ class DataFile {
   int OpenForWrite();  // the file has to exist
   int Create();        // for reading and writing; an existing file is cut to nothing
 
-  // Bytes moved. 0 also for a null buffer, a count of 0, a closed object and a failure.
+  // Bytes moved. 0 when that fails, nothing is open, or there is no buffer or nothing to move.
   uint32_t Read(void* buffer, uint32_t count);
   uint32_t Write(const void* buffer, uint32_t count);
 

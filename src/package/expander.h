@@ -1,14 +1,14 @@
 // The expander of the packaged streams: a push decoder of variable-width LZW codes.
 //
 // A stream is three bytes of magic, "PKZ", and a sequence of codes, most significant bit first,
-// with no gaps. Codes begin with 9 bits. 0 to 255 stand for themselves, 257 makes the next code one
-// bit wider, 258 forgets the table and sets the width back to 9, and from 259 on a code is an entry
-// of the table: the string of its prefix, then its suffix. The first code, and the first after a
-// 258, is a literal; each later one but 257 and 258 makes the next entry. The stream has no end
-// code: it ends with its last byte, and bits left over that make no code are dropped.
+// with no gaps. Codes begin with 9 bits. 0 to 255 stand for themselves, behind 257 the codes have
+// one bit more, 258 forgets the table and sets the width back to 9, and from 259 on a code is an
+// entry of the table: the string of its prefix, then its suffix. The first code, and the first
+// after a 258, is a literal; each later one but 257 and 258 makes the next entry. The stream has no
+// end code: it ends with its last byte, and bits left over that make no code are dropped.
 //
-// The expander is handed blocks of any size, keeps all its state between them and can stop in the
-// middle of a code. It serves one stream. Its memory is fixed and allocated once.
+// A stream comes in blocks, as long as one likes; the end of a block may split a code. An expander
+// serves one stream. Its memory is fixed and allocated once.
 #pragma once
 
 #include <cstdint>
@@ -31,7 +31,7 @@ class PkzExpander {
   // False when there was no memory for the table; then the expander must not be used.
   bool IsReady() const { return table_ != nullptr; }
 
-  // 1 once the stream has been found bad. All input after that is ignored.
+  // 0, or 1 for a bad stream: what comes behind the fault is ignored.
   int32_t failed() const { return failed_; }
 
   // Runs over one block of the code sequence.
@@ -68,10 +68,10 @@ class PkzExpander {
   void GiveOut();
 
   int32_t failed_ = 0;
-  int32_t bitsWanted_ = 0;    // bits still missing from the code in assembly; 0: none in assembly
-  uint32_t codeValue_ = 0;    // its bits so far
-  int32_t bitsInByte_ = 0;    // unread bits of currentByte, 0 to 8; 0 between two blocks
-  uint32_t currentByte_ = 0;  // with its used bits cleared
+  int32_t bitsWanted_ = 0;          // that the present code still lacks; 0: no code begun
+  uint32_t codeValue_ = 0;          // its bits so far
+  int32_t bitsInByte_ = 0;          // unread bits of currentByte, 0 to 8; 0 between two blocks
+  uint32_t currentByte_ = 0;        // with its used bits cleared
   const uint8_t* input_ = nullptr;  // next byte of the present block; not owned
   uint32_t inputLeft_ = 0;
   State state_ = State::kFirstCode;
@@ -84,14 +84,14 @@ class PkzExpander {
   uint32_t batchFill_ = 0;
 };
 
-// Tests the magic and collects the output in pieces of 1024 bytes on its way to a file.
+// An expander of whole streams, magic included, into a file.
 class PkzFileExpander : public PkzExpander {
  public:
   // `output` is not owned.
   explicit PkzFileExpander(DataFile* output) : output_(output) {}
 
-  // Takes the next block of the stream. The first one has to hold the magic whole and one byte
-  // more. A null block fails the stream.
+  // Expands one block. The first has to hold the magic whole and one byte more. A null block makes
+  // the stream bad.
   void ExpandBlock(const uint8_t* bytes, uint32_t count);
 
   // Writes what is collected. The destructor doesn't.
@@ -99,8 +99,7 @@ class PkzFileExpander : public PkzExpander {
   uint32_t bufferFill() const { return bufferFill_; }
 
  protected:
-  // A full buffer is written when the next byte arrives, so every write but the last has exactly
-  // 1024 bytes.
+  // Every write but the last has 1024 bytes: a full buffer waits for the byte behind it.
   void WriteOutput(const uint8_t* bytes, uint32_t count) override;
 
  private:

@@ -1,12 +1,12 @@
 // The two fixed records of a package, as they stand in the image and in memory.
 //
 // An image is: the executable, bytes 0 to dataOffset; for each file a FileRecord and at once its
-// stream of storedSize bytes; one PackageHeader, which ends with the last byte of the file. Nothing
+// stream of storedSize bytes; one PackageHeader, behind which the file ends. Nothing
 // pads or aligns a region, and no index gives a stream's offset. All integers are little-endian,
 // as is every machine that the program runs on, so a record is read straight into its struct.
 //
-// Texts are 8-bit, NUL-terminated and filled with zeros. A damaged package can fill a field to its
-// width: read them through TextField (platform/text.h).
+// A text is 8-bit and has a NUL and zeros behind it, to the end of its field. A damaged package can
+// fill a field to its width: read them through TextField (platform/text.h).
 #pragma once
 
 #include <cstddef>

@@ -7,9 +7,9 @@
 #include "core/context.h"
 #include "package/data_file.h"
 
-// Empties the event list, then opens the image and fills context->header. Events that stood in the
-// list are dropped, not freed; the package must be closed.
-// Returns 1 with packageFile open, or with packageFile null: StatusBadPackage (also for a null
+// Opens the image and fills context->header. The event list begins anew, and is not freed before:
+// it has to be empty, and the package closed.
+// Returns 1 and leaves packageFile open. Else it is null: StatusBadPackage (also for a null
 // context), StatusOpenFailed, StatusInternal, StatusNoMemory. Adds one fatal event for each failure
 // but a null context and StatusNoMemory.
 StatusCode OpenPackage(SetupContext* context);
@@ -21,8 +21,8 @@ StatusCode ReadPackageHeader(SetupContext* context);
 // or the record is none, StatusBadArgument for a null argument.
 int32_t ReadFileRecord(DataFile* file, FileRecord* record);
 
-// Full path of the running image. Returns 1, StatusBadArgument for a null buffer or a size of 0,
-// StatusNoModulePath when the system gives none. A path that doesn't fit is cut.
+// Full path of the running image. Returns 1, StatusBadArgument for a buffer that is null or empty,
+// or StatusNoModulePath, with an empty text, when the system gives none or it doesn't fit.
 StatusCode GetImagePath(char* buffer, uint32_t size);
 
 // Closes and destroys packageFile, frees records, sets both to null. Returns 1, or

@@ -16,17 +16,18 @@ int DirectoryExists(const char* path);
 StatusCode DeleteFileChecked(const char* path);
 StatusCode RemoveDirectoryChecked(const char* path);
 
-// Appends one backslash in place, unless the text is empty, ends with one already, or fills its
-// buffer. Returns 1 if it appended, else 0.
+// Puts a backslash behind a text that has none there. Returns 1 if it did; 0 also for an empty text
+// and a full buffer.
 int AppendBackslash(char* text, size_t size);
 template <size_t N>
 int AppendBackslash(char (&text)[N]) {
   return AppendBackslash(text, N);
 }
 
-// Copies the Windows directory. The system is asked once; the answer is kept for the life of the
-// process. Returns 0, with the buffer unchanged, when it can't be had or doesn't fit.
+// Copies the Windows directory. The system's first good answer is kept for the life of the process;
+// until then each call asks anew. Returns 0, with the buffer unchanged, when there is none or it
+// doesn't fit.
 int GetWindowsDir(char* buffer, size_t size);
 
-// The program's own module, which holds the catalog.
+// The program's own module; the resources are in it.
 HINSTANCE ModuleHandle();

@@ -12,7 +12,7 @@ namespace {
 
 constexpr char kFileName[] = "Moriv.INF";
 constexpr char kDeleteSection[] = "RemoveFiles";
-constexpr char kWindowsDirNumber[] = "10";  // the INF format's number of the Windows directory
+constexpr char kWindowsDirNumber[] = "10";  // stands for the Windows directory in an INF file
 constexpr size_t kTextSize = 2 * kCatalogTextSize;  // one catalog text and what stands around it
 
 // One write for each format.

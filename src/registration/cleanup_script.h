@@ -1,5 +1,5 @@
-// The INF file "Moriv.INF" in the Windows directory: it tells the system's INF installer to delete
-// the removal program, the log and itself.
+// "Moriv.INF", a file that goes into the Windows directory: it tells the system's INF installer to
+// delete the removal program, the log and itself.
 #pragma once
 
 #include <cstddef>

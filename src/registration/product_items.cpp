@@ -1,4 +1,4 @@
-// Items of the product's registry tree: from the number to a key and a value name.
+// The items: which value of which key each number stands for.
 #include <cstring>
 #include <new>
 

@@ -1,4 +1,4 @@
-// The library of the product's registry tree, under HKEY_LOCAL_MACHINE:
+// Access to all that Moriv keeps in the registry, in one tree under HKEY_LOCAL_MACHINE:
 //
 //   SOFTWARE\Zeb\Moriv                                          items 1 to 3
 //   SOFTWARE\Zeb\Moriv\Services                                 one subkey per service
@@ -10,11 +10,11 @@
 // are REG_SZ, written without their NUL. The setup program uses the root alone, with a null
 // service; the rest serves the programs that live in the tree.
 //
-// A service name has 3 to 63 characters; a key path has at most 127 and a value read at most 510.
+// Limits in characters: service names 3 to 63, key paths 127, values that are read 510.
 // Deletions alone want 1 to 63 characters of a profile or application name: elsewhere the path is
-// its limit, and an empty name is the key that all of its kind lie in. Results: 1 success; 0 the
-// registry refused, or the key or value isn't there; -1 an invalid argument (a refused item, a bad
-// name or kind, a path too long).
+// its limit, and an empty name is the key that all of its kind lie in. Results: 1 for success; -1
+// for what no registry can answer (a refused item, a bad name or kind, a path too long); 0
+// for a key or value that is missing or refused.
 // Each call opens and closes its keys; nothing is kept between calls.
 #pragma once
 
@@ -52,17 +52,18 @@ struct KeyNameNode {
 
 // Items
 
-// The core of all item operations. A null service selects the root, a null subKey the service's own
-// key. Operation 1 reads into the buffer, of `size` bytes: 1 only for a REG_SZ value that fits; a
-// text that fills it has no NUL. 2 writes `size` bytes from the buffer; the key must exist. Both
-// give -1 for a null buffer or a negative size. 3 deletes the value; -1 when the registry refuses.
+// The core of all item operations. Its key is the service's own, with a subKey one below it,
+// without a service the root. Operation 1 reads into the buffer, of `size` bytes: 1 only for a
+// REG_SZ value that fits; a text that fills it has no NUL. 2 writes `size` bytes from the buffer;
+// the key must exist. Both give -1 for a null buffer or a negative size. 3 deletes the value; -1
+// when the registry refuses.
 int32_t ProductAccessItem(int32_t item, const char* service, int32_t kind, const char* subKey,
                           char* buffer, int32_t size, int32_t operation);
 
 // The text of an item. With a buffer: copies at most size-1 characters, always ends them with a NUL
-// and returns the buffer; on a failed read empties it and returns null. With a null buffer: returns
-// a new text, owned by the caller (delete[]), or null. A refused item gives null and leaves the
-// buffer alone.
+// and returns the buffer; without such a value empties it and returns null. With a null buffer:
+// returns a new text, owned by the caller (delete[]), or null. A refused item gives null and leaves
+// the buffer alone.
 char* ProductGetItem(int32_t item, const char* service, const char* subKey, char* buffer,
                      int32_t size);
 
@@ -71,8 +72,8 @@ int32_t ProductSetItem(int32_t item, const char* service, const char* subKey, co
 
 // Keys
 
-// 1 if the key opens for reading, 0 if not. A null service tests the root, a null subKey the
-// service.
+// Whether the key can be read: 1 or 0. It is the service's, or with a subKey the one below it; for
+// a null service the root.
 int32_t ProductKeyExists(const char* service, int32_t kind, const char* subKey);
 int32_t ProductRootExists(const char* service);
 

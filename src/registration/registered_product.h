@@ -16,9 +16,9 @@ StatusCode RegisterProduct(const SetupContext* context);
 // Deletes the tree, unless a service is registered. Always 1.
 int UnregisterProduct();
 
-// 1 when no service is registered; else 0, with the names joined by "," in the buffer. The buffer
-// may be null, and stays as it was when the names don't fit in `size` bytes. Of names of more than
-// 519 bytes together those stand there that fit whole.
+// 1 when no service is registered; else 0, with the names joined by "," in the buffer: those ahead
+// of the first one that 519 bytes can't take. 0 with an empty text when the list can't be read to
+// its end. The buffer may be null, and stays as it was when the text doesn't fit in `size` bytes.
 int CheckDependingServices(char* buffer, int32_t size);
 
 // Between the registry's language numbers and the run's: an unknown number is French, an unknown

@@ -51,7 +51,8 @@ bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]) {
 StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) {
   if (context == nullptr || context->packageFile == nullptr) return StatusBadArgument;
   DataFile* const image = context->packageFile;
-  // Opening it again below puts its position at byte 0, where the copy starts.
+  // Opened again below, it stands at its first byte: the copy begins with the executable. In
+  // between another program can open it, or put another file in its place.
   (void)image->Close();
 
   FileRecord own = {};  // unread: an image without a version makes no removal program

@@ -1,6 +1,5 @@
-// The removal program: a trimmed copy of the running image in the Windows directory. The same
-// executable and the same records, but no streams, and a flag in the header that turns every run of
-// the copy into a removal.
+// The removal program, which an install leaves in the Windows directory: the running image without
+// its streams, and marked in its header as one that removes.
 #pragma once
 
 #include <cstdint>
@@ -16,8 +15,8 @@ bool FindRemovalProgramPath(char (&path)[kRemovalProgramPathSize]);
 
 // Writes it, in place of an earlier one. Needs packageFile, and records as an install pass leaves
 // them; changes records and header in memory into those of the removal program.
-//   path  receives the full path once that is known; may be null. One that doesn't fit in `size`
-//         bytes leaves the buffer alone.
+//   path  where its full path goes, also for a failure behind that point; may be null. One that
+//         doesn't fit in `size` bytes leaves the buffer alone.
 // Returns 1, or: StatusBadArgument; StatusBadRecord when the running image has no path or no
 // version resource with a translation and a file version; StatusDeleteFailed for an earlier one
 // that can't go; StatusOpenFailed, StatusNoMemory, StatusCreateFileFailed;

@@ -1,7 +1,6 @@
-// What the program leaves in the system's keeping: the entry in the list of removable programs,
-// and, after a removal, an INF file with the one-time command that makes the system delete the last
-// files at its next start. A removal can't do that itself: the removal program runs from one of
-// them, and the log is written after everything else.
+// What is left for the system to carry out: the entry by which a user removes the product, and,
+// after a removal, the command by which Windows deletes the last files, once, when an administrator
+// logs on. A removal can't delete them: it is running from one, and the log has yet to be written.
 //
 // All answer 1 or 0, and nobody looks: whatever fails here, the run goes on. No events are added.
 #pragma once
@@ -15,7 +14,7 @@ int WriteUninstallEntry(const SetupContext* context);
 // 0 also when there is no entry.
 int DeleteUninstallEntry();
 
-// Writes the INF file and registers the command.
+// Leaves the INF file and the command that has it processed.
 int ScheduleFinalCleanup();
 
 // Stores the command that processes the INF file at `infPath`. 0 also for a null or empty path, a

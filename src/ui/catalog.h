@@ -1,6 +1,6 @@
 // The message catalog: string resources of the program, found by a catalog id plus the number of
-// the language. A few names that must not change with the language (the log's, the removal
-// program's) stand at number 0 alone and are looked up without a context.
+// the language. Names of files and keys are the same for everybody: they stand at number 0 alone
+// and are looked up without a context.
 #pragma once
 
 #include "core/context.h"
@@ -58,7 +58,7 @@ inline constexpr size_t kMessageTextSize = 1000;
 
 // Loads the text of `id` in the language of the context: the one in force, or the system's when
 // none is. Without a context the number of the language is 0. A text of `size` bytes or more is
-// cut; a row that doesn't exist gives an empty text. Does nothing for a null buffer or a size of 0.
+// cut; a row that doesn't exist gives an empty text. Without a buffer nothing is done.
 void LoadCatalogText(const SetupContext* context, uint32_t id, char* buffer, size_t size);
 template <size_t N>
 void LoadCatalogText(const SetupContext* context, uint32_t id, char (&buffer)[N]) {

@@ -1,5 +1,5 @@
-// Control ids of the dialog. They are part of its state: a button keeps its place on the screen and
-// changes its id. IDOK (1) and IDCANCEL (2) take part too.
+// Control ids of the dialog. They change with its state: the same button bears one id after the
+// other, IDOK (1) and IDCANCEL (2) among them.
 #pragma once
 
 #include "core/hooks.h"
@@ -16,5 +16,5 @@ inline constexpr int IDC_BANNER = 910;
 inline constexpr int IDC_LINK = 911;  // web address, clickable
 inline constexpr int IDC_LANGUAGE = 917;
 inline constexpr int IDC_LANGUAGE_LABEL = 918;
-inline constexpr int IDC_DETAILS = 919;  // the middle button on the two end pages
+inline constexpr int IDC_DETAILS = 919;  // on an end page what was the middle button
 inline constexpr int IDC_SPACE = 921;

@@ -31,6 +31,6 @@ void HideWorkControls();
 // French.
 void RenewTexts(SetupContext* context);
 
-// Posts a message to the dialog. It runs when a message loop next reaches it, or at once if the
-// system can't post it: a chain of steps that broke off could no longer be ended by anybody.
+// Posts a message to the dialog. One that the system can't post is carried out at once: a chain of
+// steps that broke off could no longer be ended by anybody.
 void Post(UINT message, WPARAM wParam = 0);

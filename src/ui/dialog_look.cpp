@@ -103,7 +103,7 @@ void DrawLanguageLabel(const SetupContext* context, const DRAWITEMSTRUCT& item) 
   SetTextColor(item.hDC, kDarkGreen);
   char label[kPathSize] = {};
   LoadCatalogText(context, CatalogLanguageLabel, label);
-  // The blanks wipe a longer label of another language.
+  // The system clears nothing here: a label in another language that was longer would show its end.
   DrawLine(item, "                              ");
   DrawLine(item, label);
 }

@@ -8,7 +8,7 @@ struct HeldCommand {
   bool isOpen;
   bool hasCommand;
   WPARAM command;
-  HWND control;  // null for Escape and the close box
+  HWND control;  // null when no control bears the command's id, as for Escape on an end page
 };
 HeldCommand held;
 

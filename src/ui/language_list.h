@@ -13,7 +13,7 @@ inline constexpr uint32_t kLanguageItemSize = 48;  // the mark that readers of a
 struct LanguageItem {
   uint32_t size;           // kLanguageItemSize in every build
   int32_t languageOffset;  // kLanguage value
-  char name[32];           // each language's own name, the same in all languages
+  char name[32];           // in the language itself
   uint32_t listIndex;      // that the list gave the entry
   HBITMAP bitmap;          // the flag; owned
 };
@@ -40,8 +40,8 @@ LanguageItem* LanguageItemAt(HWND dialog, WPARAM index);
 // Answers WM_MEASUREITEM for the list, which comes before the dialog is initialised.
 void MeasureLanguageItem(MEASUREITEMSTRUCT* measure);
 
-// Returns 1, or 0 with nothing drawn for an entry without an item, such as the field of a list with
-// no selection.
+// Returns 1, or 0 with nothing drawn for an entry without an item: while nothing is selected, the
+// list's field is one.
 int DrawLanguageItem(const LanguageListArt& art, const DRAWITEMSTRUCT& item);
 
 // Answers WM_DELETEITEM.

@@ -8,10 +8,11 @@
 // Lets the user pick the installation directory with the system's folder picker.
 void BrowseForDirectory(HWND dialog, SetupContext* context);
 
-// Starts the default browser with the maker's web address.
+// Starts the command that this user's registry has for web addresses, with the maker's and with the
+// rights of the program.
 void OpenWebAddress(HWND dialog, const SetupContext* context);
 
-// Opens the log with the program that the system has for it.
+// Opens the log in whatever shows such files to this user.
 void OpenLogFile(HWND dialog, const SetupContext* context);
 
 // The command line that the system registers for web addresses. Returns 1, or 0 when there is none,

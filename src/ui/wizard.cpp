@@ -1,9 +1,8 @@
 // The dialog's messages and commands, and where each leads.
 //
-// The work moves forward through private messages that the dialog posts to itself: a step does one
-// thing, posts the message of the next and gives control back, and between two of them the window
-// paints. A pass runs inside its step and dispatches waiting messages one at a time (PollCancel),
-// so a command can arrive in the middle of one: OnCommand decides which then count.
+// A run is a chain of messages: each has one step, which ends by posting the next, so that the
+// window paints in between. A pass is one long step, and lets waiting messages through at each poll
+// (PollCancel). So a command can arrive in the middle of it: OnCommand decides which then count.
 #include "ui/wizard.h"
 
 #include <type_traits>
@@ -130,9 +129,9 @@ constexpr MessageRow kMessages[] = {
     {WM_SET_LANGUAGE, OnStep<SetLanguage>},
 };
 
-// Answers 0 to every message of the system's, handled or not; to WM_INITDIALOG that leaves the
-// focus to the page. The program's own are handled whole: two of them have numbers that the system
-// would act on.
+// Answers 0 to every message of the system's, handled or not. After WM_INITDIALOG the system then
+// sets no focus: the page does. The program's own are handled whole: two of them have numbers that
+// the system would act on.
 INT_PTR CALLBACK DialogProcedure(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
   // DM_SETDEFID has the number of WM_STEP_LOAD; a step carries 0, and no control has that id.
   if (message == DM_SETDEFID && wParam != 0) return FALSE;

@@ -1,7 +1,7 @@
 // The flow of the dialog, in the order of a run.
 //
-// There are no pages in the usual sense: one set of controls, which each phase of the run shows,
-// hides, relabels and renumbers.
+// A page is no window of its own: all pages share the controls, and each sets visibility, text and
+// id of those that it uses.
 #include "ui/wizard_steps.h"
 
 #include <initializer_list>
@@ -96,7 +96,7 @@ int SetUpRemovalPage(SetupContext* context) {
   return IDCANCEL;
 }
 
-// From here on, whether a control bears IDC_UPDATE tells an update from a fresh install.
+// The id that a button gets here is what later steps know an update by (Exists).
 int SetUpUpdatePage(SetupContext* context, bool isFree) {
   Renumber(IDC_NEXT, IDC_UPDATE);
   SetText(IDC_UPDATE, CatalogUpdate, *context);
@@ -357,7 +357,7 @@ void AskCancel(SetupContext* context) {
                   MB_YESNO | MB_ICONQUESTION | MB_DEFBUTTON2) == IDNO) {
     return;
   }
-  // Read again: the box's own loop can have run further steps.
+  // Asked only now: behind the question the chain of steps went on.
   if (wizardState.busy == BusyWorking) {
     wizardState.cancelRequested = 1;
   } else {
