@@ -63,8 +63,7 @@ def test_planted_libraries(player):
     machine.run(LOADER, ' '.join(f'{name}.dll' for name in NAMES))
     loaded = [('careless', None, take_marks(machine))]
     for arguments, script, _, _ in RUNS:
-        if script is not None:
-            machine.user(script)
+        machine.user = script
         outcome = machine.run(SETUP, arguments)
         loaded.append((arguments, outcome.exit_code, take_marks(machine)))
     machine.discard()

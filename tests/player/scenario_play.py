@@ -4,6 +4,7 @@ scenario says with what was done, both as checks in full: lines by what they che
 import contextlib
 import difflib
 import re
+import struct
 from datetime import datetime
 from os.path import commonprefix
 
@@ -73,7 +74,7 @@ class _Player:
         self.machine.settings(section.body)
 
     def _given_user(self, section):
-        self.machine.user(section.body)
+        self.machine.user = section.body
 
     def _given_files(self, section):
         for line in section.body:
@@ -122,7 +123,7 @@ class _Player:
     def act(self, section):
         """What does not hold, line by line; or, to accept, the checks that do."""
         files, registry = self.machine.files.snapshot(), self.machine.registry()
-        dialog = self.machine.has_user
+        dialog = self.machine.user is not None
         if section.keyword == 'run':
             outcome = self._run(section)
         else:
@@ -203,7 +204,7 @@ class _Player:
             same = len(commonprefix([expected, content])) if said else 0
             said = f'{len(content)} bytes' + (f', other from byte {same} on' if said else '')
             for words in known:
-                with contextlib.suppress(ValueError):  # a damaged image may have no removal program
+                with contextlib.suppress(ValueError, struct.error):  # a damaged image may have no removal program
                     if self._content(words) == content:
                         said = words
         return f'{sign} {path} = {said}'
@@ -212,8 +213,9 @@ class _Player:
         """The bytes that the words behind a file's '=' stand for in a check."""
         if words == 'the INF file':
             return INF_FILE
-        if match := re.fullmatch(r'(?:first (\d+) bytes of|original) (\S+)', words):
-            return self.packed[self.last_image].contents[match[2]][:int(match[1]) if match[1] else None]
+        if match := re.fullmatch(r'(?:first (\d+) bytes of|original) (\S+)(?: of (.+))?', words):
+            content = self.packed[match[3] or self.last_image].contents[match[2]]
+            return content[:int(match[1] or len(content))]
         if match := re.fullmatch(r'removal program(?: in (\w+))?', words):
             language = match[1] or 'French'
             offset = LANGUAGES[language].offset if language in LANGUAGES else int(language)
