@@ -1,14 +1,5 @@
-"""The words for what a good run leaves: the checks that they stand for, worked out from what stood on
-the machine before the run and from the image that ran.
-
-    installed [DIRECTORY] [in LANGUAGE][, VARIANT]...
-    removed [DIRECTORY][, listed]
-
-are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
-is not there. Variants: "listed", with the uninstall entry; "older", after the event of an older file;
-"not removable", without a removal program; "not registered", without a registry. "registered" and "unregistered" are the ends of the two: the last
-events, which follow the scenario's own, the removal program or the INF file, which stands beside the
-scenario's own files, and the registry.
+"""The words for what a good run leaves, as the README of the scenarios tells them: the checks that they
+stand for, worked out from what stood on the machine before the run and from the image that ran.
 """
 
 import copy

@@ -10,13 +10,10 @@ ROOT = 'HKEY_LOCAL_MACHINE'
 REG_SZ = 1
 UNTERMINATED = ' unterminated'
 
+_SECTION = re.compile(rf'\[(-?)(?:{ROOT}\\?)?(.*)\]', re.I)
 _QUOTED = r'"((?:[^"\\]|\\.)*)"'
 _VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a-fA-F, ]*)|(-))'
                     rf'({UNTERMINATED})?')
-
-
-class RegistryError(Exception):
-    pass
 
 
 @dataclass
@@ -51,10 +48,10 @@ class Registry:
         """Adds the keys and values of REGEDIT4 sections; [-KEY] and "name"=- delete."""
         key = None
         for line in text_lines:
-            if section := re.fullmatch(r'\[(-?)(.*)\]', line):
-                path = _below_root(section[2])
-                key = None if section[1] else self.make(path) if path else Key('')
-                if section[1]:
+            if section := _SECTION.fullmatch(line):
+                deleted, path = section.groups()
+                key = None if deleted else self.make(path) if path else Key('')
+                if deleted:
                     self._delete(path.lower())
             elif line and not line.startswith((';', 'REGEDIT4')):
                 self._put_line(key, line)
@@ -67,7 +64,7 @@ class Registry:
     def _put_line(self, key, line):
         match = _VALUE.fullmatch(line)
         if key is None or not match:
-            raise RegistryError(f'no value of a key: {line}')
+            raise ValueError(f'no value of a key: {line}')
         name, text, kind, data, deleted, unterminated = match.groups()
         name = _unquote(name or '')
         if deleted:
@@ -83,9 +80,7 @@ class Registry:
         lines = ['REGEDIT4', '']
         for key in self.keys.values():
             lines.append(f'[{ROOT}\\{key.path}]')
-            for name, kind, data in key.values.values():
-                text = self._line(name, kind, data)
-                lines.append(_hex_line(name, kind, data) if text.endswith(UNTERMINATED) else text)
+            lines += [_hex_line(*value) for value in key.values.values()]
             lines.append('')
         return '\n'.join(lines).encode(self.codepage)
 
@@ -98,7 +93,7 @@ class Registry:
         if kind != REG_SZ or any(byte < 0x20 for byte in text):
             return _hex_line(name, kind, data)
         mark = UNTERMINATED if text == data else ''
-        return f'{_name(name)}={quote(text.decode(self.codepage, "replace"))}{mark}'
+        return f'{quote(name) if name else "@"}={quote(text.decode(self.codepage, "replace"))}{mark}'
 
 
 def changes(before, after):
@@ -126,16 +121,5 @@ def _unquote(text):
     return re.sub(r'\\(.)', r'\1', text)
 
 
-def _name(name):
-    return quote(name) if name else '@'
-
-
 def _hex_line(name, kind, data):
-    return f'{_name(name)}=hex({kind:x}):{data.hex(",")}'
-
-
-def _below_root(path):
-    root, _, rest = path.partition('\\')
-    if root.upper().startswith('HKEY_') and root.upper() != ROOT:
-        raise RegistryError(f'a key outside {ROOT}: {path}')
-    return rest if root.upper() == ROOT else path
+    return f'{quote(name) if name else "@"}=hex({kind:x}):{data.hex(",")}'

@@ -6,7 +6,6 @@ import difflib
 import re
 import struct
 from datetime import datetime
-from os.path import commonprefix
 
 import file_tree
 import log_text
@@ -47,7 +46,7 @@ def play(scenario, machine, tools, accept=False):
             elif report := player.act(section):
                 title = f'{section.place}: {section.keyword} {section.argument}'
                 failures.append('\n'.join([title, *report]))
-        except (registry_text.RegistryError, ValueError, KeyError, OSError, IndexError) as error:
+        except (ValueError, KeyError, OSError, IndexError) as error:
             raise ScenarioError(f'{section.place}: {type(error).__name__}: {error}') from error
         if failures and not accept:
             break
@@ -60,10 +59,9 @@ class _Player:
         self.machine = machine
         self.tools = tools
         self.accept = accept
-        self.images = {}      # path -> the image's bytes
-        self.packed = {}      # path -> PackedImage
+        self.packed = {}  # PackedImage by path
         self.last_image = DEFAULT_IMAGE  # that has run
-        self.times = []       # of each run: before and after it
+        self.times = []  # of each run: before and after it
 
     # Preparations
 
@@ -98,7 +96,6 @@ class _Player:
 
     def place_image(self, path, packed):
         self.packed[path] = packed
-        self.images[path] = packed.bytes
         self._write(path, packed.bytes)
 
     def _given_run(self, section):
@@ -110,9 +107,10 @@ class _Player:
 
     def _damage(self, section):
         path = section.argument or DEFAULT_IMAGE
+        packed = self.packed[path]
         for line in section.body:
-            self.images[path] = damage(self.images[path], line)
-        self._write(path, self.images[path])
+            packed.bytes = damage(packed.bytes, line)
+        self._write(path, packed.bytes)
 
     def _write(self, path, content, read_only=False):
         self.machine.add_drive(path[0])
@@ -143,7 +141,7 @@ class _Player:
 
     def _run(self, section):
         program, arguments = _program_and_arguments(section.argument)
-        if program in self.images:
+        if program in self.packed:
             self.last_image = program
         begun = datetime.now().replace(microsecond=0)  # a heading has whole seconds
         outcome = self.machine.run(program, arguments)
@@ -197,17 +195,15 @@ class _Player:
             return f'{sign} {path}'
         content = self.machine.files.read(path)
         names = self.packed[self.last_image].contents if self.last_image in self.packed else ()
-        known = [*(f'first {len(content)} bytes of {name}' for name in names), 'the INF file',
-                 *(f'original {name}' for name in names),
-                 *(f'removal program in {name}' for name in LANGUAGES)]  # the last one is the best
-        if not said or (expected := self._content(said)) != content:
-            same = len(commonprefix([expected, content])) if said else 0
-            said = f'{len(content)} bytes' + (f', other from byte {same} on' if said else '')
-            for words in known:
-                with contextlib.suppress(ValueError, struct.error):  # a damaged image may have no removal program
-                    if self._content(words) == content:
-                        said = words
-        return f'{sign} {path} = {said}'
+        known = [*([said] if said else []), *(f'removal program in {name}' for name in LANGUAGES),
+                 *(f'original {name}' for name in names), 'the INF file',
+                 *(f'first {len(content)} bytes of {name}' for name in names)]
+        for words in known:
+            # A damaged image may have no removal program; what is said may be no words.
+            with contextlib.suppress(ValueError, KeyError, struct.error):
+                if self._content(words) == content:
+                    return f'{sign} {path} = {words}'
+        return f'{sign} {path} = {len(content)} other bytes'
 
     def _content(self, words):
         """The bytes that the words behind a file's '=' stand for in a check."""
@@ -219,7 +215,7 @@ class _Player:
         if match := re.fullmatch(r'removal program(?: in (\w+))?', words):
             language = match[1] or 'French'
             offset = LANGUAGES[language].offset if language in LANGUAGES else int(language)
-            return Image(self.images[self.last_image]).removal_program(offset)
+            return Image(self.packed[self.last_image].bytes).removal_program(offset)
         return quoted_bytes(words)
 
 
