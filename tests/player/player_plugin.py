@@ -119,6 +119,16 @@ def player(request):
     return request.config.player
 
 
+@pytest.fixture
+def machine(player):
+    """A fresh one under Wine, for what the stand-in can't do."""
+    if player.world.name == 'stand-in':
+        pytest.skip('only Wine: the stand-in starts no program of Windows')
+    machine = player.world.machine('windows')
+    yield machine
+    machine.discard()
+
+
 class Player:
     """One world, and what scenarios are played with in it."""
 
