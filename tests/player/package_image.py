@@ -128,19 +128,8 @@ class Image:
 
 
 def damage(data, line):
-    """The image's bytes after one line of a damage section:
-
-    header FIELD = VALUE            record N FIELD = VALUE       N from 1
-    stream N = hex BYTES            another stream; the record's storedSize follows
-    no records                      neither records nor streams, recordCount 0
-    no records but N                the first N alone
-    executable alone                no package at all
-    cut N bytes from the end
-    append "TEXT"
-
-    A VALUE is a number, a "TEXT", or filled "TEXT": repeated over the field's whole width, so that no
-    NUL ends it.
-    """
+    """The image's bytes after one line of a damage section. Records and streams count from 1. A value is a
+    number, a "TEXT", or filled "TEXT": repeated over the field's whole width, so that no NUL ends it."""
     if match := re.fullmatch(r'cut (\d+) bytes from the end', line):
         return data[:-int(match[1])]
     if match := re.fullmatch(r'append (".*")', line):

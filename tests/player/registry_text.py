@@ -4,7 +4,7 @@ A quoted text (REG_SZ) is one with the NUL at its end; behind one without it sta
 """
 
 import re
-from dataclasses import dataclass, field
+from collections import namedtuple
 
 ROOT = 'HKEY_LOCAL_MACHINE'
 REG_SZ = 1
@@ -16,10 +16,9 @@ _VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a
                     rf'({UNTERMINATED})?')
 
 
-@dataclass
-class Key:
-    path: str                                    # below the root, as first written
-    values: dict = field(default_factory=dict)   # lower-case name -> its name, type and bytes
+# Its path below the root, as first written, and by the lower-case names of its values each one's name, type
+# and bytes.
+Key = namedtuple('Key', 'path values')
 
 
 class Registry:
@@ -37,7 +36,7 @@ class Registry:
         parent, _, _ = path.rpartition('\\')
         if parent and parent.lower() not in self.keys:
             self.make(parent)
-        return self.keys.setdefault(path.lower(), Key(path))
+        return self.keys.setdefault(path.lower(), Key(path, {}))
 
     def put(self, key, name, kind, data):
         if self.terminates and kind == REG_SZ and not data.endswith(b'\0'):
@@ -50,7 +49,7 @@ class Registry:
         for line in text_lines:
             if section := _SECTION.fullmatch(line):
                 deleted, path = section.groups()
-                key = None if deleted else self.make(path) if path else Key('')
+                key = None if deleted else self.make(path) if path else Key('', {})
                 if deleted:
                     self._delete(path.lower())
             elif line and not line.startswith((';', 'REGEDIT4')):

@@ -11,7 +11,6 @@ import file_tree
 import log_text
 import named_pages
 import registry_text
-from explained_log import misunderstood
 from good_runs import LANGUAGES, Before, checks_of
 from package_image import Image, PackedImage, damage, file_content, quoted_bytes
 from scenario_text import ACTIONS, DEFAULT_IMAGE, LOG, WORDS, ScenarioError
@@ -135,8 +134,8 @@ class _Player:
         report += [line for what in said | done for line in
                    _difference(what, said.get(what, []), done.get(what, []))]
         if section.keyword == 'run' and 'log' in done and not dialog:
-            report += misunderstood(self.tools.image_tool, self.machine.files.host(LOG),
-                                    outcome.exit_code)
+            log = self.machine.files.host(LOG)
+            report += log_text.misunderstood(self.tools.image_tool, log, outcome.exit_code)
         return _as_checks(done, before) if report and self.accept else report
 
     def _run(self, section):

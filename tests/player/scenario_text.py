@@ -1,6 +1,7 @@
 """Reads scenario files (tests/scenarios/README.md has the format)."""
 
 import re
+from collections import namedtuple
 from dataclasses import dataclass, field
 
 # What a section may be: "given" sections and "damage" prepare the machine; actions start something;
@@ -39,13 +40,8 @@ class Section:
         return self.keyword
 
 
-@dataclass
-class Scenario:
-    name: str
-    title: str               # first comment line
-    only: str                # '' or the one world, 'stand-in' or 'Wine'
-    reason: str              # why only there
-    sections: list
+# Its first comment line, the one world in which it is played, 'stand-in' or 'Wine' or '', and why only there.
+Scenario = namedtuple('Scenario', 'name title only reason sections')
 
 
 def parse(name, text, file_name):

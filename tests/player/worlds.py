@@ -52,6 +52,9 @@ class Machine:
     now = None   # its own time, when it is set
     user = None  # what the user of the next run does, line by line; the run behind it has none
 
+    def add_drive(self, letter):
+        """Under a world where it is not enough that a drive has a folder."""
+
     def run(self, program, arguments):
         user, self.user = self.user, None
         if user is not None:
@@ -130,10 +133,6 @@ class StandInMachine(Machine):
                     raise
                 time.sleep(0.02)
 
-    def add_drive(self, letter):
-        """A drive exists when its folder does."""
-        (self.folder / f'drive_{letter.lower()}').mkdir(exist_ok=True)
-
     def restart(self):
         _call(self.tool, 'restart', self.folder)
 
@@ -158,12 +157,9 @@ class Wine:
 
     # All that the program and the scenarios touch; the rest of Wine's registry is not looked at. The
     # last three are there on a fresh machine.
-    WATCHED = (r'SOFTWARE\Zeb', r'SOFTWARE\Netscape',
-               r'SOFTWARE\Classes\http\shell\open\command',
-               r'SOFTWARE\Classes\htmlfile\shell\open\command',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\Uninstall',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\App Paths')
+    WATCHED = [rf'SOFTWARE\{key}' for key in (
+        'Zeb', 'Netscape', r'Classes\http\shell\open\command', r'Classes\htmlfile\shell\open\command',
+        *(rf'Microsoft\Windows\CurrentVersion\{key}' for key in ('Uninstall', 'RunOnce', 'App Paths')))]
 
     def __init__(self, bits, prefix):
         """bits: '32' or '64'."""
