@@ -31,14 +31,13 @@ CLEAN_UP = (r'"MorivCommand"="C:\\windows\\system32\\rundll32.exe setupapi.dll,'
 # What was before a run, and what ran: files by path, the registry, the files of the image as pairs of
 # name and destination, whether a user was there.
 Before = namedtuple('Before', 'files registry packed dialog')
-Checks = namedtuple('Checks', 'events files registry')
 
 _WORDS = re.compile(r'(installed|registered|removed|unregistered)(?: (\w:[^,]*?))?(?: in (\w+))?'
                     r'((?:, (?:listed|older|not removable|not registered))*)')
 
 
 def checks_of(words, before):
-    """The bodies of the checks; an "(un)registered" gives the lines that come behind the scenario's."""
+    """Events, lines of files, lines of the registry; those of an end come behind the scenario's."""
     match = _WORDS.fullmatch(words)
     if not match or (match[3] or 'French') not in LANGUAGES:
         raise ValueError(f'no such words: {words}')
@@ -64,7 +63,7 @@ class _GoodRun:
     def checks(self):
         files = [f'{sign} {path}' + (f' = {self.files[path]}' if self.files.get(path) else '')
                  for path, sign in file_tree.changes(self.before.files, self.files).items()]
-        return Checks(self.events, files, registry_text.changes(self.before.registry, self.registry))
+        return self.events, files, registry_text.changes(self.before.registry, self.registry)
 
     def copy_files(self, told_older):
         found = self._find_product()

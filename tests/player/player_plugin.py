@@ -27,21 +27,19 @@ def pytest_addoption(parser):
 
 def pytest_configure(config):
     config.player = Player(config.option)
-    names = config.option.file_or_dir or ['scenarios']
-    config.args = [path for name in names for path in _paths(name)]
+    names = config.option.file_or_dir or [str(SCENARIOS)]
+    config.args = list(map(_path, [str(SCENARIOS), str(PROGRAMS)] if names == ['all'] else names))
 
 
-def _paths(name):
+def _path(name):
     """What pytest has to collect for a name of the command line."""
-    if name in ('all', 'scenarios'):
-        return [str(SCENARIOS), str(PROGRAMS)] if name == 'all' else [str(SCENARIOS)]
+    if Path(name.partition('::')[0]).exists():
+        return name
     file_name, bracket, _ = name.partition('[')
     found = [*SCENARIOS.rglob(f'{file_name}.scenario'), *PROGRAMS.glob(f'{file_name}_test.py'),
              *SCENARIOS.glob(f'{file_name}/')]
     if found:
-        return [f'{found[0]}::{name}' if bracket else str(found[0])]
-    if Path(name.partition('::')[0]).exists():
-        return [name]
+        return f'{found[0]}::{name}' if bracket else str(found[0])
     raise pytest.UsageError(f'no scenario and no folder {name}')
 
 

@@ -13,7 +13,7 @@ import named_pages
 import registry_text
 from good_runs import LANGUAGES, Before, checks_of
 from package_image import Image, PackedImage, damage, file_content, quoted_bytes
-from scenario_text import ACTIONS, DEFAULT_IMAGE, LOG, WORDS, ScenarioError
+from scenario_text import ACTIONS, DEFAULT_IMAGE, LOG, WORDS, ScenarioError, Section
 from worlds import Outcome
 
 # What the program asks of the system; only the stand-in machine tells of it.
@@ -35,13 +35,13 @@ def play(scenario, machine, tools, accept=False):
     """Raises ScenarioFailure, or ScenarioError for a scenario that can't be carried out. accept: the
     failure tells for each action that did not hold the checks that do, and all actions are played."""
     player = _Player(machine, tools, accept)
-    if not any(section.keyword == 'given image' for section in scenario.sections):
-        player.place_image(DEFAULT_IMAGE, PackedImage(tools))
-    failures = []
-    for section in scenario.sections:
+    sections, failures = scenario.sections, []
+    if not any(section.keyword == 'given image' for section in sections):
+        sections = [Section('given image', '', '', [], []), *sections]
+    for section in sections:
         try:
             if section.keyword not in ACTIONS:
-                player.prepare(section)
+                getattr(player, section.keyword.replace(' ', '_'))(section)
             elif report := player.act(section):
                 title = f'{section.place}: {section.keyword} {section.argument}'
                 failures.append('\n'.join([title, *report]))
@@ -62,18 +62,15 @@ class _Player:
         self.last_image = DEFAULT_IMAGE  # that has run
         self.times = []  # of each run: before and after it
 
-    # Preparations
+    # Preparations, by the section's keyword
 
-    def prepare(self, section):
-        getattr(self, '_' + section.keyword.replace(' ', '_'))(section)
-
-    def _given_machine(self, section):
+    def given_machine(self, section):
         self.machine.settings(section.body)
 
-    def _given_user(self, section):
+    def given_user(self, section):
         self.machine.user = section.body
 
-    def _given_files(self, section):
+    def given_files(self, section):
         for line in section.body:
             path, _, content = line.partition(' = ')
             words = content.removesuffix(' read-only')
@@ -85,31 +82,27 @@ class _Player:
             else:
                 self._write(path, file_content(words, path, self.tools), read_only=words != content)
 
-    def _given_registry(self, section):
+    def given_registry(self, section):
         self.machine.set_registry(self.machine.registry().apply(section.body))
 
-    def _given_image(self, section):
+    def given_image(self, section):
         """Without a path: the image that every scenario has, with other options and more files."""
-        self.place_image(section.argument or DEFAULT_IMAGE,
-                         PackedImage(self.tools, section.body, not section.argument))
+        path = section.argument or DEFAULT_IMAGE
+        self.packed[path] = PackedImage(self.tools, section.body, usual=not section.argument)
+        self._write(path, self.packed[path].bytes)
 
-    def place_image(self, path, packed):
-        self.packed[path] = packed
-        self._write(path, packed.bytes)
-
-    def _given_run(self, section):
+    def given_run(self, section):
         """A run that other scenarios look at closely; here it has to succeed, no more."""
         outcome = self._run(section)
         if outcome.exit_code != 1 or outcome.trouble:
             raise ScenarioFailure(f'{section.place}: a given run ends with {outcome.exit_code} '
                                   f'{outcome.trouble}')
 
-    def _damage(self, section):
+    def damage(self, section):
         path = section.argument or DEFAULT_IMAGE
-        packed = self.packed[path]
         for line in section.body:
-            packed.bytes = damage(packed.bytes, line)
-        self._write(path, packed.bytes)
+            self.packed[path].bytes = damage(self.packed[path].bytes, line)
+        self._write(path, self.packed[path].bytes)
 
     def _write(self, path, content, read_only=False):
         self.machine.add_drive(path[0])
@@ -220,14 +213,14 @@ class _Player:
 
 def _say_words(said, words, before):
     """Puts the checks of a word where the scenario has none of its own; those of an end behind them."""
-    checks = checks_of(words.replace(' ,', ',').strip(), before)
+    events, files, registry = checks_of(words.replace(' ,', ',').strip(), before)
     if words.startswith(('registered', 'unregistered')):
         log = said.get('log', ['heading'])
-        said['log'] = log + log_text.numbered(checks.events, log)
-        said['files'] = said.get('files', []) + checks.files
-    said.setdefault('log', ['heading', *log_text.numbered(checks.events, [])])
-    said.setdefault('files', sorted(checks.files))
-    said.setdefault('registry', checks.registry)
+        said['log'] = log + log_text.numbered(events, log)
+        said['files'] = said.get('files', []) + files
+    said.setdefault('log', ['heading', *log_text.numbered(events, [])])
+    said.setdefault('files', sorted(files))
+    said.setdefault('registry', registry)
 
 
 def _as_checks(done, before):

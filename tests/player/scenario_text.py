@@ -2,7 +2,6 @@
 
 import re
 from collections import namedtuple
-from dataclasses import dataclass, field
 
 # What a section may be: "given" sections and "damage" prepare the machine; actions start something;
 # checks say what the action before them has to have done.
@@ -24,13 +23,8 @@ class ScenarioError(Exception):
     """A scenario that is wrong in itself, in one line with file and line number."""
 
 
-@dataclass
-class Section:
-    keyword: str
-    argument: str            # the rest of its first line
-    place: str               # FILE:LINE, for messages
-    body: list = field(default_factory=list)
-    checks: list = field(default_factory=list)   # of an action
+class Section(namedtuple('Section', 'keyword argument place body checks')):
+    """The argument is the rest of its first line, the place FILE:LINE; an action has checks."""
 
     @property
     def subject(self):
@@ -107,7 +101,7 @@ def _add_section(sections, line, place):
     match = _KEYWORD.match(line)
     if not match:
         raise ScenarioError(f'{place}: no such section: {line}')
-    section = Section(match[1], match[2].strip(), place)
+    section = Section(match[1], match[2].strip(), place, [], [])
     if section.keyword not in CHECKS:
         sections.append(section)
     elif not sections or sections[-1].keyword not in ACTIONS:

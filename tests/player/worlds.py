@@ -165,9 +165,7 @@ class Wine:
         """bits: '32' or '64'."""
         build = BUILD / f'win{bits}'
         self.name, self.bits, self.prefix = f'wine{bits}', bits, prefix
-        self.stub = build / 'MorivSetup.exe'
-        self.agent_program = build / 'tests' / 'scenario_agent.exe'
-        self.driver = build / 'tests' / 'dialog_driver.exe'
+        self.stub, self.driver = build / 'MorivSetup.exe', build / 'tests' / 'dialog_driver.exe'
         self.agent = None  # its process
 
     def open(self):
@@ -177,7 +175,8 @@ class Wine:
             asked_for = os.environ.get('MORIV_WINE') == 'none' or self.bits == '32'
             raise WorldError(f'left out: {(answer.stdout or answer.stderr).strip()}',
                              LEFT_OUT if asked_for else 1)
-        require(self.stub, self.agent_program, self.driver)
+        agent = self.driver.with_name('scenario_agent.exe')
+        require(self.stub, agent, self.driver)
         self.prefix.parent.mkdir(parents=True, exist_ok=True)
         # Two runs in one prefix would see each other's files; the second one waits.
         self.lock = open(f'{self.prefix}.in-use', 'w')
@@ -186,9 +185,8 @@ class Wine:
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
         with open(f'{self.prefix}.agent-log', 'wb') as errors:
-            self.agent = subprocess.Popen(
-                [*display, self.tool, 'run', self.prefix, self.agent_program],
-                stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors)
+            self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent], stderr=errors,
+                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE)
         self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
             self.fresh_registry.make(key)
