@@ -2,15 +2,15 @@
 ways: the batch file's exit code is 0 for a success and else the program's."""
 
 import re
-from pathlib import Path
 
 import pytest
 
 from package_image import PackedImage
+from worlds import ROOT
 
 FOLDER = 'C:\\My Recipe\\'
-DOCUMENT = Path(__file__).resolve().parent.parent.parent / 'docs' / 'deployment.md'
-RECIPE = DOCUMENT.read_text(encoding='utf-8').partition('## cmd.exe\n')[2].partition('\n## ')[0]
+DOCUMENT = (ROOT / 'docs' / 'deployment.md').read_text(encoding='utf-8')
+RECIPE = DOCUMENT.partition('## cmd.exe\n')[2].partition('\n## ')[0]
 
 
 @pytest.mark.parametrize('code', [1, -1000012, 100002])

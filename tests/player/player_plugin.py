@@ -49,11 +49,7 @@ def pytest_collect_file(file_path, parent):
 
 class ScenarioFile(pytest.File):
     def collect(self):
-        try:
-            scenarios = parse(self.path.stem, self.path.read_text(encoding='utf-8'), self.path.name)
-        except ScenarioError as error:
-            raise self.CollectError(str(error)) from error
-        for scenario in scenarios:
+        for scenario in parse(self.path.stem, self.path.read_text(encoding='utf-8'), self.path.name):
             item = ScenarioItem.from_parent(self, name=scenario.name)
             item.scenario = scenario
             yield item

@@ -79,7 +79,7 @@ class Registry:
         lines = ['REGEDIT4', '']
         for key in self.keys.values():
             lines.append(f'[{ROOT}\\{key.path}]')
-            lines += [_hex_line(*value) for value in key.values.values()]
+            lines += [self._line(*value, as_bytes=True) for value in key.values.values()]
             lines.append('')
         return '\n'.join(lines).encode(self.codepage)
 
@@ -87,12 +87,12 @@ class Registry:
         """By their lower-case names."""
         return {low: self._line(*value) for low, value in key.values.items()} if key else {}
 
-    def _line(self, name, kind, data):
-        text = data.removesuffix(b'\0')
-        if kind != REG_SZ or any(byte < 0x20 for byte in text):
-            return _hex_line(name, kind, data)
+    def _line(self, name, kind, data, as_bytes=False):
+        name, text = quote(name) if name else '@', data.removesuffix(b'\0')
+        if as_bytes or kind != REG_SZ or any(byte < 0x20 for byte in text):
+            return f'{name}=hex({kind:x}):{data.hex(",")}'
         mark = UNTERMINATED if text == data else ''
-        return f'{quote(name) if name else "@"}={quote(text.decode(self.codepage, "replace"))}{mark}'
+        return f'{name}={quote(text.decode(self.codepage, "replace"))}{mark}'
 
 
 def changes(before, after):
@@ -118,7 +118,3 @@ def quote(text):
 
 def _unquote(text):
     return re.sub(r'\\(.)', r'\1', text)
-
-
-def _hex_line(name, kind, data):
-    return f'{quote(name) if name else "@"}=hex({kind:x}):{data.hex(",")}'

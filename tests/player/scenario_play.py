@@ -142,18 +142,17 @@ class _Player:
 
     def _said(self, action, before):
         said = {'exit': ['1']}
-        for check in action.checks:
+        for check in sorted(action.checks, key=lambda check: check.keyword in WORDS):
             lines = [check.argument] if check.keyword == 'exit' else check.body
             if check.keyword == 'log' and lines:
                 lines = ['heading', *lines]
             elif check.keyword == 'shown':
                 lines = [line for line in named_pages.without_words(lines)
                          if self.machine.tells_requests or not line.startswith(REQUESTS)]
-            if check.keyword not in WORDS:
-                said[check.subject] = log_text.without_words(lines)
-        for check in action.checks:
-            if check.keyword in WORDS:
+            if check.keyword in WORDS:  # behind all others
                 _say_words(said, f'{check.keyword} {check.argument}', before)
+            else:
+                said[check.subject] = log_text.without_words(lines)
         if before.registry.terminates:
             said['registry'] = [line.removesuffix(registry_text.UNTERMINATED)
                                 for line in said.get('registry', [])]
@@ -169,17 +168,14 @@ class _Player:
             path = LOG if what == 'log' else what.removeprefix('text ')
             if signs.get(path, '-') != '-':
                 del signs[path]
-                done[what] = self._text_lines(path, said.get(what, [])) or ['nothing']
+                text = self.machine.files.read(path).decode(self.machine.codepage, 'replace')
+                in_full = any(line.startswith('|Installing Moriv : ') for line in said.get(what, []))
+                done[what] = log_text.text_lines(text, [] if in_full else self.times) or ['nothing']
         words = dict(line[2:].split(' = ', 1) for line in said['files'] if ' = ' in line)
         done['files'] = sorted(self._file_line(sign, path, words.get(path))
                                for path, sign in signs.items())
         done['registry'] = registry_text.changes(before.registry, self.machine.registry())
         return done
-
-    def _text_lines(self, path, said):
-        text = self.machine.files.read(path).decode(self.machine.codepage, 'replace')
-        in_full = any(line.startswith('|Installing Moriv : ') for line in said)
-        return log_text.text_lines(text, [] if in_full else self.times)
 
     def _file_line(self, sign, path, said):
         """said: words for the content, None when nothing is said of the file."""

@@ -3,6 +3,8 @@
 import re
 from collections import namedtuple
 
+import pytest
+
 # What a section may be: "given" sections and "damage" prepare the machine; actions start something;
 # checks say what the action before them has to have done.
 PREPARATIONS = ('given machine', 'given files', 'given registry', 'given image', 'given run',
@@ -19,7 +21,7 @@ _KEYWORD = re.compile(f'({"|".join(PREPARATIONS + ACTIONS + CHECKS)})(?:$| |(?=,
 _ONLY = re.compile('only (stand-in|Wine): (.+)')
 
 
-class ScenarioError(Exception):
+class ScenarioError(pytest.Collector.CollectError):
     """A scenario that is wrong in itself, in one line with file and line number."""
 
 
