@@ -21,7 +21,6 @@ BROWSERS = {'%PLUGIN_NS_DIR%': 'netscape', '%PLUGIN_IE_DIR%': 'iexplore', '%PLUG
 
 DIRECTORY = r'C:\Program Files\Moriv'
 REMOVAL_PROGRAM = r'C:\windows\MorivRmv.exe'
-OLDER = 'Found an older version on the system, with at least one older or missing file '
 PRODUCT = r'SOFTWARE\Zeb\Moriv'
 CURRENT_VERSION = r'SOFTWARE\Microsoft\Windows\CurrentVersion'
 ENTRY = CURRENT_VERSION + r'\Uninstall\Moriv'
@@ -68,7 +67,8 @@ class _GoodRun:
     def copy_files(self, told_older):
         found = self._find_product()
         if told_older:
-            self.events.append(OLDER)
+            self.events.append(
+                'Found an older version on the system, with at least one older or missing file ')
         if self.before.dialog:
             kind = 'Updating the' if found else 'Installing'
             self.events.append(f'{kind} Moriv version on the system ')

@@ -41,9 +41,9 @@ def page(words):
     language = language or 'French'
     if name not in PAGES or language not in LANGUAGES:
         raise ValueError(f'no such {words}')
-    place = f'selected {LANGUAGES[language].offset // 10000}'
-    return [re.sub('<(.*?)>', lambda text: _in_language(text[1], language), line).replace('selected #', place)
-            for line in PAGES[name]]
+    place = LANGUAGES[language].offset // 10000
+    lines = [line.replace('selected #', f'selected {place}') for line in PAGES[name]]
+    return [re.sub('<(.*?)>', lambda text: _in_language(text[1], language), line) for line in lines]
 
 
 def _in_language(text, language):

@@ -15,18 +15,16 @@ LOADER = FOLDER + 'careless_loader.exe'
 # Not comctl32 and comdlg32: Windows has its own ways to find those, while Wine's shell32 loads the
 # first one from the program's folder whatever the program says.
 NAMES = """
-    apphelp bcrypt cfgmgr32 clbcatq comres coremessaging cryptbase cryptsp cscapi
-    devobj dnsapi dwmapi edputil gdiplus iertutil imageres iphlpapi linkinfo mpr msftedit
-    msi msimg32 msls31 netapi32 netutils ntmarta ntshrui oleacc powrprof profapi propsys riched20
-    riched32 rsaenh samcli secur32 setupapi sfc sfc_os shdocvw shfolder slc srvcli sspicli
-    textinputframework textshaping urlmon userenv usp10 uxtheme version winhttp wininet winmm
-    winspool wintrust wkscli wldp wtsapi32""".split()
+    apphelp bcrypt cfgmgr32 clbcatq comres coremessaging cryptbase cryptsp cscapi devobj dnsapi dwmapi
+    edputil gdiplus iertutil imageres iphlpapi linkinfo mpr msftedit msi msimg32 msls31 netapi32
+    netutils ntmarta ntshrui oleacc powrprof profapi propsys riched20 riched32 rsaenh samcli secur32
+    setupapi sfc sfc_os shdocvw shfolder slc srvcli sspicli textinputframework textshaping urlmon
+    userenv usp10 uxtheme version winhttp wininet winmm winspool wintrust wkscli wldp wtsapi32""".split()
 
-# What is run: the program, its options, the user's script of a dialog run, the exit code, and what is loaded
-# from the program's folder. Wine's folder picker loads one itself whatever the program has asked for. The
-# first run of the setup program loads by bare name, as a shell extension in the process might. The removal
-# program is written only when the version functions are the system's: 100002 would tell of a planted
-# version.dll.
+# What is run: the program, its options, the user's script of a dialog run, the exit code, and what is
+# loaded from the program's folder; Wine's folder picker loads one there whatever the program has asked
+# for. The first dialog loads by bare name, as a shell extension in the process might. The removal program
+# is written only when the version functions are the system's: 100002 would tell of a planted version.dll.
 RUNS = [
     (LOADER, ' '.join(f'{name}.dll' for name in NAMES), None, 0, set(NAMES)),
     (SETUP, '/i', ['load riched20.dll', 'load ntmarta', 'press 907', 'close'], 1, set()),

@@ -16,8 +16,7 @@ _VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a
                     rf'({UNTERMINATED})?')
 
 
-# Its path below the root, as first written, and by the lower-case names of its values each one's name, type
-# and bytes.
+# Its path below the root, as first written, and (name, type, bytes) by the lower-case name of a value.
 Key = namedtuple('Key', 'path values')
 
 

@@ -55,9 +55,7 @@ def play(scenario, machine, tools, accept=False):
 
 class _Player:
     def __init__(self, machine, tools, accept):
-        self.machine = machine
-        self.tools = tools
-        self.accept = accept
+        self.machine, self.tools, self.accept = machine, tools, accept
         self.packed = {}  # PackedImage by path
         self.last_image = DEFAULT_IMAGE  # that has run
         self.times = []  # of each run: before and after it

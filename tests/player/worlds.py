@@ -39,10 +39,7 @@ class WorldError(Exception):
 
 def make_world(name, native, work, wine=BUILD / 'wine'):
     """native: folder of the native build; work: folder for machines; wine: folder for Wine prefixes."""
-    if name == 'stand-in':
-        return StandIn(native, work)
-    bits = name.removeprefix('wine')
-    return Wine(bits, wine / f'scenarios{bits}')
+    return StandIn(native, work) if name == 'stand-in' else Wine(name, wine)
 
 
 class Machine:
@@ -67,8 +64,7 @@ class StandIn:
     at_once = 2
 
     def __init__(self, native, work):
-        self.stub = native / 'MorivSetup'
-        self.tool = native / 'moriv-machine'
+        self.stub, self.tool = native / 'MorivSetup', native / 'moriv-machine'
         self.work = work.resolve()
         self.fresh = self.work / 'fresh'
 
@@ -161,10 +157,9 @@ class Wine:
         'Zeb', 'Netscape', r'Classes\http\shell\open\command', r'Classes\htmlfile\shell\open\command',
         *(rf'Microsoft\Windows\CurrentVersion\{key}' for key in ('Uninstall', 'RunOnce', 'App Paths')))]
 
-    def __init__(self, bits, prefix):
-        """bits: '32' or '64'."""
-        build = BUILD / f'win{bits}'
-        self.name, self.bits, self.prefix = f'wine{bits}', bits, prefix
+    def __init__(self, name, folder):
+        self.name, self.bits = name, name.removeprefix('wine')
+        self.prefix, build = folder / f'scenarios{self.bits}', BUILD / f'win{self.bits}'
         self.stub, self.driver = build / 'MorivSetup.exe', build / 'tests' / 'dialog_driver.exe'
         self.agent = None  # its process
 
@@ -185,8 +180,8 @@ class Wine:
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
         with open(f'{self.prefix}.agent-log', 'wb') as errors:
-            self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent], stderr=errors,
-                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE)
+            self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent],
+                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors)
         self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
             self.fresh_registry.make(key)
