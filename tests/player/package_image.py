@@ -129,7 +129,7 @@ class Image:
 
 def damage(data, line):
     """The image's bytes after one line of a damage section. Records and streams count from 1. A value
-    is a number, a "TEXT", or filled "TEXT": repeated over the field's whole width, so that no NUL ends it."""
+    is a number, a "TEXT", or filled "TEXT": repeated over the whole field, so that no NUL ends it."""
     if match := re.fullmatch(r'cut (\d+) bytes from the end', line):
         return data[:-int(match[1])]
     if match := re.fullmatch(r'append (".*")', line):

@@ -23,8 +23,8 @@ NAMES = """
 
 # What is run: the program, its options, the user's script of a dialog run, the exit code, and what is
 # loaded from the program's folder; Wine's folder picker loads one there whatever the program has asked
-# for. The first dialog loads by bare name, as a shell extension in the process might. The removal program
-# is written only when the version functions are the system's: 100002 would tell of a planted version.dll.
+# for. The first dialog loads by bare name, as a shell extension might. The removal program is written
+# only when the version functions are the system's: 100002 would tell of a planted version.dll.
 RUNS = [
     (LOADER, ' '.join(f'{name}.dll' for name in NAMES), None, 0, set(NAMES)),
     (SETUP, '/i', ['load riched20.dll', 'load ntmarta', 'press 907', 'close'], 1, set()),

@@ -45,7 +45,7 @@ def play(scenario, machine, tools, accept=False):
             elif report := player.act(section):
                 title = f'{section.place}: {section.keyword} {section.argument}'
                 failures.append('\n'.join([title, *report]))
-        except (ValueError, KeyError, OSError, IndexError) as error:
+        except (ValueError, KeyError, OSError, IndexError, struct.error) as error:
             raise ScenarioError(f'{section.place}: {type(error).__name__}: {error}') from error
         if failures and not accept:
             break

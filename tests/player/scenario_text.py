@@ -36,7 +36,7 @@ class Section(namedtuple('Section', 'keyword argument place body checks')):
         return self.keyword
 
 
-# title: its first comment line; only: its one world, 'stand-in' or 'Wine', or ''; reason: why only there.
+# title: its first comment line; only: its one world, stand-in or Wine, or ''; reason: why only there.
 Scenario = namedtuple('Scenario', 'name title only reason sections')
 
 
