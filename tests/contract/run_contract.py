@@ -64,7 +64,7 @@ def run(world):
     program = world.stub.with_name('tests') / f'seam_contract{world.stub.suffix}'
     machine.files.write(FOLDER + 'seam_contract.exe', program.read_bytes())
     if world.name == 'stand-in':
-        machine.user((HERE / 'contract.user').read_text(encoding='utf-8').splitlines())
+        machine.user = (HERE / 'contract.user').read_text(encoding='utf-8').splitlines()
         outcome = machine.run(FOLDER + 'seam_contract.exe', '')
     else:
         outcome = machine.run(r'C:\windows\system32\cmd.exe',

@@ -1,14 +1,5 @@
-"""The words for what a good run leaves: the checks that they stand for, worked out from what stood on
-the machine before the run and from the image that ran.
-
-    installed [DIRECTORY] [in LANGUAGE][, VARIANT]...
-    removed [DIRECTORY][, listed]
-
-are log, files and registry of an image whose files go to %INSTALL_DIR% or below, or to a browser that
-is not there. Variants: "listed", with the uninstall entry; "older", after the event of an older file;
-"not removable", without a removal program; "not registered", without a registry. "registered" and "unregistered" are the ends of the two: the last
-events, which follow the scenario's own, the removal program or the INF file, which stands beside the
-scenario's own files, and the registry.
+"""The words for what a good run leaves, as the README of the scenarios tells them: the checks that they
+stand for, worked out from what stood on the machine before the run and from the image that ran.
 """
 
 import copy
@@ -30,7 +21,6 @@ BROWSERS = {'%PLUGIN_NS_DIR%': 'netscape', '%PLUGIN_IE_DIR%': 'iexplore', '%PLUG
 
 DIRECTORY = r'C:\Program Files\Moriv'
 REMOVAL_PROGRAM = r'C:\windows\MorivRmv.exe'
-OLDER = 'Found an older version on the system, with at least one older or missing file '
 PRODUCT = r'SOFTWARE\Zeb\Moriv'
 CURRENT_VERSION = r'SOFTWARE\Microsoft\Windows\CurrentVersion'
 ENTRY = CURRENT_VERSION + r'\Uninstall\Moriv'
@@ -40,14 +30,13 @@ CLEAN_UP = (r'"MorivCommand"="C:\\windows\\system32\\rundll32.exe setupapi.dll,'
 # What was before a run, and what ran: files by path, the registry, the files of the image as pairs of
 # name and destination, whether a user was there.
 Before = namedtuple('Before', 'files registry packed dialog')
-Checks = namedtuple('Checks', 'events files registry')
 
 _WORDS = re.compile(r'(installed|registered|removed|unregistered)(?: (\w:[^,]*?))?(?: in (\w+))?'
                     r'((?:, (?:listed|older|not removable|not registered))*)')
 
 
 def checks_of(words, before):
-    """The bodies of the checks; an "(un)registered" gives the lines that come behind the scenario's."""
+    """Events, lines of files, lines of the registry; those of an end come behind the scenario's."""
     match = _WORDS.fullmatch(words)
     if not match or (match[3] or 'French') not in LANGUAGES:
         raise ValueError(f'no such words: {words}')
@@ -73,12 +62,13 @@ class _GoodRun:
     def checks(self):
         files = [f'{sign} {path}' + (f' = {self.files[path]}' if self.files.get(path) else '')
                  for path, sign in file_tree.changes(self.before.files, self.files).items()]
-        return Checks(self.events, files, registry_text.changes(self.before.registry, self.registry))
+        return self.events, files, registry_text.changes(self.before.registry, self.registry)
 
     def copy_files(self, told_older):
         found = self._find_product()
         if told_older:
-            self.events.append(OLDER)
+            self.events.append(
+                'Found an older version on the system, with at least one older or missing file ')
         if self.before.dialog:
             kind = 'Updating the' if found else 'Installing'
             self.events.append(f'{kind} Moriv version on the system ')

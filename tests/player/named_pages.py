@@ -41,18 +41,16 @@ def page(words):
     language = language or 'French'
     if name not in PAGES or language not in LANGUAGES:
         raise ValueError(f'no such {words}')
-    return [_in_language(line, language) for line in PAGES[name]]
-
-
-def _in_language(line, language):
-    def text(match):
-        french, *other = match[1].split('|')
-        if language == 'English' and other:
-            return other[0]
-        return LANGUAGES[language].tag + (other[1] if other[1:] and language != 'French' else french)
-
     place = LANGUAGES[language].offset // 10000
-    return re.sub('<(.*?)>', text, line).replace('selected #', f'selected {place}')
+    lines = [line.replace('selected #', f'selected {place}') for line in PAGES[name]]
+    return [re.sub('<(.*?)>', lambda text: _in_language(text[1], language), line) for line in lines]
+
+
+def _in_language(text, language):
+    french, *other = text.split('|')
+    if language == 'English' and other:
+        return other[0]
+    return LANGUAGES[language].tag + (other[1] if other[1:] and language != 'French' else french)
 
 
 def _changed(lines, change):

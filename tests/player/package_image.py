@@ -9,22 +9,15 @@ import re
 import subprocess
 from collections import namedtuple
 from pathlib import Path
+from struct import Struct
 from tempfile import TemporaryDirectory
 
-HEADER_SIZE = 568
-RECORD_SIZE = 696
-
-# Name: (offset, width); a width of 2 or 4 is a number, any other a text.
-HEADER_FIELDS = {
-    'headerSize': (0, 2), 'magic': (2, 26), 'recordCount': (28, 2), 'removalImageFlag': (30, 2),
-    'spaceNeeded': (32, 4), 'packageLength': (36, 4), 'dataOffset': (40, 4),
-    'defaultDirectory': (44, 260), 'defaultLanguage': (304, 4), 'reserved': (308, 260),
-}
-RECORD_FIELDS = {
-    'recordSize': (0, 2), 'fileName': (2, 32), 'destination': (34, 260),
-    'versionLanguage': (294, 128), 'versionFirst': (422, 2), 'versionSecond': (424, 2),
-    'versionThird': (426, 2), 'fileSize': (428, 4), 'storedSize': (432, 4), 'reserved': (436, 260),
-}
+HEADER = Struct('<H26s2H3I260sI260s')
+Header = namedtuple('Header', 'headerSize magic recordCount removalImageFlag spaceNeeded packageLength '
+                    'dataOffset defaultDirectory defaultLanguage reserved')
+RECORD = Struct('<H32s260s128s3H2I260s')
+Record = namedtuple('Record', 'recordSize fileName destination versionLanguage versionFirst '
+                    'versionSecond versionThird fileSize storedSize reserved')
 
 # The image that a scenario has unless it needs another one.
 USUAL_FILES = ('zebdial.exe = 5000 bytes -> %INSTALL_DIR%', 'zebnet.dll = 3000 bytes -> %INSTALL_DIR%')
@@ -107,102 +100,60 @@ class Image:
     """A good image in its parts; bytes() puts them together again."""
 
     def __init__(self, data):
-        self.header = bytearray(data[-HEADER_SIZE:])
-        count, offset = (_number(self.header, HEADER_FIELDS[f]) for f in ('recordCount', 'dataOffset'))
-        self.executable = data[:offset]
+        self.header = Header._make(HEADER.unpack(data[-HEADER.size:]))
+        self.executable, rest = data[:self.header.dataOffset], data[self.header.dataOffset:-HEADER.size]
         self.records, self.streams = [], []
-        for _ in range(count):
-            self.records.append(bytearray(data[offset:offset + RECORD_SIZE]))
-            offset += RECORD_SIZE
-            stored = _number(self.records[-1], RECORD_FIELDS['storedSize'])
-            self.streams.append(data[offset:offset + stored])
-            offset += stored
-        if offset != len(data) - HEADER_SIZE:
+        for _ in range(self.header.recordCount):
+            self.records.append(Record._make(RECORD.unpack_from(rest)))
+            end = RECORD.size + self.records[-1].storedSize
+            self.streams.append(rest[RECORD.size:end])
+            rest = rest[end:]
+        if rest:
             raise ValueError('the packed image is not one whole package')
 
     def bytes(self):
-        files = (part for file in zip(self.records, self.streams) for part in file)
-        return b''.join([self.executable, *files, self.header])
+        files = [RECORD.pack(*record) + stream for record, stream in zip(self.records, self.streams)]
+        return b''.join([self.executable, *files, HEADER.pack(*self.header)])
 
-    def set_stream(self, index, stream):
-        self.streams[index] = stream
-        _set(self.records[index], RECORD_FIELDS['storedSize'], len(stream))
+    def change_record(self, index, **values):
+        self.records[index] = self.records[index]._replace(**values)
 
     def removal_program(self, language_offset):
         """What an install of this image in that language leaves as its removal program."""
-        for index in range(len(self.records)):
-            self.set_stream(index, b'')
-        for name, value in (('removalImageFlag', 1), ('defaultLanguage', language_offset),
-                            ('packageLength', len(self.records) * RECORD_SIZE)):
-            _set(self.header, HEADER_FIELDS[name], value)
+        self.records = [record._replace(storedSize=0) for record in self.records]
+        self.streams = [b''] * len(self.records)
+        self.header = self.header._replace(removalImageFlag=1, defaultLanguage=language_offset,
+                                           packageLength=len(self.records) * RECORD.size)
         return self.bytes()
 
 
 def damage(data, line):
-    """The image's bytes after one line of a damage section:
-
-    header FIELD = VALUE            record N FIELD = VALUE       N from 1
-    stream N = hex BYTES            another stream; the record's storedSize follows
-    no records                      neither records nor streams, recordCount 0
-    no records but N                the first N alone
-    executable alone                no package at all
-    cut N bytes from the end
-    append "TEXT"
-
-    A VALUE is a number, a "TEXT", filled "TEXT" (repeated over the field's whole width, so that no
-    NUL ends it) or hex BYTES.
-    """
-    for pattern, change in _DAMAGES:
-        if match := re.fullmatch(pattern, line):
-            return change(data, *match.groups())
-    raise ValueError(f'no such damage: {line}')
-
-
-def _change_field(data, number, name, value):
-    """Of the record with this number, of the header without one."""
+    """The image's bytes after one line of a damage section. Records and streams count from 1. A value
+    is a number, a "TEXT", or filled "TEXT": repeated over the whole field, so that no NUL ends it."""
+    if match := re.fullmatch(r'cut (\d+) bytes from the end', line):
+        return data[:-int(match[1])]
+    if match := re.fullmatch(r'append (".*")', line):
+        return data + quoted_bytes(match[1])
     image = Image(data)
-    block = image.records[int(number) - 1] if number else image.header
-    _set(block, (RECORD_FIELDS if number else HEADER_FIELDS)[name], _value(value))
+    if line == 'executable alone':
+        return image.executable
+    if match := re.fullmatch(r'header (\w+) = (.+)', line):
+        image.header = image.header._replace(**{match[1]: _value(match[2])})
+    elif match := re.fullmatch(r'record (\d+) (\w+) = (.+)', line):
+        image.change_record(int(match[1]) - 1, **{match[2]: _value(match[3])})
+    elif match := re.fullmatch(r'stream (\d+) = hex (.+)', line):
+        index, stream = int(match[1]) - 1, bytes.fromhex(match[2])
+        image.streams[index] = stream
+        image.change_record(index, storedSize=len(stream))
+    elif match := re.fullmatch(r'no records(?: but (\d+))?', line):
+        image.records = image.records[:int(match[1] or 0)]
+        image.header = image.header._replace(recordCount=len(image.records))
+    else:
+        raise ValueError(f'no such damage: {line}')
     return image.bytes()
-
-
-def _change_stream(data, number, stream):
-    image = Image(data)
-    image.set_stream(int(number) - 1, bytes.fromhex(stream))
-    return image.bytes()
-
-
-def _drop_records(data, kept):
-    image = Image(data)
-    image.records = image.records[:int(kept or 0)]
-    _set(image.header, HEADER_FIELDS['recordCount'], len(image.records))
-    return image.bytes()
-
-
-_DAMAGES = [
-    (r'(?:header|record (\d+)) (\w+) = (.+)', _change_field),
-    (r'stream (\d+) = hex (.+)', _change_stream),
-    (r'no records(?: but (\d+))?', _drop_records),
-    (r'executable alone', lambda data: Image(data).executable),
-    (r'cut (\d+) bytes from the end', lambda data, count: data[:-int(count)]),
-    (r'append (".*")', lambda data, text: data + quoted_bytes(text)),
-]
 
 
 def _value(text):
     if quoted := re.fullmatch('(filled )?"(.*)"', text):
         return quoted[2].encode('cp1252') * (260 if quoted[1] else 1)
-    return bytes.fromhex(text[4:]) if text.startswith('hex ') else int(text, 0)
-
-
-def _number(block, place):
-    offset, width = place
-    return int.from_bytes(block[offset:offset + width], 'little')
-
-
-def _set(block, place, data):
-    """Puts a number or bytes into a field; bytes are filled up with zeros, or cut off."""
-    offset, width = place
-    if isinstance(data, int):
-        data = (data & (1 << 8 * width) - 1).to_bytes(width, 'little')
-    block[offset:offset + width] = data.ljust(width, b'\0')[:width]
+    return int(text, 0)

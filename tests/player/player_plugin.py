@@ -27,21 +27,19 @@ def pytest_addoption(parser):
 
 def pytest_configure(config):
     config.player = Player(config.option)
-    names = config.option.file_or_dir or ['scenarios']
-    config.args = [path for name in names for path in _paths(name)]
+    names = config.option.file_or_dir or [str(SCENARIOS)]
+    config.args = list(map(_path, [str(SCENARIOS), str(PROGRAMS)] if names == ['all'] else names))
 
 
-def _paths(name):
+def _path(name):
     """What pytest has to collect for a name of the command line."""
-    if name in ('all', 'scenarios'):
-        return [str(SCENARIOS), str(PROGRAMS)] if name == 'all' else [str(SCENARIOS)]
+    if Path(name.partition('::')[0]).exists():
+        return name
     file_name, bracket, _ = name.partition('[')
     found = [*SCENARIOS.rglob(f'{file_name}.scenario'), *PROGRAMS.glob(f'{file_name}_test.py'),
              *SCENARIOS.glob(f'{file_name}/')]
     if found:
-        return [f'{found[0]}::{name}' if bracket else str(found[0])]
-    if Path(name.partition('::')[0]).exists():
-        return [name]
+        return f'{found[0]}::{name}' if bracket else str(found[0])
     raise pytest.UsageError(f'no scenario and no folder {name}')
 
 
@@ -51,11 +49,7 @@ def pytest_collect_file(file_path, parent):
 
 class ScenarioFile(pytest.File):
     def collect(self):
-        try:
-            scenarios = parse(self.path.stem, self.path.read_text(encoding='utf-8'), self.path.name)
-        except ScenarioError as error:
-            raise self.CollectError(str(error)) from error
-        for scenario in scenarios:
+        for scenario in parse(self.path.stem, self.path.read_text(encoding='utf-8'), self.path.name):
             item = ScenarioItem.from_parent(self, name=scenario.name)
             item.scenario = scenario
             yield item
@@ -117,6 +111,16 @@ def pytest_terminal_summary(terminalreporter, config):
 @pytest.fixture(scope='session')
 def player(request):
     return request.config.player
+
+
+@pytest.fixture
+def machine(player):
+    """A fresh one under Wine, for what the stand-in can't do."""
+    if player.world.name == 'stand-in':
+        pytest.skip('only Wine: the stand-in starts no program of Windows')
+    machine = player.world.machine('windows')
+    yield machine
+    machine.discard()
 
 
 class Player:

@@ -4,25 +4,20 @@ A quoted text (REG_SZ) is one with the NUL at its end; behind one without it sta
 """
 
 import re
-from dataclasses import dataclass, field
+from collections import namedtuple
 
 ROOT = 'HKEY_LOCAL_MACHINE'
 REG_SZ = 1
 UNTERMINATED = ' unterminated'
 
+_SECTION = re.compile(rf'\[(-?)(?:{ROOT}\\?)?(.*)\]', re.I)
 _QUOTED = r'"((?:[^"\\]|\\.)*)"'
 _VALUE = re.compile(rf'(?:@|{_QUOTED})=(?:{_QUOTED}|hex\(([0-9a-fA-F]+)\):([0-9a-fA-F, ]*)|(-))'
                     rf'({UNTERMINATED})?')
 
 
-class RegistryError(Exception):
-    pass
-
-
-@dataclass
-class Key:
-    path: str                                    # below the root, as first written
-    values: dict = field(default_factory=dict)   # lower-case name -> its name, type and bytes
+# Its path below the root, as first written, and (name, type, bytes) by the lower-case name of a value.
+Key = namedtuple('Key', 'path values')
 
 
 class Registry:
@@ -40,7 +35,7 @@ class Registry:
         parent, _, _ = path.rpartition('\\')
         if parent and parent.lower() not in self.keys:
             self.make(parent)
-        return self.keys.setdefault(path.lower(), Key(path))
+        return self.keys.setdefault(path.lower(), Key(path, {}))
 
     def put(self, key, name, kind, data):
         if self.terminates and kind == REG_SZ and not data.endswith(b'\0'):
@@ -51,10 +46,10 @@ class Registry:
         """Adds the keys and values of REGEDIT4 sections; [-KEY] and "name"=- delete."""
         key = None
         for line in text_lines:
-            if section := re.fullmatch(r'\[(-?)(.*)\]', line):
-                path = _below_root(section[2])
-                key = None if section[1] else self.make(path) if path else Key('')
-                if section[1]:
+            if section := _SECTION.fullmatch(line):
+                deleted, path = section.groups()
+                key = None if deleted else self.make(path) if path else Key('', {})
+                if deleted:
                     self._delete(path.lower())
             elif line and not line.startswith((';', 'REGEDIT4')):
                 self._put_line(key, line)
@@ -67,7 +62,7 @@ class Registry:
     def _put_line(self, key, line):
         match = _VALUE.fullmatch(line)
         if key is None or not match:
-            raise RegistryError(f'no value of a key: {line}')
+            raise ValueError(f'no value of a key: {line}')
         name, text, kind, data, deleted, unterminated = match.groups()
         name = _unquote(name or '')
         if deleted:
@@ -83,9 +78,7 @@ class Registry:
         lines = ['REGEDIT4', '']
         for key in self.keys.values():
             lines.append(f'[{ROOT}\\{key.path}]')
-            for name, kind, data in key.values.values():
-                text = self._line(name, kind, data)
-                lines.append(_hex_line(name, kind, data) if text.endswith(UNTERMINATED) else text)
+            lines += [self._line(*value, as_bytes=True) for value in key.values.values()]
             lines.append('')
         return '\n'.join(lines).encode(self.codepage)
 
@@ -93,12 +86,12 @@ class Registry:
         """By their lower-case names."""
         return {low: self._line(*value) for low, value in key.values.items()} if key else {}
 
-    def _line(self, name, kind, data):
-        text = data.removesuffix(b'\0')
-        if kind != REG_SZ or any(byte < 0x20 for byte in text):
-            return _hex_line(name, kind, data)
+    def _line(self, name, kind, data, as_bytes=False):
+        name, text = quote(name) if name else '@', data.removesuffix(b'\0')
+        if as_bytes or kind != REG_SZ or any(byte < 0x20 for byte in text):
+            return f'{name}=hex({kind:x}):{data.hex(",")}'
         mark = UNTERMINATED if text == data else ''
-        return f'{_name(name)}={quote(text.decode(self.codepage, "replace"))}{mark}'
+        return f'{name}={quote(text.decode(self.codepage, "replace"))}{mark}'
 
 
 def changes(before, after):
@@ -124,18 +117,3 @@ def quote(text):
 
 def _unquote(text):
     return re.sub(r'\\(.)', r'\1', text)
-
-
-def _name(name):
-    return quote(name) if name else '@'
-
-
-def _hex_line(name, kind, data):
-    return f'{_name(name)}=hex({kind:x}):{data.hex(",")}'
-
-
-def _below_root(path):
-    root, _, rest = path.partition('\\')
-    if root.upper().startswith('HKEY_') and root.upper() != ROOT:
-        raise RegistryError(f'a key outside {ROOT}: {path}')
-    return rest if root.upper() == ROOT else path

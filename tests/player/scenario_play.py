@@ -4,17 +4,16 @@ scenario says with what was done, both as checks in full: lines by what they che
 import contextlib
 import difflib
 import re
+import struct
 from datetime import datetime
-from os.path import commonprefix
 
 import file_tree
 import log_text
 import named_pages
 import registry_text
-from explained_log import misunderstood
 from good_runs import LANGUAGES, Before, checks_of
 from package_image import Image, PackedImage, damage, file_content, quoted_bytes
-from scenario_text import ACTIONS, DEFAULT_IMAGE, LOG, WORDS, ScenarioError
+from scenario_text import ACTIONS, DEFAULT_IMAGE, LOG, WORDS, ScenarioError, Section
 from worlds import Outcome
 
 # What the program asks of the system; only the stand-in machine tells of it.
@@ -36,17 +35,17 @@ def play(scenario, machine, tools, accept=False):
     """Raises ScenarioFailure, or ScenarioError for a scenario that can't be carried out. accept: the
     failure tells for each action that did not hold the checks that do, and all actions are played."""
     player = _Player(machine, tools, accept)
-    if not any(section.keyword == 'given image' for section in scenario.sections):
-        player.place_image(DEFAULT_IMAGE, PackedImage(tools))
-    failures = []
-    for section in scenario.sections:
+    sections, failures = scenario.sections, []
+    if not any(section.keyword == 'given image' for section in sections):
+        sections = [Section('given image', '', '', [], []), *sections]
+    for section in sections:
         try:
             if section.keyword not in ACTIONS:
-                player.prepare(section)
+                getattr(player, section.keyword.replace(' ', '_'))(section)
             elif report := player.act(section):
                 title = f'{section.place}: {section.keyword} {section.argument}'
                 failures.append('\n'.join([title, *report]))
-        except (registry_text.RegistryError, ValueError, KeyError, OSError, IndexError) as error:
+        except (ValueError, KeyError, OSError, IndexError, struct.error) as error:
             raise ScenarioError(f'{section.place}: {type(error).__name__}: {error}') from error
         if failures and not accept:
             break
@@ -56,26 +55,20 @@ def play(scenario, machine, tools, accept=False):
 
 class _Player:
     def __init__(self, machine, tools, accept):
-        self.machine = machine
-        self.tools = tools
-        self.accept = accept
-        self.images = {}      # path -> the image's bytes
-        self.packed = {}      # path -> PackedImage
+        self.machine, self.tools, self.accept = machine, tools, accept
+        self.packed = {}  # PackedImage by path
         self.last_image = DEFAULT_IMAGE  # that has run
-        self.times = []       # of each run: before and after it
+        self.times = []  # of each run: before and after it
 
-    # Preparations
+    # Preparations, by the section's keyword
 
-    def prepare(self, section):
-        getattr(self, '_' + section.keyword.replace(' ', '_'))(section)
-
-    def _given_machine(self, section):
+    def given_machine(self, section):
         self.machine.settings(section.body)
 
-    def _given_user(self, section):
-        self.machine.user(section.body)
+    def given_user(self, section):
+        self.machine.user = section.body
 
-    def _given_files(self, section):
+    def given_files(self, section):
         for line in section.body:
             path, _, content = line.partition(' = ')
             words = content.removesuffix(' read-only')
@@ -87,31 +80,27 @@ class _Player:
             else:
                 self._write(path, file_content(words, path, self.tools), read_only=words != content)
 
-    def _given_registry(self, section):
+    def given_registry(self, section):
         self.machine.set_registry(self.machine.registry().apply(section.body))
 
-    def _given_image(self, section):
+    def given_image(self, section):
         """Without a path: the image that every scenario has, with other options and more files."""
-        self.place_image(section.argument or DEFAULT_IMAGE,
-                         PackedImage(self.tools, section.body, not section.argument))
+        path = section.argument or DEFAULT_IMAGE
+        self.packed[path] = PackedImage(self.tools, section.body, usual=not section.argument)
+        self._write(path, self.packed[path].bytes)
 
-    def place_image(self, path, packed):
-        self.packed[path] = packed
-        self.images[path] = packed.bytes
-        self._write(path, packed.bytes)
-
-    def _given_run(self, section):
+    def given_run(self, section):
         """A run that other scenarios look at closely; here it has to succeed, no more."""
         outcome = self._run(section)
         if outcome.exit_code != 1 or outcome.trouble:
             raise ScenarioFailure(f'{section.place}: a given run ends with {outcome.exit_code} '
                                   f'{outcome.trouble}')
 
-    def _damage(self, section):
+    def damage(self, section):
         path = section.argument or DEFAULT_IMAGE
         for line in section.body:
-            self.images[path] = damage(self.images[path], line)
-        self._write(path, self.images[path])
+            self.packed[path].bytes = damage(self.packed[path].bytes, line)
+        self._write(path, self.packed[path].bytes)
 
     def _write(self, path, content, read_only=False):
         self.machine.add_drive(path[0])
@@ -122,7 +111,7 @@ class _Player:
     def act(self, section):
         """What does not hold, line by line; or, to accept, the checks that do."""
         files, registry = self.machine.files.snapshot(), self.machine.registry()
-        dialog = self.machine.has_user
+        dialog = self.machine.user is not None
         if section.keyword == 'run':
             outcome = self._run(section)
         else:
@@ -136,13 +125,13 @@ class _Player:
         report += [line for what in said | done for line in
                    _difference(what, said.get(what, []), done.get(what, []))]
         if section.keyword == 'run' and 'log' in done and not dialog:
-            report += misunderstood(self.tools.image_tool, self.machine.files.host(LOG),
-                                    outcome.exit_code)
+            log = self.machine.files.host(LOG)
+            report += log_text.misunderstood(self.tools.image_tool, log, outcome.exit_code)
         return _as_checks(done, before) if report and self.accept else report
 
     def _run(self, section):
         program, arguments = _program_and_arguments(section.argument)
-        if program in self.images:
+        if program in self.packed:
             self.last_image = program
         begun = datetime.now().replace(microsecond=0)  # a heading has whole seconds
         outcome = self.machine.run(program, arguments)
@@ -151,18 +140,17 @@ class _Player:
 
     def _said(self, action, before):
         said = {'exit': ['1']}
-        for check in action.checks:
+        for check in sorted(action.checks, key=lambda check: check.keyword in WORDS):
             lines = [check.argument] if check.keyword == 'exit' else check.body
             if check.keyword == 'log' and lines:
                 lines = ['heading', *lines]
             elif check.keyword == 'shown':
                 lines = [line for line in named_pages.without_words(lines)
                          if self.machine.tells_requests or not line.startswith(REQUESTS)]
-            if check.keyword not in WORDS:
-                said[check.subject] = log_text.without_words(lines)
-        for check in action.checks:
-            if check.keyword in WORDS:
+            if check.keyword in WORDS:  # behind all others
                 _say_words(said, f'{check.keyword} {check.argument}', before)
+            else:
+                said[check.subject] = log_text.without_words(lines)
         if before.registry.terminates:
             said['registry'] = [line.removesuffix(registry_text.UNTERMINATED)
                                 for line in said.get('registry', [])]
@@ -178,17 +166,14 @@ class _Player:
             path = LOG if what == 'log' else what.removeprefix('text ')
             if signs.get(path, '-') != '-':
                 del signs[path]
-                done[what] = self._text_lines(path, said.get(what, [])) or ['nothing']
+                text = self.machine.files.read(path).decode(self.machine.codepage, 'replace')
+                in_full = any(line.startswith('|Installing Moriv : ') for line in said.get(what, []))
+                done[what] = log_text.text_lines(text, [] if in_full else self.times) or ['nothing']
         words = dict(line[2:].split(' = ', 1) for line in said['files'] if ' = ' in line)
         done['files'] = sorted(self._file_line(sign, path, words.get(path))
                                for path, sign in signs.items())
         done['registry'] = registry_text.changes(before.registry, self.machine.registry())
         return done
-
-    def _text_lines(self, path, said):
-        text = self.machine.files.read(path).decode(self.machine.codepage, 'replace')
-        in_full = any(line.startswith('|Installing Moriv : ') for line in said)
-        return log_text.text_lines(text, [] if in_full else self.times)
 
     def _file_line(self, sign, path, said):
         """said: words for the content, None when nothing is said of the file."""
@@ -196,41 +181,40 @@ class _Player:
             return f'{sign} {path}'
         content = self.machine.files.read(path)
         names = self.packed[self.last_image].contents if self.last_image in self.packed else ()
-        known = [*(f'first {len(content)} bytes of {name}' for name in names), 'the INF file',
-                 *(f'original {name}' for name in names),
-                 *(f'removal program in {name}' for name in LANGUAGES)]  # the last one is the best
-        if not said or (expected := self._content(said)) != content:
-            same = len(commonprefix([expected, content])) if said else 0
-            said = f'{len(content)} bytes' + (f', other from byte {same} on' if said else '')
-            for words in known:
-                with contextlib.suppress(ValueError):  # a damaged image may have no removal program
-                    if self._content(words) == content:
-                        said = words
-        return f'{sign} {path} = {said}'
+        known = [*([said] if said else []), *(f'removal program in {name}' for name in LANGUAGES),
+                 *(f'original {name}' for name in names), 'the INF file',
+                 *(f'first {len(content)} bytes of {name}' for name in names)]
+        for words in known:
+            # A damaged image may have no removal program; what is said may be no words.
+            with contextlib.suppress(ValueError, KeyError, struct.error):
+                if self._content(words) == content:
+                    return f'{sign} {path} = {words}'
+        return f'{sign} {path} = {len(content)} other bytes'
 
     def _content(self, words):
         """The bytes that the words behind a file's '=' stand for in a check."""
         if words == 'the INF file':
             return INF_FILE
-        if match := re.fullmatch(r'(?:first (\d+) bytes of|original) (\S+)', words):
-            return self.packed[self.last_image].contents[match[2]][:int(match[1]) if match[1] else None]
+        if match := re.fullmatch(r'(?:first (\d+) bytes of|original) (\S+)(?: of (.+))?', words):
+            content = self.packed[match[3] or self.last_image].contents[match[2]]
+            return content[:int(match[1] or len(content))]
         if match := re.fullmatch(r'removal program(?: in (\w+))?', words):
             language = match[1] or 'French'
             offset = LANGUAGES[language].offset if language in LANGUAGES else int(language)
-            return Image(self.images[self.last_image]).removal_program(offset)
+            return Image(self.packed[self.last_image].bytes).removal_program(offset)
         return quoted_bytes(words)
 
 
 def _say_words(said, words, before):
     """Puts the checks of a word where the scenario has none of its own; those of an end behind them."""
-    checks = checks_of(words.replace(' ,', ',').strip(), before)
+    events, files, registry = checks_of(words.replace(' ,', ',').strip(), before)
     if words.startswith(('registered', 'unregistered')):
         log = said.get('log', ['heading'])
-        said['log'] = log + log_text.numbered(checks.events, log)
-        said['files'] = said.get('files', []) + checks.files
-    said.setdefault('log', ['heading', *log_text.numbered(checks.events, [])])
-    said.setdefault('files', sorted(checks.files))
-    said.setdefault('registry', checks.registry)
+        said['log'] = log + log_text.numbered(events, log)
+        said['files'] = said.get('files', []) + files
+    said.setdefault('log', ['heading', *log_text.numbered(events, [])])
+    said.setdefault('files', sorted(files))
+    said.setdefault('registry', registry)
 
 
 def _as_checks(done, before):

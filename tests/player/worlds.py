@@ -8,7 +8,6 @@ import contextlib
 import errno
 import fcntl
 import os
-import re
 import shutil
 import subprocess
 import time
@@ -40,32 +39,24 @@ class WorldError(Exception):
 
 def make_world(name, native, work, wine=BUILD / 'wine'):
     """native: folder of the native build; work: folder for machines; wine: folder for Wine prefixes."""
-    if name == 'stand-in':
-        return StandIn(native, work)
-    bits = name.removeprefix('wine')
-    return Wine(bits, wine / f'scenarios{bits}')
+    return StandIn(native, work) if name == 'stand-in' else Wine(name, wine)
 
 
 class Machine:
-    """What the machines of both worlds do alike."""
+    """What the machines of both worlds do alike. Has its files, and a script for the next run's user."""
 
     codepage = 'cp1252'
-    now = None  # its own time, when it is set
+    now = None   # its own time, when it is set
+    user = None  # what the user of the next run does, line by line; the run behind it has none
 
-    def __init__(self, files, script):
-        """script: file for what the user of the next run does."""
-        self.files = files
-        self.script = script
-        self.has_user = False
-
-    def user(self, lines):
-        """The script of the user of the next run; the one behind it has none."""
-        self.script.write_text('\n'.join(lines) + '\n', encoding='utf-8')
-        self.has_user = True
+    def add_drive(self, letter):
+        """Under a world where it is not enough that a drive has a folder."""
 
     def run(self, program, arguments):
-        had_user, self.has_user = self.has_user, False
-        return self._run(program, arguments, had_user)
+        user, self.user = self.user, None
+        if user is not None:
+            self.script.write_text('\n'.join(user) + '\n', encoding='utf-8')
+        return self._run(program, arguments, user is not None)
 
 
 class StandIn:
@@ -73,8 +64,7 @@ class StandIn:
     at_once = 2
 
     def __init__(self, native, work):
-        self.stub = native / 'MorivSetup'
-        self.tool = native / 'moriv-machine'
+        self.stub, self.tool = native / 'MorivSetup', native / 'moriv-machine'
         self.work = work.resolve()
         self.fresh = self.work / 'fresh'
 
@@ -95,14 +85,12 @@ class StandInMachine(Machine):
     tells_requests = True  # what the program asks of the system is shown
 
     def __init__(self, folder, tool):
-        super().__init__(FileTree(folder), folder.with_suffix('.user'))
-        self.folder = folder
-        self.tool = tool
+        self.folder, self.tool = folder, tool
+        self.files, self.script = FileTree(folder), folder.with_suffix('.user')
 
     def settings(self, lines):
-        text = '\n'.join(lines) + '\n'
-        (self.folder / 'machine.ini').write_text(text, encoding='utf-8')
-        settings = dict(re.findall('^(now|codepage) = (.*)', text, re.M))
+        (self.folder / 'machine.ini').write_text('\n'.join(lines) + '\n', encoding='utf-8')
+        settings = dict(line.split(' = ', 1) for line in lines if ' = ' in line)
         self.codepage = f'cp{settings.get("codepage", 1252)}'
         self.now = datetime.fromisoformat(settings['now']) if 'now' in settings else None
 
@@ -120,10 +108,8 @@ class StandInMachine(Machine):
             environment['MORIV_USER'] = str(self.script)
         try:
             done = self._start(command, environment)
-        except subprocess.TimeoutExpired:
-            return Outcome(None, [], f'ended after {TIME_LIMIT} seconds')
-        except OSError as error:
-            return Outcome(None, [], f'cannot start: {error}')
+        except (subprocess.TimeoutExpired, OSError) as error:
+            return Outcome(None, [], str(error))
         code, shown = _split_exit_code(done.stdout.decode('utf-8', 'replace').splitlines())
         errors = done.stderr.decode('utf-8', 'replace').strip()
         status = 0 if code in (None, 0, 1) or code > 100000 else 1
@@ -142,10 +128,6 @@ class StandInMachine(Machine):
                 if error.errno != errno.ETXTBSY or attempt == 99:
                     raise
                 time.sleep(0.02)
-
-    def add_drive(self, letter):
-        """A drive exists when its folder does."""
-        (self.folder / f'drive_{letter.lower()}').mkdir(exist_ok=True)
 
     def restart(self):
         _call(self.tool, 'restart', self.folder)
@@ -171,24 +153,15 @@ class Wine:
 
     # All that the program and the scenarios touch; the rest of Wine's registry is not looked at. The
     # last three are there on a fresh machine.
-    WATCHED = (r'SOFTWARE\Zeb', r'SOFTWARE\Netscape',
-               r'SOFTWARE\Classes\http\shell\open\command',
-               r'SOFTWARE\Classes\htmlfile\shell\open\command',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\Uninstall',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\RunOnce',
-               r'SOFTWARE\Microsoft\Windows\CurrentVersion\App Paths')
+    WATCHED = [rf'SOFTWARE\{key}' for key in (
+        'Zeb', 'Netscape', r'Classes\http\shell\open\command', r'Classes\htmlfile\shell\open\command',
+        *(rf'Microsoft\Windows\CurrentVersion\{key}' for key in ('Uninstall', 'RunOnce', 'App Paths')))]
 
-    def __init__(self, bits, prefix):
-        """bits: '32' or '64'."""
-        build = BUILD / f'win{bits}'
-        self.name = f'wine{bits}'
-        self.bits = bits
-        self.stub = build / 'MorivSetup.exe'
-        self.agent_program = build / 'tests' / 'scenario_agent.exe'
-        self.driver = build / 'tests' / 'dialog_driver.exe'
-        self.prefix = prefix
-        self.files = FileTree(prefix)
-        self.agent = None
+    def __init__(self, name, folder):
+        self.name, self.bits = name, name.removeprefix('wine')
+        self.prefix, build = folder / f'scenarios{self.bits}', BUILD / f'win{self.bits}'
+        self.stub, self.driver = build / 'MorivSetup.exe', build / 'tests' / 'dialog_driver.exe'
+        self.agent = None  # its process
 
     def open(self):
         answer = subprocess.run([self.tool, 'can-run', self.bits], capture_output=True, text=True)
@@ -197,7 +170,8 @@ class Wine:
             asked_for = os.environ.get('MORIV_WINE') == 'none' or self.bits == '32'
             raise WorldError(f'left out: {(answer.stdout or answer.stderr).strip()}',
                              LEFT_OUT if asked_for else 1)
-        require(self.stub, self.agent_program, self.driver)
+        agent = self.driver.with_name('scenario_agent.exe')
+        require(self.stub, agent, self.driver)
         self.prefix.parent.mkdir(parents=True, exist_ok=True)
         # Two runs in one prefix would see each other's files; the second one waits.
         self.lock = open(f'{self.prefix}.in-use', 'w')
@@ -205,8 +179,9 @@ class Wine:
         _call(self.tool, 'prefix', self.prefix, self.bits)
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
-        self.agent = Agent([*display, self.tool, 'run', self.prefix, self.agent_program],
-                           f'{self.prefix}.agent-log')
+        with open(f'{self.prefix}.agent-log', 'wb') as errors:
+            self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent],
+                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors)
         self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
             self.fresh_registry.make(key)
@@ -214,46 +189,60 @@ class Wine:
 
     def close(self):
         if self.agent:
-            self.agent.close()
+            self.agent.stdin.close()
+            self.agent.wait(timeout=TIME_LIMIT)
             _call(self.tool, 'stop', self.prefix)
 
     def machine(self, name):
         return WineMachine(self)
+
+    def ask(self, command):
+        """Sends one command to the agent in the session (tools/windows/scenario_agent.cpp); gives the
+        lines of its answer."""
+        with contextlib.suppress(BrokenPipeError):  # the missing answer tells it below
+            self.agent.stdin.write(command.encode('cp1252') + b'\n')
+            self.agent.stdin.flush()
+        lines = []
+        for raw in self.agent.stdout:
+            line = raw.decode('cp1252', 'replace').rstrip('\r\n')
+            if line == '.':
+                return lines
+            if line.startswith('failed: '):
+                raise WorldError(f'{command}: {line}')
+            lines.append(line)
+        raise WorldError(f'the agent under Wine ended at "{command}"; see {self.prefix}.agent-log')
 
 
 class WineMachine(Machine):
     tells_requests = False
 
     def __init__(self, world):
-        super().__init__(world.files, Path(f'{world.prefix}.user'))
         self.world = world
-        self.agent = world.agent
+        self.files, self.script = FileTree(world.prefix), Path(f'{world.prefix}.user')
 
     def registry(self):
         registry = Registry(terminates=True)
-        for line in [line for key in self.world.WATCHED for line in self.agent.ask(f'dump {key}')]:
-            kind, rest = line.split(' ', 1)
-            if kind == 'key':
-                key = registry.make(rest)
+        for line in [line for key in self.world.WATCHED for line in self.world.ask(f'dump {key}')]:
+            what, *words = line.split(' ')
+            if what == 'key':
+                key = registry.make(' '.join(words))
             else:
-                kind, *texts = rest.split(' ')
-                name, data = (bytes.fromhex(text.strip('-')) for text in texts)
-                registry.put(key, name.decode(self.codepage, 'replace'), int(kind), data)
+                name, data = (bytes.fromhex(text.strip('-')) for text in words[1:])
+                registry.put(key, name.decode(self.codepage, 'replace'), int(words[0]), data)
         return registry
 
     def set_registry(self, registry):
         for key in self.world.WATCHED:
-            self.agent.ask(f'delete {key}')
+            self.world.ask(f'delete {key}')
         watched = [f'{key}\\'.lower() for key in self.world.WATCHED]
         for low, key in registry.keys.items():
-            if not f'{low}\\'.startswith(tuple(watched)):
-                if any(one.startswith(f'{low}\\') for one in watched):
-                    continue  # a parent that every machine has
+            # In one of them, or a parent, which every machine has.
+            if not any(f'{low}\\'.startswith(one) or one.startswith(f'{low}\\') for one in watched):
                 raise WorldError(f'not watched under Wine: {key.path}')
-            self.agent.ask(f'key {key.path}')
+            self.world.ask(f'key {key.path}')
             for name, kind, data in key.values.values():
                 name = name.encode(self.codepage).hex()
-                self.agent.ask(f'value {kind} {name or "-"} {data.hex() or "-"}')
+                self.world.ask(f'value {kind} {name or "-"} {data.hex() or "-"}')
 
     def add_drive(self, letter):
         drive = f'drive_{letter.lower()}'
@@ -265,15 +254,23 @@ class WineMachine(Machine):
     def _run(self, program, arguments, has_user):
         """A user's script is played by tools/windows/dialog_driver.cpp, which writes what is shown."""
         if not has_user:
-            code, rest = _split_exit_code(self.agent.run(program, arguments))
+            code, rest = _split_exit_code(self._start(program, arguments))
             return Outcome(code, [], ' '.join(rest))
         shown = Path(f'{self.world.prefix}.shown')
         shown.write_bytes(b'')
         driver, script, output = (_windows_path(p) for p in (self.world.driver, self.script, shown))
-        answer = self.agent.run(driver, f'{script} {output} "{program}" {arguments}')
+        answer = self._start(driver, f'{script} {output} "{program}" {arguments}')
         code, lines = _split_exit_code(shown.read_text(encoding='utf-8', errors='replace').splitlines())
         trouble = '' if code is not None else f'the driver gave no exit code: {" ".join(answer)}'
         return Outcome(code, lines, trouble)
+
+    def _start(self, program, arguments):
+        """A busy host refuses to start a program now and then, with an internal error."""
+        for _ in range(3):
+            answer = self.world.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
+            if answer != ['cannot start: 1359']:
+                break
+        return answer
 
     def restart(self):
         # Only what a start does with one-time commands; the session and the agent stay.
@@ -300,43 +297,6 @@ class WineMachine(Machine):
 def _windows_path(path):
     """Drive Z: of a prefix is the whole host."""
     return 'Z:' + str(path.resolve()).replace('/', '\\')
-
-
-class Agent:
-    """The helper program in a Wine session (tools/windows/scenario_agent.cpp)."""
-
-    def __init__(self, command, error_log):
-        self.error_log = error_log
-        with open(error_log, 'wb') as errors:
-            self.process = subprocess.Popen(command, stdin=subprocess.PIPE, stdout=subprocess.PIPE,
-                                            stderr=errors)
-
-    def run(self, program, arguments):
-        """A busy host refuses to start a program now and then, with an internal error."""
-        for _ in range(3):
-            answer = self.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
-            if answer != ['cannot start: 1359']:
-                break
-        return answer
-
-    def ask(self, command):
-        """Sends one command; gives the lines of its answer."""
-        with contextlib.suppress(BrokenPipeError):  # the missing answer tells it below
-            self.process.stdin.write(command.encode('cp1252') + b'\n')
-            self.process.stdin.flush()
-        lines = []
-        for raw in self.process.stdout:
-            line = raw.decode('cp1252', 'replace').rstrip('\r\n')
-            if line == '.':
-                return lines
-            if line.startswith('failed: '):
-                raise WorldError(f'{command}: {line}')
-            lines.append(line)
-        raise WorldError(f'the agent under Wine ended at "{command}"; see {self.error_log}')
-
-    def close(self):
-        self.process.stdin.close()
-        self.process.wait(timeout=TIME_LIMIT)
 
 
 def require(*products):

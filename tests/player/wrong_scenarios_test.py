@@ -12,27 +12,21 @@ from scenario_text import CHECKS, ScenarioError, parse
 # Scenario, what stands there, and what is said instead.
 FALSEHOODS = [
     ('fresh_silent_install', 'log\n', 'exit 100004\nlog\n'),
-    ('fresh_silent_install', '|2- File', '|3- File'),
     ('fresh_silent_install', 'registry |', 'registry|'),
     ('fresh_silent_install', '  + C:\\Program Files\\Moriv\\\n', ''),
     ('fresh_silent_install', 'zebnet.dll = original zebnet.dll\n', 'zebnet.dl = ""\n'),
     ('fresh_silent_install', '+ C:\\windows\\MorivRmv', '~ C:\\windows\\MorivRmv'),
-    ('fresh_silent_install', 'original zebddb.exe', 'original zebdial.exe'),
     ('fresh_silent_install', 'removal program', 'removal program in German'),
-    ('fresh_silent_install', '"Language"="FR"', '"Language"="DE"'),
     ('fresh_silent_install', '"FR" unterminated', '"FR"'),
     ('fresh_silent_install', '  + [SOFTWARE\\Zeb\\Moriv\\Services]\n', ''),
     ('fresh_silent_install', '"DisplayName"="ZEB', '"displayname"="ZEB'),
-    ('install_over_an_install', ', listed', ''),
     ('install_over_an_install', 'in German, listed', 'in German, listed\nregistry'),
-    ('removal_by_the_removal_program', '|RemoveFiles = 10|', '|RemoveFiles=10|'),
     ('removal_by_the_removal_program', '|RemoveFiles = 10|', '|RemoveFiles = 10|\n  ||'),
     ('removal_by_the_removal_program', '  - [SOFTWARE\\Zeb\\Moriv]\n', ''),
     ('removal_by_the_setup_image', ', listed', ''),
     ('restart_after_a_removal', '  - C:\\windows\\Moriv.INF\n', ''),
     ('report_file_is_appended_to', '  heading\n  |1- File', '  |1- File'),
     ('run_without_events_leaves_the_log', 'exit -1000005', 'exit -1000005\nlog\n  fatal x'),
-    ('services_block_a_removal', '[-SOFTWARE\\Zeb\\Moriv\\Services\\x]', ''),
     ('log_heading_to_the_letter', 'Saturday', 'saturday'),
     ('dialog_fresh_install', '  page installed\n', '  page installed in German\n'),
     ('dialog_refused_directory', '    |903 Edit shown enabled ""|\n', ''),
@@ -42,12 +36,12 @@ FALSEHOODS = [
 
 # Texts that are no scenario, and the line that is named.
 MALFORMED = [
-    ('exit 1\n', 1), ('given files\n  C:\\a = "x"\n', ''), ('given machine\nrun\n', 1),
-    ('only stand-in:\nrun\n', ''), ('run\nonly stand-in: too late\n', 2),
-    ('run\nlog\n  no bars\n', 3), ('run\nfile\n', 2), ('each\n  a | b\n  1\nrun {a}\n', 3),
-    ('each\n  a\n  1\nrun {b}\n', 4), ('damage C:\\a.exe\n  no records\nrun\n', 1),
-    ('damage\n  no such damage\nrun\n', 1), ('run\ninstalled in Latin\n', 1),
-    ('run\nshown\n  page x\n', 1), ('run\nshown\n  |box|\n    |1 x|\n', 1),
+    ('exit 1\n', 1), ('given files\n  C:\\a = "x"\n', ''), ('only stand-in:\nrun\n', 1),
+    ('run\nonly stand-in: late\n', 2), ('run\nlog\n  no bars\n', 3), ('run\nfile\n', 2),
+    ('each\n  a | b\n  1\nrun {a}\n', 3), ('each\n  a\n  1\nrun {b}\n', 4),
+    ('damage C:\\a.exe\n  no records\nrun\n', 1), ('damage\n  no such damage\nrun\n', 1),
+    ('run\ninstalled in Latin\n', 1), ('run\nshown\n  page x\n', 1),
+    ('run\nshown\n  |box|\n    |1 x|\n', 1),
 ]
 
 
@@ -89,10 +83,8 @@ def test_malformed(play_text, text, line):
                                   'dialog_cancel_in_a_long_stream'])
 def test_accepted(play_text, name):
     """Without its checks a scenario fails, and what the failure prints are checks that hold."""
-    kept, is_check = [], False
-    for line in text_of(name).splitlines():
-        is_check = is_check if line.startswith('  ') else line.startswith(CHECKS)
-        kept += [] if is_check else [line]
+    check = rf'^(?:{"|".join(CHECKS)})\b.*\n(?:  .*\n)*'
+    kept = re.sub(check, '', text_of(name), flags=re.M).splitlines()
     with pytest.raises(ScenarioFailure) as failure:
         play_text('\n'.join(kept), accept=True)
     blocks = re.split(r'^text:(\d+): .*\n', str(failure.value), flags=re.M)

@@ -117,6 +117,7 @@ TEST_F(Wizard, WithoutAContextItHasAFailurePageAndWithoutMemoryNoLanguages) {
   });
   FailAllocation(2);
   EXPECT_EQ(RunWizard(nullptr), StatusDialogAborted);
+  EXPECT_EQ(wizardState.window, nullptr) << "the hooks would go on with a dialog that is gone";
   machine::ForgetUser();
   FailCall("DialogBoxParamA");
   EXPECT_EQ(RunWizard(&context), StatusDialogAborted);
