@@ -86,10 +86,9 @@ TEST(VersionBlock, OddLengthsOfATextDoNoHarm) {
 TEST(VersionFunctions, FillAndAskABlockOfTheirOwnForm) {
   const TestMachine pc;
   // A text that fills the resource to its last byte, without a NUL, has the tightest copy.
-  const std::string tight = ByteBuilder().Wide("123456789").bytes();
-  const std::string resource =
-      VersionBlock("VS_VERSION_INFO", false, 0, "",
-                   {VersionBlock("A", true, 9, tight, {}), VersionBlock("B", true, 9, tight, {})});
+  const std::string a = VersionBlock("A", true, 9, ByteBuilder().Wide("abcdefghi").bytes(), {});
+  const std::string b = VersionBlock("B", true, 9, ByteBuilder().Wide("123456789").bytes(), {});
+  const std::string resource = VersionBlock("VS_VERSION_INFO", false, 0, "", {a, b});
   pc.Write("drive_c/a.dll", PortableExecutable(true, 16, 1, {{0, resource}}));
   const DWORD size = GetFileVersionInfoSizeA("C:\\A.DLL", nullptr);
   std::vector<uint8_t> block(size, 0xCD);
@@ -100,8 +99,8 @@ TEST(VersionFunctions, FillAndAskABlockOfTheirOwnForm) {
   EXPECT_TRUE(VerQueryValueA(block.data(), "\\A", &first, &length));
   EXPECT_TRUE(VerQueryValueA(block.data(), "\\B", &last, &length));
   EXPECT_LE(static_cast<uint8_t*>(last) + length, block.data() + size);
-  // Answers don't share their room.
-  for (const void* text : {first, last}) EXPECT_STREQ(static_cast<const char*>(text), "123456789");
+  EXPECT_STREQ(static_cast<const char*>(first), "abcdefghi");  // answers don't share their room
+  EXPECT_STREQ(static_cast<const char*>(last), "123456789");
   EXPECT_FALSE(GetFileVersionInfoA("C:\\A.DLL", 0, size - 1, block.data()));
   EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &first, &length));
 }
