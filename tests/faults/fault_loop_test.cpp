@@ -86,7 +86,7 @@ class FaultLoop : public testing::Test {
     }
     TryCalls({.function = kAllocation});
     TryCalls({.function = kAllocation, .fromThenOn = true});
-    if (!kind.workButtons.empty()) TryCalls({.function = kCancel});
+    if (kind.IsDialog()) TryCalls({.function = kCancel});
     Tell();
     EXPECT_TRUE(faults >= floor.faults && faults - endedWell >= floor.failures &&
                 powerLosses >= floor.powerLosses && statesRunAgain.size() >= floor.statesRunAgain);
@@ -153,24 +153,25 @@ class FaultLoop : public testing::Test {
   }
 
   void Complain(const FaultyRun& run, const std::vector<std::string>& complaints) {
+    const Injection& fault = run.injection;
     for (const std::string& complaint : complaints) {
       ++complaintCount;
-      ADD_FAILURE() << Describe(run.injection) << ", code " << run.report.code << ": " << complaint;
+      ADD_FAILURE() << fault.function << ' ' << fault.call << (fault.fromThenOn ? " on" : "")
+                    << (fault.isShort ? " short" : "") << (fault.stop ? " stop" : "") << ", code "
+                    << run.report.code << ": " << complaint;
     }
   }
 
   // One line, which tools/test shows at the end of all tests.
   void Tell() const {
+    const std::string name = testing::UnitTest::GetInstance()->current_test_info()->name();
     std::ostringstream line;
-    line << "faults: " << kind.name << ": " << faults << " tried, " << complaintCount
-         << " complaints; " << endedWell << " ended well, " << faults - endedWell
-         << " with a failure; " << powerLosses << " power losses; run again from "
-         << statesRunAgain.size() << " states\n";
+    line << "faults: " << name << ": " << faults << " tried, " << complaintCount << " complaints; "
+         << endedWell << " ended well, " << faults - endedWell << " with a failure; " << powerLosses
+         << " power losses; run again from " << statesRunAgain.size() << " states\n";
     std::cout << line.str();
     fs::create_directories(MORIV_COUNTS_DIR);
-    std::string file = kind.name + ".count";
-    std::ranges::replace(file, ' ', '-');
-    std::ofstream(fs::path(MORIV_COUNTS_DIR) / file) << line.str();
+    std::ofstream(fs::path(MORIV_COUNTS_DIR) / (name + ".count")) << line.str();
   }
 
   TestMachine pc;
@@ -189,56 +190,43 @@ class FaultLoop : public testing::Test {
 constexpr char kSilentInstall[] = "/s /r /rf:C:\\report.txt";
 
 TEST_F(FaultLoop, FreshInstall) {
-  Run({.name = "fresh install", .commandLine = kSilentInstall}, Machine::kFresh,
-      {500, 190, 90, 50});
+  Run({.commandLine = kSilentInstall}, Machine::kFresh, {500, 190, 90, 50});
 }
 
 TEST_F(FaultLoop, Update) {
-  Run({.name = "update", .commandLine = kSilentInstall}, Machine::kOutdated, {520, 200, 95, 40});
+  Run({.commandLine = kSilentInstall}, Machine::kOutdated, {520, 200, 95, 40});
 }
 
 // The image is read, and all that is written goes, through the runtime's descriptors.
 TEST_F(FaultLoop, UpdateByDescriptors) {
-  Run({.name = "update by descriptors",
-       .commandLine = kSilentInstall,
-       .always = {{.function = "CreateFileA", .fromThenOn = true}}},
+  Run({.commandLine = kSilentInstall, .always = {{.function = "CreateFileA", .fromThenOn = true}}},
       Machine::kOutdated, {560, 220, 100, 40}, "platform = 9x\n");
 }
 
 TEST_F(FaultLoop, Removal) {
-  Run({.name = "removal", .work = kRemoval, .commandLine = "/s /u /r"}, Machine::kUpToDate,
-      {310, 75, 55, 45});
+  Run({.work = kRemoval, .commandLine = "/s /u /r"}, Machine::kUpToDate, {310, 75, 55, 45});
 }
 
 TEST_F(FaultLoop, RemovalProgram) {
-  Run({.name = "removal program",
-       .work = kRemoval,
-       .commandLine = "/s /r",
-       .image = "drive_c/windows/MorivRmv.exe"},
+  Run({.work = kRemoval, .commandLine = "/s /r", .image = "drive_c/windows/MorivRmv.exe"},
       Machine::kUpToDate, {310, 75, 55, 45}, "platform = 9x\n");
 }
 
 TEST_F(FaultLoop, Help) {
-  Run({.name = "help", .work = kHelp, .commandLine = "/h /s /rf:C:\\report.txt"}, Machine::kFresh,
-      {50, 0, 5, 0});
+  Run({.work = kHelp, .commandLine = "/h /s /rf:C:\\report.txt"}, Machine::kFresh, {50, 0, 5, 0});
 }
 
 TEST_F(FaultLoop, DialogInstall) {
-  Run({.name = "dialog install", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kFresh,
-      {1200, 340, 70, 50});
+  Run({.workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kFresh, {1200, 340, 70, 50});
 }
 
 TEST_F(FaultLoop, DialogUpdate) {
-  Run({.name = "dialog update", .workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kOutdated,
-      {1300, 360, 75, 40});
+  Run({.workButtons = {IDC_NEXT, IDC_UPDATE}}, Machine::kOutdated, {1300, 360, 75, 40});
 }
 
 TEST_F(FaultLoop, DialogRemoval) {
-  Run({.name = "dialog removal",
-       .work = kRemoval,
-       .commandLine = "/u /r",
-       .workButtons = {IDC_REMOVE}},
-      Machine::kUpToDate, {1050, 165, 60, 45});
+  Run({.work = kRemoval, .commandLine = "/u /r", .workButtons = {IDC_REMOVE}}, Machine::kUpToDate,
+      {1050, 165, 60, 45});
 }
 
 }  // namespace

@@ -79,7 +79,7 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
     std::fprintf(stderr, "%s\n", error.c_str());
     _exit(EXIT_FAILURE);
   }
-  if (!kind.workButtons.empty()) machine::SetUser(DecidedUser(kind.workButtons, report));
+  if (kind.IsDialog()) machine::SetUser(DecidedUser(kind.workButtons, report));
 
   SetupRequest request = {};
   request.language = kLanguageNone;
@@ -89,8 +89,7 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
   report->code = RunSetup(request);
   (void)WithdrawAllocationFailure();
   report->leakedBlocks = LiveAllocations() - liveBefore;
-  const std::string open = machine::Stop();
-  std::snprintf(report->openObjects, sizeof(report->openObjects), "%s", open.c_str());
+  (void)machine::Stop().copy(report->openObjects, sizeof(report->openObjects) - 1);
   report->end = RunEnd::kReturned;
   _exit(EXIT_SUCCESS);
 }
@@ -102,12 +101,6 @@ void InjectFault(const RunKind& kind, const Injection& injection, const fs::path
 extern "C" const char* __asan_default_options();
 extern "C" const char* __asan_default_options() {
   return "quarantine_size_mb=8";
-}
-
-std::string Describe(const Injection& injection) {
-  return injection.function + " " + std::to_string(injection.call) +
-         (injection.fromThenOn ? " on" : "") + (injection.isShort ? " short" : "") +
-         (injection.stop ? " stop" : "");
 }
 
 RunReport RunWithFault(const RunKind& kind, const Injection& injection, const fs::path& folder) {

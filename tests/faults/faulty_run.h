@@ -10,9 +10,7 @@
 
 enum Work : unsigned { kInstall = 1, kRemoval = 2, kHelp = 4 };
 
-// What is run.
 struct RunKind {
-  std::string name = {};
   Work work = kInstall;
   std::string commandLine = {};
   std::string image = "drive_c/setup.exe";
@@ -20,6 +18,8 @@ struct RunKind {
   std::vector<int> workButtons = {};
   // Faults that strike each run of this kind, and don't count.
   std::vector<machine::Fault> always = {};
+
+  bool IsDialog() const { return !workButtons.empty(); }
 };
 
 inline constexpr char kAllocation[] = "allocation";
@@ -28,9 +28,6 @@ inline constexpr char kCancel[] = "cancel";
 // A fault of a function of the seam or of kAllocation, or kCancel: the user of a dialog cancels
 // while the n-th poll of a pass looks for messages. An empty name: none.
 using Injection = machine::Fault;
-
-// "WriteFile 3 on".
-std::string Describe(const Injection& injection);
 
 enum class RunEnd {
   kReturned,

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <optional>
 #include <regex>
-#include <string_view>
+#include <set>
 
 #include "tests/support/documented_codes.h"
 #include "tools/image/run_explainer.h"
@@ -12,18 +12,12 @@ namespace {
 
 using Complaints = std::vector<std::string>;
 
-bool IsDialog(const RunKind& kind) {
-  return !kind.workButtons.empty();
-}
-
-bool IsOneOf(std::string_view name, std::initializer_list<std::string_view> names) {
-  return std::ranges::find(names, name) != names.end();
-}
+using Names = std::set<std::string>;
 
 // ---- Exit code and log
 
 bool IsKnownEnd(const RunKind& kind, StatusCode code) {
-  if (IsDialog(kind))
+  if (kind.IsDialog())
     return code == StatusOk || code == StatusCancelled || code == StatusDialogAborted;
   if (kind.work == kHelp) return code == 0;
   return IsSilentEnd(code, kind.work == kInstall ? "Install" : "Removal");
@@ -32,9 +26,9 @@ bool IsKnownEnd(const RunKind& kind, StatusCode code) {
 // A log that has no name, no memory or no directory or can't be made in either way is left out, and
 // so is that of a dialog that was cancelled or never made.
 bool CanLackLog(const FaultyRun& run) {
-  return run.report.code == StatusCancelled ||
-         IsOneOf(run.injection.function,
-                 {kAllocation, "LoadStringA", "GetWindowsDirectoryA", "_creat", "DialogBoxParamA"});
+  static const Names reasons = {kAllocation, "LoadStringA", "GetWindowsDirectoryA", "_creat",
+                                "DialogBoxParamA"};
+  return run.report.code == StatusCancelled || reasons.contains(run.injection.function);
 }
 
 // Of each event of a log of one block whether it is fatal; nullopt when a byte is out of form.
@@ -59,10 +53,11 @@ bool HasRightEvents(const FaultyRun& run, const char* path, const std::vector<bo
   // An event that finds no memory is lost, and nothing else.
   if (run.injection.function == kAllocation) return true;
   const auto fatal = std::ranges::count(events, true);
-  if (IsDialog(run.kind)) {
+  if (run.kind.IsDialog()) {
     // A seek that fails in the check for older files closes the package without an event, and the
     // pass that finds it closed adds none. Nor does a pass that the user stops between two records.
-    if (fatal == 0 && IsOneOf(run.injection.function, {"SetFilePointer", kCancel})) return true;
+    if (fatal == 0 && Names{"SetFilePointer", kCancel}.contains(run.injection.function))
+      return true;
     return fatal == (run.report.code == StatusDialogAborted ? 1 : 0);
   }
   // A silent run gives up at its fatal event, and a reader of the log is told the exit code.
@@ -164,9 +159,8 @@ std::vector<std::string> JudgeRun(const FaultyRun& run) {
   if (run.report.end == RunEnd::kReturned) {
     if (run.injection.stop) complaints.emplace_back("the power was not lost");
     const std::string open = run.report.openObjects;
-    const int leaked = run.report.leakedBlocks;
     if (!open.empty()) complaints.push_back("open: " + open);
-    if (leaked != 0) complaints.push_back(std::to_string(leaked) + " blocks leaked");
+    if (run.report.leakedBlocks != 0) complaints.emplace_back("memory leaked");
     if (!IsKnownEnd(run.kind, run.report.code)) complaints.emplace_back("no exit code of this run");
     for (const char* path : {kLogPath, kReportPath}) JudgeLog(run, path, &complaints);
   }

@@ -21,10 +21,9 @@ inline bool EndedWell(int code) {
   return code >= 0;
 }
 
-// What is wrong, one text each: the end of the run, what it left open, its exit code, its log and
-// report, and the machine. Each thing on that is what it was, what an undisturbed run makes of it,
-// or gone, and after a power loss a file may be a beginning; what such a run leaves alone is
-// untouched.
+// What is wrong, one text each. On the machine each thing is what it was, what an undisturbed run
+// makes of it, or gone, and after a power loss a file may be a beginning; what such a run leaves
+// alone is untouched.
 std::vector<std::string> JudgeRun(const FaultyRun& run);
 
 // The same of a second run, without a fault, that found what the first one left and has made

@@ -1,20 +1,17 @@
 // Runs every file of a corpus folder through a fuzz target, in the order of their names.
 #include <cstdio>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <set>
-#include <vector>
 
 #include "tests/fuzz/fuzz_target.h"
+#include "tests/support/test_machine.h"
 
 int main(int argc, char** argv) {
   if (argc != 2) return 2;
   std::set<std::filesystem::path> files;
   for (const auto& entry : std::filesystem::directory_iterator(argv[1])) files.insert(entry);
   for (const std::filesystem::path& file : files) {
-    std::ifstream stream(file, std::ios::binary);
-    const std::vector<char> bytes(std::istreambuf_iterator<char>(stream), {});
+    const std::string bytes = FileBytes(file);
     std::printf("%s: %zu bytes\n", file.filename().c_str(), bytes.size());
     std::fflush(stdout);  // the last line names the file that ended the process
     (void)LLVMFuzzerTestOneInput(reinterpret_cast<const uint8_t*>(bytes.data()), bytes.size());

@@ -12,6 +12,7 @@
 #include "tests/support/machine_state.h"
 #include "tests/support/product_test.h"
 #include "tests/support/test_image.h"
+#include "tools/image/record_text.h"
 
 namespace {
 
@@ -34,11 +35,11 @@ Places PlacesOf(const std::string& bytes, const TestMachine& pc) {
     const auto location = machine::Locate(path);
     if (location) places.insert(location->host.lexically_relative(pc.Path()));
   };
-  ImageBuilder image = ImageBuilder::TakenApart(bytes);
-  for (const ImageBuilder::Piece& piece : image.pieces()) {
+  ImageBuilder taken = ImageBuilder::TakenApart(bytes);
+  for (const ImageBuilder::Piece& piece : taken.pieces()) {
     if (piece.record.recordSize != sizeof(FileRecord)) break;
-    const std::string name = '\\' + FieldText(piece.record.fileName);
-    std::istringstream elements(FieldText(piece.record.destination));
+    const std::string name = '\\' + image::FieldText(piece.record.fileName);
+    std::istringstream elements(image::FieldText(piece.record.destination));
     for (std::string element; std::getline(elements, element, ';');) {
       add(element + name);
       const size_t macroEnd = element.starts_with('%') ? element.find('%', 1) + 1 : 0;
@@ -68,8 +69,7 @@ Places Differences(const Files& before, const Files& after) {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   std::string_view input = TextOf(data, size);
   const uint8_t how = TakeByte(&input);
-  static const std::string executable = VersionedProgram("4.1.7");
-  const std::string image = executable + std::string(input);
+  const std::string image = VersionedProgram("4.1.7") + std::string(input);
 
   TestMachine pc(kSettings + std::string((how & kOldFamily) != 0 ? "9x\n" : "nt\n"));
   if ((how & kHasBrowser) != 0) {

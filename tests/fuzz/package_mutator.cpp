@@ -10,6 +10,7 @@
 #include "package/expander.h"
 #include "package/package_format.h"
 #include "tests/support/test_image.h"
+#include "tools/image/record_text.h"
 
 extern "C" size_t LLVMFuzzerMutate(uint8_t* data, size_t size, size_t maxSize);
 extern "C" size_t LLVMFuzzerCustomMutator(uint8_t* data, size_t size, size_t maxSize,
@@ -29,7 +30,7 @@ void Mutate(std::string* bytes, size_t maxSize) {
 // A field keeps its width.
 template <size_t N>
 void MutateText(char (&field)[N]) {
-  std::string text = FieldText(field);
+  std::string text = image::FieldText(field);
   Mutate(&text, N);
   SetField(field, text);
 }

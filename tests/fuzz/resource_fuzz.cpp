@@ -25,8 +25,6 @@ extern "C" uint8_t moriv_resources_end[];
 
 namespace {
 
-constexpr int kDialogType = 5;
-
 void AskForOwnResources(std::string_view bytes) {
   const auto room = static_cast<size_t>(moriv_resources_end - moriv_resources_begin);
   std::memset(moriv_resources_begin, 0, room);
@@ -38,7 +36,7 @@ void AskForOwnResources(std::string_view bytes) {
   }
   const HBITMAP bitmap = LoadBitmapA(nullptr, MAKEINTRESOURCEA(118));
   EXPECT_TRUE(bitmap == nullptr || DeleteObject(bitmap) != FALSE);
-  const auto dialog = machine::OwnResource(kDialogType, 116);
+  const auto dialog = machine::OwnResource(5, 116);  // RT_DIALOG
   if (dialog) (void)machine::ReadDialogTemplate(*dialog);
 }
 

@@ -32,9 +32,7 @@ void CheckText(std::string text) {
     EXPECT_EQ(Parse(text + 'x'), version);
     EXPECT_EQ(Parse(text + std::string(15, 'x') + '1'), version);
   }
-  const std::string separators = ".,- ";
-  std::ranges::replace_if(
-      text, [&](char c) { return separators.find(c) != std::string::npos; }, '.');
+  for (const char separator : {',', '-', ' '}) std::ranges::replace(text, separator, '.');
   EXPECT_EQ(Parse(text), version);
 }
 
@@ -43,9 +41,8 @@ Version ReadVersion() {
   FileRecord record;
   const int32_t isComplete = ReadFileRecordFromDisk("C:\\a.exe", &record);
   const Version version = {record.versionFirst, record.versionSecond, record.versionThird};
-  const bool isSet = std::ranges::count(version, kVersionNotSet) == 0;
-  EXPECT_EQ(isComplete, isSet && record.versionLanguage[0] != '\0' ? 1 : 0);
-  EXPECT_TRUE(isSet || version == kNotSet);
+  EXPECT_EQ(std::ranges::count(version, kVersionNotSet), version == kNotSet ? 3 : 0);
+  EXPECT_EQ(isComplete, version != kNotSet && record.versionLanguage[0] != '\0' ? 1 : 0);
   return version;
 }
 

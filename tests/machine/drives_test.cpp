@@ -45,11 +45,8 @@ TEST(Drives, NamesFindTheirFilesAsTheHostSpellsThem) {
                            "drive_c/caf\xC3\xA9", "drive_d/file", "drive_c/what?"}) {
     pc.Write(file, "x");
   }
-  struct {
-    const char* path;
-    const char* host;  // in the machine's folder; null: out of reach
-    bool exists;
-  } const rows[] = {
+  // The host's path in the machine's folder is null where the path leads out of reach.
+  const std::tuple<const char*, const char*, bool> rows[] = {
       {"c:/dIR\\READ me.txt", "drive_c/Dir/Read Me.TXT", true},
       {"C:\\both", "drive_c/both", true},
       {"C:\\BOTH", "drive_c/BOTH", true},
@@ -63,12 +60,12 @@ TEST(Drives, NamesFindTheirFilesAsTheHostSpellsThem) {
       {"C:\\what?", nullptr, false},
       {"ab:c", nullptr, false},
   };
-  for (const auto& row : rows) {
-    const auto location = Locate(row.path);
-    ASSERT_EQ(location.has_value(), row.host != nullptr) << row.path;
-    if (row.host == nullptr) continue;
-    EXPECT_EQ(location->host, pc.Host(row.host)) << row.path;
-    EXPECT_EQ(location->exists, row.exists) << row.path;
+  for (const auto& [path, host, exists] : rows) {
+    const auto location = Locate(path);
+    ASSERT_EQ(location.has_value(), host != nullptr) << path;
+    if (host == nullptr) continue;
+    EXPECT_EQ(location->host, pc.Host(host)) << path;
+    EXPECT_EQ(location->exists, exists) << path;
   }
 }
 
@@ -135,10 +132,9 @@ TEST(Disks, FullOneTakesAWriteWholeOrNotAtAll) {
             "ynyy");  // the gap counts too
   EXPECT_EQ(room(), 10u);
   const int text = _creat("C:\\text", _S_IREAD | _S_IWRITE);
-  for (int number = 0; number < 64; ++number) {
-    EXPECT_EQ(number != text && _close(number) == 0, false);  // of a handle, or nothing
-  }
-  EXPECT_EQ(_write(text, "123\n567\n9", 9), -1);  // eleven bytes in text mode
+  for (int number = 0; number < 64; ++number)
+    EXPECT_FALSE(number != text && _close(number) == 0);  // of a handle, or nothing
+  EXPECT_EQ(_write(text, "123\n567\n9", 9), -1);          // eleven bytes in text mode
   EXPECT_EQ(_write(text, "123\n5678\n", 9), -1);
   EXPECT_EQ(_write(text, "123\n56789", 9), 9);
   EXPECT_EQ(_close(text), 0);
@@ -161,21 +157,17 @@ TEST(Disks, ReadOnlyOneRefusesEveryChange) {
 TEST(Disks, SpaceIsWhatTheSettingsTell) {
   TestMachine pc("[disk C]\nfree = 12287\n[disk D]\nfree = 18446744073709551615\n");
   for (const char* drive : {"drive_d", "drive_e"}) fs::create_directory(pc.Host(drive));
-  struct {
-    const char* root;
-    uint64_t bytes;
-    DWORD clusters;
-  } const rows[] = {
+  const std::tuple<const char*, uint64_t, DWORD> rows[] = {
       {"C:", 12287, 2}, {"D:\\", UINT64_MAX, UINT32_MAX}, {"E:", uint64_t{10} << 30, 10 << 18}};
-  for (const auto& row : rows) {
+  for (const auto& [root, free, freeClusters] : rows) {
     ULARGE_INTEGER toCaller, total, all;
     DWORD sectors = 0, bytes = 0, clusters = 0, allClusters = 0;
-    EXPECT_TRUE(GetDiskFreeSpaceExA(row.root, &toCaller, &total, &all)) << row.root;
-    EXPECT_TRUE(GetDiskFreeSpaceA(row.root, &sectors, &bytes, &clusters, &allClusters));
-    EXPECT_EQ(toCaller.QuadPart, row.bytes) << row.root;
-    EXPECT_TRUE(all.QuadPart >= row.bytes && total.QuadPart >= all.QuadPart) << row.root;
+    EXPECT_TRUE(GetDiskFreeSpaceExA(root, &toCaller, &total, &all)) << root;
+    EXPECT_TRUE(GetDiskFreeSpaceA(root, &sectors, &bytes, &clusters, &allClusters));
+    EXPECT_EQ(toCaller.QuadPart, free) << root;
+    EXPECT_TRUE(all.QuadPart >= free && total.QuadPart >= all.QuadPart) << root;
     EXPECT_EQ(sectors * bytes, 4096u);
-    EXPECT_EQ(clusters, row.clusters) << row.root;
+    EXPECT_EQ(clusters, freeClusters) << root;
   }
 }
 

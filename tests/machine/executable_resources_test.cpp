@@ -11,7 +11,6 @@
 
 namespace {
 
-constexpr char kPath[] = "\\StringFileInfo\\040c04b0\\FileVersion";
 const std::string kVersion = VersionResource({{"CompanyName", "ZEB"}, {"FileVersion", "4.1.7"}});
 
 std::span<const uint8_t> Bytes(const std::string& text) {
@@ -27,12 +26,6 @@ std::string Seed(const std::string& name, size_t options) {
 std::string Read(const std::string& file) {
   const auto resource = machine::FindVersionResource(Bytes(file));
   return resource ? std::string(resource->begin(), resource->end()) : "";
-}
-
-std::string Query(const std::string& resource, const std::string& path) {
-  const auto value =
-      machine::QueryVersion(std::vector<uint8_t>(resource.begin(), resource.end()), path);
-  return value ? std::string(value->begin(), value->end()) : "none";
 }
 
 TEST(ExecutableResources, AreFoundInEveryKindOfProgram) {
@@ -70,11 +63,7 @@ TEST(ExecutableResources, ResourceFileIsSearchedByNumbersAndLanguage) {
 
 TEST(VersionBlock, OddLengthsOfATextDoNoHarm) {
   const std::string wide = ByteBuilder().Wide("1.2").U16(0).bytes();
-  const struct {
-    size_t length;
-    std::string value;
-    const char* text;
-  } rows[] = {
+  const std::tuple<size_t, std::string, const char*> rows[] = {
       {4, wide, "1.2"},
       {8, wide, "1.2"},               // counted in bytes
       {0xFFFF, wide, "1.2"},          // counted beyond the block
@@ -82,44 +71,38 @@ TEST(VersionBlock, OddLengthsOfATextDoNoHarm) {
       {2, wide, "1."},
       {0, "", ""},
   };
-  for (const auto& row : rows) {
-    const std::string text = VersionBlock("FileVersion", true, row.length, row.value, {});
+  for (const auto& [length, value, expected] : rows) {
+    const std::string text = VersionBlock("FileVersion", true, length, value, {});
     const std::string table = VersionBlock("040c04b0", true, 0, "", {text});
     const std::string info = VersionBlock("StringFileInfo", true, 0, "", {table});
-    EXPECT_EQ(Query(VersionBlock("VS_VERSION_INFO", false, 0, "", {info}), kPath), row.text);
+    const std::string resource = VersionBlock("VS_VERSION_INFO", false, 0, "", {info});
+    const auto found = machine::QueryVersion({resource.begin(), resource.end()},
+                                             "\\StringFileInfo\\040c04b0\\FileVersion");
+    ASSERT_TRUE(found) << expected;
+    EXPECT_EQ(std::string(found->begin(), found->end()), expected);
   }
 }
 
 TEST(VersionFunctions, FillAndAskABlockOfTheirOwnForm) {
   const TestMachine pc;
   // A text that fills the resource to its last byte, without a NUL, has the tightest copy.
-  const std::string tight = VersionBlock("T", true, 9, ByteBuilder().Wide("123456789").bytes(), {});
-  const std::string tightest = VersionBlock("VS_VERSION_INFO", false, 0, "", {tight});
-  const std::string company = "\\StringFileInfo\\040c04b0\\CompanyName";
-  const struct {
-    std::string resource;
-    std::vector<std::pair<std::string, std::string>> texts;
-  } rows[] = {{kVersion, {{kPath, "4.1.7"}, {company, "ZEB"}}}, {tightest, {{"\\T", "123456789"}}}};
-  for (const auto& [resource, texts] : rows) {
-    pc.Write("drive_c/a.dll", PortableExecutable(true, 16, 1, {{0, resource}}));
-    const DWORD size = GetFileVersionInfoSizeA("C:\\A.DLL", nullptr);
-    std::vector<uint8_t> block(size, 0xCD);
-    void* value = nullptr;
-    UINT length = 0;
-    EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &value, &length)) << "not filled";
-    ASSERT_TRUE(GetFileVersionInfoA("C:\\A.DLL", 0, size, block.data()));
-    std::vector<void*> values;
-    for (const auto& [path, text] : texts) {
-      EXPECT_TRUE(VerQueryValueA(block.data(), path.c_str(), &value, &length));
-      EXPECT_LE(static_cast<uint8_t*>(value) + length, block.data() + size);
-      values.push_back(value);
-    }
-    for (size_t i = 0; i < texts.size(); ++i) {  // answers don't share their room
-      EXPECT_EQ(static_cast<const char*>(values[i]), texts[i].second);
-    }
-    EXPECT_FALSE(GetFileVersionInfoA("C:\\A.DLL", 0, size - 1, block.data()));
-    EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &value, &length));
-  }
+  const std::string a = VersionBlock("A", true, 9, ByteBuilder().Wide("abcdefghi").bytes(), {});
+  const std::string b = VersionBlock("B", true, 9, ByteBuilder().Wide("123456789").bytes(), {});
+  const std::string resource = VersionBlock("VS_VERSION_INFO", false, 0, "", {a, b});
+  pc.Write("drive_c/a.dll", PortableExecutable(true, 16, 1, {{0, resource}}));
+  const DWORD size = GetFileVersionInfoSizeA("C:\\A.DLL", nullptr);
+  std::vector<uint8_t> block(size, 0xCD);
+  void *first = nullptr, *last = nullptr;
+  UINT length = 0;
+  EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &first, &length)) << "not filled";
+  ASSERT_TRUE(GetFileVersionInfoA("C:\\A.DLL", 0, size, block.data()));
+  EXPECT_TRUE(VerQueryValueA(block.data(), "\\A", &first, &length));
+  EXPECT_TRUE(VerQueryValueA(block.data(), "\\B", &last, &length));
+  EXPECT_LE(static_cast<uint8_t*>(last) + length, block.data() + size);
+  EXPECT_STREQ(static_cast<const char*>(first), "abcdefghi");  // answers don't share their room
+  EXPECT_STREQ(static_cast<const char*>(last), "123456789");
+  EXPECT_FALSE(GetFileVersionInfoA("C:\\A.DLL", 0, size - 1, block.data()));
+  EXPECT_FALSE(VerQueryValueA(block.data(), "\\", &first, &length));
 }
 
 }  // namespace

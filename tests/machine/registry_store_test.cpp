@@ -1,33 +1,18 @@
 // The registry's file: what is written, what is read, what is refused; and the registry functions
 // where this machine is stricter than Windows, and on the 9x family.
-#include "machine/registry_store.h"
-
-#include "machine/host_file.h"
+#include "machine/registry_text.h"
 #include "tests/support/product_test.h"
 
 namespace {
 
-class RegistryFile : public testing::Test {
- protected:
-  // Loads a file of this text. The error, or "".
-  std::string Load(const std::string& text) {
-    folder_.Write("registry.reg", text);
-    std::string error;
-    return machine::LoadRegistry(folder_.Host("registry.reg"), &error) ? "" : error;
-  }
+// What is written of a registry that was read from this text; the error if it can't be read.
+std::string ReadAndWrite(const std::string& text) {
+  const machine::RegistryRoots roots;
+  std::string error;
+  return machine::ReadRegistryText(text, roots, &error) ? machine::WriteRegistryText(roots) : error;
+}
 
-  std::string Saved() {
-    machine::SaveRegistry();
-    return folder_.Read("registry.reg");
-  }
-
-  void TearDown() override { machine::CloseRegistry(); }
-
- private:
-  TemporaryFolder folder_;
-};
-
-TEST_F(RegistryFile, ItsOwnFormComesBackByteForByte) {
+TEST(RegistryFile, ItsOwnFormComesBackByteForByte) {
   const std::string text = R"(REGEDIT4
 
 [HKEY_LOCAL_MACHINE]
@@ -54,20 +39,18 @@ TEST_F(RegistryFile, ItsOwnFormComesBackByteForByte) {
 [HKEY_CURRENT_USER\Kept]
 "x"="y"
 )";
-  ASSERT_EQ(Load(text), "");
-  EXPECT_EQ(Saved(), text);
+  EXPECT_EQ(ReadAndWrite(text), text);
 }
 
-TEST_F(RegistryFile, OtherFormsAreRead) {
-  ASSERT_EQ(Load("REGEDIT4\r\n; a comment\r\n\r\n"
-                 "[hkey_local_machine\\A\\B\\]\r\n"
-                 "  \"Long\" = HEX:0A, fF,\\\r\n  00,\\\r\n  1  \r\n"
-                 "\"Number\"=dword:0000010f\r\n"
-                 "\"Text\"=hex(1):41,\\\r\n42,00\r\n"
-                 "[HKEY_LOCAL_MACHINE\\a]\r\n@=\"one\"\r\n@=\"two\"\r\n"
-                 "[HKEY_CLASSES_ROOT\\.htm]\r\n@=\"page\""),
-            "");
-  EXPECT_EQ(Saved(), R"(REGEDIT4
+TEST(RegistryFile, OtherFormsAreRead) {
+  EXPECT_EQ(ReadAndWrite("REGEDIT4\r\n; a comment\r\n\r\n"
+                         "[hkey_local_machine\\A\\B\\]\r\n"
+                         "  \"Long\" = HEX:0A, fF,\\\r\n  00,\\\r\n  1  \r\n"
+                         "\"Number\"=dword:0000010f\r\n"
+                         "\"Text\"=hex(1):41,\\\r\n42,00\r\n"
+                         "[HKEY_LOCAL_MACHINE\\a]\r\n@=\"one\"\r\n@=\"two\"\r\n"
+                         "[HKEY_CLASSES_ROOT\\.htm]\r\n@=\"page\""),
+            R"(REGEDIT4
 
 [HKEY_LOCAL_MACHINE\A]
 @="two"
@@ -86,7 +69,7 @@ TEST_F(RegistryFile, OtherFormsAreRead) {
 )");
 }
 
-TEST_F(RegistryFile, MistakesNameTheirLineAndChangeNothing) {
+TEST(RegistryFile, MistakesNameTheirLine) {
   std::string deep = "HKEY_LOCAL_MACHINE";
   for (int level = 0; level < 513; ++level) deep += "\\a";
   const std::string wide = "HKEY_LOCAL_MACHINE\\" + std::string(256, 'n');
@@ -115,16 +98,13 @@ TEST_F(RegistryFile, MistakesNameTheirLineAndChangeNothing) {
       {R"("a"=dword:)", "3: a bad dword"},
       {R"("a"=dword:123456789)", "3: a bad dword"},
   };
-  ASSERT_EQ(Load("REGEDIT4\n[HKEY_LOCAL_MACHINE\\Before]\n"), "");
-  for (const char* text : {"", "Windows Registry Editor Version 5.00\n"}) {
-    EXPECT_EQ(Load(text), "registry.reg:1: the file does not begin with REGEDIT4");
-  }
+  for (const char* text : {"", "Windows Registry Editor Version 5.00\n"})
+    EXPECT_EQ(ReadAndWrite(text), "1: the file does not begin with REGEDIT4");
   for (const auto& [text, error] : rows) {
     const bool isOfKey = error[0] != '2' && text[0] != '\n';
     const std::string key = isOfKey ? "[HKEY_LOCAL_MACHINE\\A]\n" : "";
-    EXPECT_EQ(Load("REGEDIT4\n" + key + text + '\n'), "registry.reg:" + error) << text;
+    EXPECT_EQ(ReadAndWrite("REGEDIT4\n" + key + text + '\n'), error) << text;
   }
-  EXPECT_NE(machine::FindKey(machine::LocalMachine(), "before"), nullptr);
 }
 
 TEST(Registry, IsStricterThanWindowsAndLaxerOnTheOldFamily) {
@@ -148,7 +128,7 @@ TEST(Registry, IsStricterThanWindowsAndLaxerOnTheOldFamily) {
   }
   EXPECT_EQ(RegDeleteKeyA(HKEY_LOCAL_MACHINE, ""), ERROR_ACCESS_DENIED);
   machine::CurrentSettings().ntFamily = false;
-  EXPECT_TRUE(HasRegistryKey("\\SOFTWARE\\A"));
+  EXPECT_TRUE(RegistryKey().Open(HKEY_LOCAL_MACHINE, "\\SOFTWARE\\A", KEY_READ));
   EXPECT_EQ(RegDeleteKeyA(HKEY_LOCAL_MACHINE, "SOFTWARE\\A"), 0);
   EXPECT_FALSE(HasRegistryKey("SOFTWARE\\A"));
   pc.Restart();

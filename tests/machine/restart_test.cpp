@@ -29,8 +29,6 @@ TEST(Restart, EveryValueGoesInOrderWhateverBecomesOfIt) {
            "[Version]\nSignature=\"$Windows NT$\"\n[Uninstall]\nDelFiles=A,B\n"
            "[A]\nMorivRmv.exe\n[B]\nOther.exe\n[DestinationDirs]\nA=11\n");
   const std::string start = "rundll32.exe setupapi.dll,InstallHinfSection ";
-  const std::string startOn9x =
-      "C:\\My Windows\\rundll.exe setupx.dll,InstallHinfSection Uninstall 132 ";
   const std::pair<std::string, std::string> rows[] = {
       {"C:\\windows\\notepad.exe", "not understood\n"},
       {start + "Uninstall 132 C:\\absent.inf", "C:\\absent.inf can't be read\n"},
@@ -41,16 +39,16 @@ TEST(Restart, EveryValueGoesInOrderWhateverBecomesOfIt) {
        "A: the directory 11 is not understood\n  B: the directory  is not understood\n"},
       {start + "Uninstall mode C:\\windows\\Moriv.INF", "not understood\n"},
       {"not" + start + "Uninstall 132 C:\\windows\\Moriv.INF", "not understood\n"},
-      {startOn9x + "C:\\My Windows\\Moriv.INF ",
+      {"C:\\My Windows\\rundll.exe setupx.dll,InstallHinfSection Uninstall 132 "
+       "C:\\My Windows\\Moriv.INF ",
        "delete C:\\My Windows\\MorivRmv.exe\n  C:\\My Windows\\MorivLog.txt is not there\n"
        "  delete C:\\My Windows\\Moriv.INF\n"},
   };
   std::string told;
   for (const auto& [command, outcome] : rows) {
     const std::string name = std::to_string(told.size());
-    machine::RegistryValue& value = RunOnce().emplace_back();
-    value.name = name;
-    value.data.assign(command.c_str(), command.c_str() + command.size() + 1);
+    const char* const data = command.c_str();
+    RunOnce().push_back({name, REG_SZ, {data, data + command.size() + 1}});
     told += "run " + name + ": " + command + "\n  " + outcome;
   }
   EXPECT_EQ(machine::Restart(), told);

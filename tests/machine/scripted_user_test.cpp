@@ -3,37 +3,72 @@
 // anywhere is in tests/contract/, how boxes and steps go together in the scenarios.
 #include "machine/scripted_user.h"
 
+#include <gtest/gtest.h>
+
+#include <functional>
+
+#include "machine/dialog_template.h"
 #include "machine/user_script.h"
-#include "tests/support/test_dialog.h"
+#include "machine/windows.h"
+#include "tests/support/test_machine.h"
 
 namespace {
 
 using testing::ExitedWithCode;
 
+constexpr uint32_t kShownControl = 0x50010000;  // WS_CHILD | WS_VISIBLE | WS_TABSTOP
 constexpr uint32_t kHiddenControl = kShownControl & ~uint32_t{WS_VISIBLE};
+constexpr uint32_t kOwnerDrawnList = 0x13;  // CBS_DROPDOWNLIST | CBS_OWNERDRAWFIXED
 
-class ScriptedUser : public DialogTest {
+machine::TemplateItem Control(const char* className, uint16_t id, uint32_t style = kShownControl,
+                              const char* text = "") {
+  return {
+      .style = style, .width = 40, .height = 16, .id = id, .className = className, .text = text};
+}
+
+class ScriptedUser : public testing::Test {
  protected:
+  using Controls = std::vector<machine::TemplateItem>;
+  using Handler = std::function<void(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam)>;
+
   ~ScriptedUser() override { machine::ForgetUser(); }
 
-  // Plays the script on a dialog that command 2 or 3 ends and whose button 10 asks a question;
-  // `prepare` runs at its start. Returns the commands in their order, each as "ID/NOTIFICATION ".
-  std::string Play(const std::string& script,
-                   const std::vector<machine::TemplateItem>& controls = {Control("Button", 10)},
-                   const std::function<void(HWND dialog)>& prepare = nullptr) {
+  // Runs a dialog to its end. Returns its result; `shown` is what came on standard output.
+  INT_PTR Run(const Controls& controls, const std::string& script, Handler handlerOfTest) {
+    pc.Write("user.txt", script);
+    std::string error;
+    EXPECT_TRUE(machine::LoadUser(pc.Host("user.txt"), &error)) << error;
+    machine::DialogTemplate dialog;
+    dialog.frame.text = "Title";
+    dialog.controls = controls;
+    static Handler handler;
+    handler = std::move(handlerOfTest);
+    const auto callHandler = [](HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+      handler(window, message, wParam, lParam);
+      return INT_PTR{FALSE};
+    };
+    testing::internal::CaptureStdout();
+    const INT_PTR result = machine::RunDialog(dialog, callHandler, 0);
+    machine::EndUser();
+    shown = testing::internal::GetCapturedStdout();
+    return result;
+  }
+
+  // Plays the script on a dialog that command 2 or 3 ends and whose button 10 asks a question.
+  // Returns the commands in their order, each as "ID/NOTIFICATION ".
+  std::string Play(const std::string& script, const Controls& controls = {Control("Button", 10)}) {
     std::string seen;
-    Run(controls, script, [&](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-      if (message == WM_INITDIALOG && prepare) prepare(dialog);
-      if (message != WM_COMMAND) return FALSE;
+    Run(controls, script, [&seen](HWND dialog, UINT message, WPARAM wParam, LPARAM) {
+      if (message != WM_COMMAND) return;
       seen += std::to_string(LOWORD(wParam)) + "/" + std::to_string(HIWORD(wParam)) + " ";
-      if (LOWORD(wParam) == 10 && HIWORD(wParam) == 0) {
-        MessageBoxA(dialog, "Sure?", "Question", MB_YESNO);
-      }
+      if (wParam == 10) MessageBoxA(dialog, "Sure?", "Question", MB_YESNO);
       if (LOWORD(wParam) == IDCANCEL || LOWORD(wParam) == 3) EndDialog(dialog, 1);
-      return FALSE;
     });
     return seen;
   }
+
+  TestMachine pc;
+  std::string shown;
 };
 
 TEST_F(ScriptedUser, BadLinesAreNamed) {
@@ -58,9 +93,9 @@ TEST_F(ScriptedUser, BadLinesAreNamed) {
 }
 
 TEST_F(ScriptedUser, ScriptThatDoesNotFitTheRunEndsTheProcess) {
-  const std::vector<machine::TemplateItem> controls = {
-      Control("Button", 10), Control("Button", 11, kHiddenControl),
-      Control("Button", 12, kShownControl | WS_DISABLED), Control("Edit", 13)};
+  const Controls controls = {Control("Button", 10), Control("Button", 11, kHiddenControl),
+                             Control("Button", 12, kShownControl | WS_DISABLED),
+                             Control("Edit", 13)};
   const std::pair<const char*, const char*> rows[] = {
       {"wait\n", ": the script ends while the dialog is open"},
       {"escape\nwait\n", ":2: wait: left over"},
@@ -115,11 +150,11 @@ TEST_F(ScriptedUser, OnlyADisabledButtonStopsEscapeAndCloseBox) {
 TEST_F(ScriptedUser, EscapeHasNoEffectOnAStepThatPolls) {
   std::string order;
   Run({Control("Button", 10)}, "at-poll 1 escape\nat-poll 2 close\nanswer no\npress 10\nescape\n",
-      [&order](HWND dialog, UINT message, WPARAM wParam, LPARAM) -> INT_PTR {
-        if (message != WM_COMMAND) return FALSE;
+      [&order](HWND dialog, UINT message, WPARAM wParam, LPARAM) {
+        if (message != WM_COMMAND) return;
         order += std::to_string(LOWORD(wParam)) + ' ';
         if (LOWORD(wParam) == IDCANCEL && order.ends_with("77 2 ")) EndDialog(dialog, 1);
-        if (LOWORD(wParam) != 10) return FALSE;
+        if (LOWORD(wParam) != 10) return;
         for (int poll = 1; poll <= 2; ++poll) {
           order += "poll ";
           MSG posted = {};
@@ -127,26 +162,25 @@ TEST_F(ScriptedUser, EscapeHasNoEffectOnAStepThatPolls) {
         }
         PostMessageA(dialog, WM_COMMAND, 77, 0);
         order += MessageBoxA(dialog, "?", "Q", MB_YESNO) == IDNO ? "no end " : "yes ";
-        return FALSE;
       });
   EXPECT_EQ(order, "10 poll poll 2 no end 77 2 ");
 }
 
 TEST_F(ScriptedUser, OneDialogAtATimeOfKnownControls) {
-  Play("escape\n", {},
-       [](HWND) { EXPECT_EQ(machine::RunDialog(machine::DialogTemplate(), nullptr, 0), -1); });
-  EXPECT_EQ(Run({Control("ListBox", 10)}, "",
-                [](HWND, UINT, WPARAM, LPARAM) -> INT_PTR { return FALSE; }),
-            -1);
+  Run({}, "escape\n", [](HWND dialog, UINT message, WPARAM, LPARAM) {
+    EXPECT_EQ(machine::RunDialog(machine::DialogTemplate(), nullptr, 0), -1);
+    if (message == WM_COMMAND) EndDialog(dialog, 1);
+  });
+  EXPECT_EQ(Run({Control("ListBox", 10)}, "", nullptr), -1);
 }
 
 TEST_F(ScriptedUser, ControlsDrawThemselvesWhenTheyAreShownAndHaveChanged) {
   std::string drawings;
-  const std::vector<machine::TemplateItem> controls = {
-      Control("Static", 10, kShownControl | SS_OWNERDRAW), Control("Button", 12),
-      Control("ComboBox", 11, kShownControl | kOwnerDrawnList)};
+  const Controls controls = {Control("Static", 10, kShownControl | SS_OWNERDRAW),
+                             Control("Button", 12),
+                             Control("ComboBox", 11, kShownControl | kOwnerDrawnList)};
   Run(controls, "wait\nwait\npress 12\nwait\nescape\n",
-      [&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) -> INT_PTR {
+      [&](HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
         const HWND text = GetDlgItem(dialog, 10);
         const HWND list = GetDlgItem(dialog, 11);
         if (message == WM_MEASUREITEM) {
@@ -169,7 +203,6 @@ TEST_F(ScriptedUser, ControlsDrawThemselvesWhenTheyAreShownAndHaveChanged) {
           SetWindowTextA(text, "hidden");
           EndDialog(dialog, 1);
         }
-        return FALSE;
       });
   EXPECT_EQ(drawings, "10: 0 high 26; 11: 0 high 19; 10: 0 high 26; 11: 900 high 19 focus; ");
 }

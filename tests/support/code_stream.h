@@ -8,7 +8,11 @@ class CodeStream {
  public:
   // Appends one code at the present width.
   CodeStream& Put(uint32_t code) {
-    for (unsigned bit = width_; bit-- > 0;) PutBit(code >> bit & 1);
+    for (unsigned bit = width_; bit-- > 0;) {
+      if (freeBits_ == 0) codes_ += '\0';
+      freeBits_ = (freeBits_ + 7) % 8;
+      codes_.back() |= static_cast<char>((code >> bit & 1) << freeBits_);
+    }
     if (code == 257) ++width_;
     if (code == 258) width_ = 9;
     return *this;
@@ -26,16 +30,7 @@ class CodeStream {
   std::string Stream() const { return "PKZ" + codes_; }
 
  private:
-  void PutBit(uint32_t bit) {
-    if (freeBits_ == 0) {
-      codes_ += '\0';
-      freeBits_ = 8;
-    }
-    --freeBits_;
-    codes_.back() = static_cast<char>(static_cast<uint8_t>(codes_.back()) | bit << freeBits_);
-  }
-
   std::string codes_;
-  unsigned freeBits_ = 0;
+  unsigned freeBits_ = 0;  // of the last byte
   unsigned width_ = 9;
 };

@@ -78,39 +78,34 @@ inline std::string VersionResource(const std::vector<std::pair<std::string, std:
 //
 //   0    "MZ", at 60 the position of the PE header
 //   64   PE header, section header
-//   512  section: the three directories, the leaves, the data
+//   512  section: the three directories, the leaves, each with its data
 inline std::string PortableExecutable(
     bool is64, uint16_t type, uint16_t id,
     const std::vector<std::pair<uint16_t, std::string>>& languages) {
   constexpr uint32_t kAddress = 0x1000;
   constexpr uint32_t kPosition = 512;
   constexpr uint32_t kDirectory = 0x80000000;
-  const size_t count = languages.size();
-  const uint64_t leaves = 24 + 24 + 16 + 8 * count;
 
   ByteBuilder section;
   section.PadTo(12).U16(0).U16(1).U32(type).U32(kDirectory | 24);
   section.PadTo(24 + 12).U16(0).U16(1).U32(id).U32(kDirectory | 48);
-  section.PadTo(48 + 12).U16(0).U16(count);
-  for (size_t index = 0; index < count; ++index)
-    section.U32(languages[index].first).U32(leaves + 16 * index);
-  uint64_t data = leaves + 16 * count;
+  section.PadTo(48 + 12).U16(0).U16(languages.size());
+  ByteBuilder leaves;
   for (const auto& [language, bytes] : languages) {
-    section.U32(kAddress + data).U32(bytes.size()).U32(0).U32(0);
-    data = (data + bytes.size() + 3) & ~uint64_t{3};
+    const size_t leaf = 48 + 16 + 8 * languages.size() + leaves.bytes().size();
+    section.U32(language).U32(leaf);
+    leaves.U32(kAddress + leaf + 16).U32(bytes.size()).U32(0).U32(0).Append(bytes).Align();
   }
-  for (const auto& [language, bytes] : languages) section.Append(bytes).Align();
+  const size_t size = section.Append(leaves.bytes()).bytes().size();
 
   const size_t optional = 64 + 24;
-  const size_t directories = is64 ? 112 : 96;
-  const size_t optionalSize = directories + 16 * 8;
+  const size_t directories = optional + (is64 ? 112 : 96);
+  const size_t end = directories + 16 * 8;
   ByteBuilder file;
   file.Append("MZ").PadTo(60).U32(64);
   file.Append("PE").U16(0).U16(is64 ? 0x8664 : 0x14C).U16(1).PadTo(64 + 20);
-  file.U16(optionalSize).U16(0).U16(is64 ? 0x20B : 0x10B);
-  file.PadTo(optional + directories - 4).U32(16);
-  file.PadTo(optional + directories + 2 * 8).U32(kAddress).U32(section.bytes().size());
-  file.PadTo(optional + optionalSize).Append(".rsrc").PadTo(optional + optionalSize + 8);
-  file.U32(section.bytes().size()).U32(kAddress).U32(section.bytes().size()).U32(kPosition);
+  file.U16(end - optional).U16(0).U16(is64 ? 0x20B : 0x10B).PadTo(directories - 4).U32(16);
+  file.PadTo(directories + 2 * 8).U32(kAddress).U32(size);
+  file.PadTo(end).Append(".rsrc").PadTo(end + 8).U32(size).U32(kAddress).U32(size).U32(kPosition);
   return file.PadTo(kPosition).Append(section.bytes()).bytes();
 }

@@ -22,10 +22,9 @@ inline std::string ExpandChecked(const TestMachine& pc, const std::vector<std::s
   constexpr size_t kMostOutput = 1 << 20;
   DataFile file("C:\\out.bin");
   EXPECT_EQ(file.Create(), 1);
-  std::vector<machine::Fault> faults;  // setting them counts the calls from 0
+  machine::SetFaults({});  // counts the calls from 0
   if (failingWrite > 0)
-    faults = {{.function = "WriteFile", .call = static_cast<int>(failingWrite)}};
-  machine::SetFaults(faults);
+    machine::SetFaults({{.function = "WriteFile", .call = static_cast<int>(failingWrite)}});
 
   StreamOracle oracle;
   const auto expander = std::make_unique<PkzFileExpander>(&file);

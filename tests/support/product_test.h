@@ -8,6 +8,7 @@
 
 #include "core/hooks.h"
 #include "machine/faults.h"
+#include "machine/registry_store.h"
 #include "package/package_reader.h"
 #include "platform/registry_key.h"
 #include "tests/support/allocation_faults.h"
@@ -38,24 +39,18 @@ inline void SetRegistryText(const std::string& key, const char* name, const std:
 }
 
 inline void MakeRegistryKey(const std::string& key) {
-  RegistryKey opened;
-  ASSERT_TRUE(opened.Create(HKEY_LOCAL_MACHINE, key.c_str())) << key;
+  ASSERT_TRUE(machine::MakeKey(machine::LocalMachine(), key)) << key;
 }
 
 // The bytes of a value, its NUL too if it has one; "none" when it isn't there.
 inline std::string GetRegistryBytes(const std::string& key, const char* name) {
-  RegistryKey opened;
-  char bytes[600];
-  DWORD size = sizeof(bytes);
-  const bool isThere = opened.Open(HKEY_LOCAL_MACHINE, key.c_str(), KEY_READ) &&
-                       RegQueryValueExA(opened.get(), name, nullptr, nullptr,
-                                        reinterpret_cast<BYTE*>(bytes), &size) == ERROR_SUCCESS;
-  return isThere ? std::string(bytes, size) : "none";
+  const auto found = machine::FindKey(machine::LocalMachine(), key);
+  const machine::RegistryValue* const value = found ? machine::FindValue(*found, name) : nullptr;
+  return value != nullptr ? std::string(value->data.begin(), value->data.end()) : "none";
 }
 
 inline bool HasRegistryKey(const std::string& key) {
-  RegistryKey opened;
-  return opened.Open(HKEY_LOCAL_MACHINE, key.c_str(), KEY_READ);
+  return machine::FindKey(machine::LocalMachine(), key) != nullptr;
 }
 
 // The key in which the system keeps a program's directory.

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <functional>
 #include <random>
 #include <string>
 #include <string_view>
@@ -15,9 +16,11 @@
 #include "tools/image/stream_packer.h"
 
 // The stream of a file's bytes.
-inline std::string PackStream(std::string_view bytes) {
+inline std::string PackStream(std::string_view bytes,
+                              const image::PackMethod& method = image::kPackFast,
+                              const std::function<void(size_t)>& progress = {}) {
   const auto* const first = reinterpret_cast<const uint8_t*>(bytes.data());
-  const std::vector<uint8_t> stream = image::PackStream({first, bytes.size()}, image::kPackFast);
+  const std::vector<uint8_t> stream = image::PackStream({first, bytes.size()}, method, progress);
   return {stream.begin(), stream.end()};
 }
 
@@ -41,12 +44,7 @@ inline std::string VersionedProgram(const std::string& version) {
                          : ProgramWithStrings({{"FileVersion", version}});
 }
 
-// A text of a record, which has no NUL when it fills its field.
-template <size_t N>
-std::string FieldText(const char (&field)[N]) {
-  return {field, std::find(field, field + N, '\0')};
-}
-
+// A text that fills a record's field has no NUL.
 template <size_t N>
 void SetField(char (&field)[N], std::string_view text) {
   std::memset(field, 0, N);

@@ -43,7 +43,7 @@ default language +french \(10000\)
  *\d+ +3000 +\d+ +1\.2\.3 +"040904b0" +"b\.dll" +"%SYS_DIR%\\moriv;%PLUGIN_ALL_DIR%"
  *\d+ +0 +4 +-\.-\.- +"" +"readme\.txt" +"%INSTALL_DIR%\\docs"
 )");
-  const std::string listed = Run({"list", "@image.exe"}).out;
+  const std::string listed = Run("list @image.exe").out;
   EXPECT_TRUE(std::regex_match(listed, listing)) << listed;
 }
 
@@ -51,13 +51,10 @@ TEST_F(ImagePacking, DependsOnNothingButItsInputsAndIsSmallerWithBest) {
   Write("a.exe", Read("a.exe") + RandomBytes(20'000, 1) + std::string(40'000, 'x'));
   ASSERT_EQ(Pack("@setup.toml").status, 0);
   Write("elsewhere/other.toml", kDescription);
-  const std::vector<std::string> elsewhere = {
-      "pack", "@elsewhere/other.toml", "--stub",       "@stub.exe",
-      "-o",   "@second.exe",           "--source-dir", "@"};
-  ASSERT_EQ(Run(elsewhere).status, 0);
-  EXPECT_TRUE(Read("new.exe") == Read("second.exe"));
-  ASSERT_EQ(Run({"pack", "@setup.toml", "--stub", "@stub.exe", "-o", "@best.exe", "--best"}).status,
+  ASSERT_EQ(Run("pack @elsewhere/other.toml --stub @stub.exe -o @two.exe --source-dir @").status,
             0);
+  EXPECT_TRUE(Read("new.exe") == Read("two.exe"));
+  ASSERT_EQ(Run("pack @setup.toml --stub @stub.exe -o @best.exe --best").status, 0);
   EXPECT_LT(Read("best.exe").size(), Read("new.exe").size());
 }
 
@@ -77,7 +74,7 @@ TEST_F(ImagePacking, LeavesNothingWhenItIsInterrupted) {
 TEST_F(ImagePacking, MakesARemovalProgramOfADescriptionThatSaysSo) {
   std::string text = kDescription;
   EXPECT_EQ(Pack(text.insert(text.find('\n') + 1, "removal = true\n")).status, 0);
-  EXPECT_EQ(Run({"removal", "@image.exe", "-o", "@cut.exe"}).status, 0);
+  EXPECT_EQ(Run("removal @image.exe -o @cut.exe").status, 0);
   EXPECT_TRUE(Read("new.exe") == Read("cut.exe"));
 }
 
@@ -153,7 +150,7 @@ TEST_F(ImagePacking, TakesWhatIsOnlyUnusual) {
         WithName("\\u00e9t\\u00e9.txt")}) {
     const ToolRun run = Pack(text);
     EXPECT_EQ(run.status, 0) << text << run.err;
-    EXPECT_EQ(Run({"verify", "@new.exe"}).status, 0) << text;
+    EXPECT_EQ(Run("verify @new.exe").status, 0) << text;
   }
   // In the code page.
   ImageBuilder last = ImageBuilder::TakenApart(Read("new.exe"));

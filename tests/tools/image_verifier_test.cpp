@@ -7,11 +7,10 @@
 
 namespace {
 
-class ImageVerifier : public SampleBench {
- protected:
+struct ImageVerifier : SampleBench {
   // What verify says is wrong.
   std::vector<std::string> WrongIn(const std::string& image) const {
-    const ToolRun run = Run({"verify", image});
+    const ToolRun run = Run("verify " + image);
     std::vector<std::string> wrong;
     std::istringstream lines(run.out);
     for (std::string line; std::getline(lines, line);) {
@@ -26,67 +25,63 @@ class ImageVerifier : public SampleBench {
 
 // Each row changes one thing: of the header, of the second record, of the rest.
 TEST_F(ImageVerifier, FindsEachChange) {
-  using Header = PackageHeader&;
-  using Record = FileRecord&;
-  using Image = ImageBuilder&;
-  const auto inHeader = [](void (*change)(Header)) {
-    return [change](Image image) { change(image.header()); };
-  };
-  const auto inRecord = [](void (*change)(Record)) {
-    return [change](Image image) { change(image.pieces()[1].record); };
+  struct Parts {
+    ImageBuilder& image;
+    PackageHeader& header;
+    FileRecord& record;
   };
   const auto withSize = [](uint32_t size) {
-    return [size](Image image) {
-      image.pieces()[1].record.fileSize = size;
-      image.header().spaceNeeded += size - 3000;
+    return [size](Parts p) {
+      p.record.fileSize = size;
+      p.header.spaceNeeded += size - 3000;
     };
   };
-  const std::pair<std::function<void(Image)>, const char*> rows[] = {
-      {inHeader([](Header h) { h.removalImageFlag = 2; }), "removalImageFlag is 2"},
-      {inHeader([](Header h) { h.spaceNeeded++; }), "spaceNeeded is 48057"},
-      {inHeader([](Header h) { h.packageLength--; }), "packageLength"},
-      {inHeader([](Header h) { h.defaultDirectory[259] = 'x'; }), "defaultDirectory"},
-      {inHeader([](Header h) { SetField(h.defaultDirectory, "C:\\..\\x"); }), "\"..\""},
-      {inHeader([](Header h) { h.defaultLanguage = 5; }), "defaultLanguage 5"},
-      {inHeader([](Header h) { h.reserved[259] = 1; }), "reserved"},
-      {inHeader([](Header h) { h.recordCount = 4; }), "record 4 at offset"},
-      {inHeader([](Header h) { h.dataOffset++; }), "recordSize"},
-      {inHeader([](Header h) { h.dataOffset = 0xFFFFFFFF; }), "dataOffset 4294967295"},
-      {inHeader([](Header h) { h.headerSize = 567; }), "no package header"},
-      {inHeader([](Header h) { h.magic[25] = 'x'; }), "no package header"},
-      {inRecord([](Record r) { r.recordSize = 695; }), "recordSize of 695"},
-      {inRecord([](Record r) { r.fileName[31] = 'x'; }), "fileName does not end"},
-      {inRecord([](Record r) { r.destination[259] = 'x'; }), "destination does not end"},
-      {inRecord([](Record r) { r.versionLanguage[127] = 'x'; }), "versionLanguage does not end"},
-      {inRecord([](Record r) { r.versionLanguage[0] = 'G'; }), "versionLanguage \"G4"},
-      {inRecord([](Record r) { r.reserved[0] = 1; }), "reserved"},
-      {inRecord([](Record r) { r.fileName[0] = '/'; }), "fileName \"/"},
-      {inRecord([](Record r) { SetField(r.destination, ""); }), "nowhere"},
-      {inRecord([](Record r) { r.storedSize = 0xFFFFFFFF; }), "reaches into the header"},
-      {inRecord([](Record r) {
-         SetField(r.fileName, "a.exe");
-         SetField(r.destination, "\\");
-       }),
+  const std::pair<std::function<void(Parts)>, const char*> rows[] = {
+      {[](Parts p) { p.header.removalImageFlag = 2; }, "removalImageFlag is 2"},
+      {[](Parts p) { p.header.spaceNeeded++; }, "spaceNeeded is 48057"},
+      {[](Parts p) { p.header.packageLength--; }, "packageLength"},
+      {[](Parts p) { p.header.defaultDirectory[259] = 'x'; }, "defaultDirectory"},
+      {[](Parts p) { SetField(p.header.defaultDirectory, "C:\\..\\x"); }, "\"..\""},
+      {[](Parts p) { p.header.defaultLanguage = 5; }, "defaultLanguage 5"},
+      {[](Parts p) { p.header.reserved[259] = 1; }, "reserved"},
+      {[](Parts p) { p.header.recordCount = 4; }, "record 4 at offset"},
+      {[](Parts p) { p.header.dataOffset++; }, "recordSize"},
+      {[](Parts p) { p.header.dataOffset = 0xFFFFFFFF; }, "dataOffset 4294967295"},
+      {[](Parts p) { p.header.headerSize = 567; }, "no package header"},
+      {[](Parts p) { p.header.magic[25] = 'x'; }, "no package header"},
+      {[](Parts p) { p.record.recordSize = 695; }, "recordSize of 695"},
+      {[](Parts p) { p.record.fileName[31] = 'x'; }, "fileName does not end"},
+      {[](Parts p) { p.record.destination[259] = 'x'; }, "destination does not end"},
+      {[](Parts p) { p.record.versionLanguage[127] = 'x'; }, "versionLanguage does not end"},
+      {[](Parts p) { p.record.versionLanguage[0] = 'G'; }, "versionLanguage \"G4"},
+      {[](Parts p) { p.record.reserved[0] = 1; }, "reserved"},
+      {[](Parts p) { p.record.fileName[0] = '/'; }, "fileName \"/"},
+      {[](Parts p) { SetField(p.record.destination, ""); }, "nowhere"},
+      {[](Parts p) { p.record.storedSize = 0xFFFFFFFF; }, "reaches into the header"},
+      {[](Parts p) {
+         SetField(p.record.fileName, "a.exe");
+         SetField(p.record.destination, "\\");
+       },
        "filled already"},
       {withSize(2999), "expands to more than"},
       {withSize(3001), "expands to 3000 bytes"},
       {withSize(0x80000000), "2 GiB or more"},
-      {[](Image image) { image.pieces()[1].stream[0] = 'p'; }, "does not begin with"},
-      {[](Image image) {
-         image.pieces()[2].stream += '\0';
-         image.header().packageLength++;
+      {[](Parts p) { p.image.pieces()[1].stream[0] = 'p'; }, "does not begin with"},
+      {[](Parts p) {
+         p.image.pieces()[2].stream += '\0';
+         p.header.packageLength++;
        },
        "1 bytes stand between"},
-      {[](Image image) { image.executable()[0] = 'X'; }, "no version resource"},
-      {[](Image image) {
-         image.executable().clear();
-         image.header().dataOffset = 0;
+      {[](Parts p) { p.image.executable()[0] = 'X'; }, "no version resource"},
+      {[](Parts p) {
+         p.image.executable().clear();
+         p.header.dataOffset = 0;
        },
        "no executable"},
   };
   for (const auto& [change, part] : rows) {
     ImageBuilder image = sample;
-    change(image);
+    change({image, image.header(), image.pieces()[1].record});
     Write("image.exe", image.RawBytes());
     const std::vector<std::string> wrong = WrongIn("@image.exe");
     ASSERT_EQ(wrong.size(), 1u) << part << ": " << (wrong.empty() ? "" : wrong[1]);
@@ -96,9 +91,9 @@ TEST_F(ImageVerifier, FindsEachChange) {
 
 TEST_F(ImageVerifier, KnowsTheRulesOfRemovalPrograms) {
   EXPECT_TRUE(WrongIn("@image.exe").empty());
-  ASSERT_EQ(Run({"removal", "@image.exe", "-o", "@removal.exe", "--language", "german"}).status, 0);
+  ASSERT_EQ(Run("removal @image.exe -o @removal.exe --language german").status, 0);
   EXPECT_TRUE(WrongIn("@removal.exe").empty());
-  ExpectRefused(Run({"removal", "@removal.exe", "-o", "@again.exe"}));
+  ExpectRefused(Run("removal @removal.exe -o @again.exe"));
 
   sample.header().removalImageFlag = 1;
   sample.header().packageLength = 3 * sizeof(FileRecord);

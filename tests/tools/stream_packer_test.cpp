@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include <chrono>
-#include <functional>
 #include <random>
 #include <string>
 #include <thread>
@@ -18,13 +17,6 @@
 namespace {
 
 constexpr image::PackMethod kMethods[] = {image::kPackGreedily, image::kPackFast, image::kPackBest};
-
-std::string Pack(const std::string& file, const image::PackMethod& method,
-                 const std::function<void(size_t)>& progress = {}) {
-  const auto* const first = reinterpret_cast<const uint8_t*>(file.data());
-  const std::vector<uint8_t> stream = image::PackStream({first, file.size()}, method, progress);
-  return {stream.begin(), stream.end()};
-}
 
 // Words of a made-up language, some much more frequent than others.
 std::string Text(size_t size, unsigned seed) {
@@ -78,8 +70,8 @@ void ExpectGood(const std::string& stream, const std::string& file, bool isPlann
 
 TEST(StreamPacker, PacksTheWorkedExampleAndTheEmptyFile) {
   for (const image::PackMethod& method : kMethods) {
-    EXPECT_EQ(Pack("abababa", method), "PKZ\x30\x98\xA0\x70\x50");
-    EXPECT_EQ(Pack("", method), std::string("PKZ\0", 4));
+    EXPECT_EQ(PackStream("abababa", method), "PKZ\x30\x98\xA0\x70\x50");
+    EXPECT_EQ(PackStream("", method), std::string("PKZ\0", 4));
   }
 }
 
@@ -93,7 +85,7 @@ TEST(StreamPacker, MakesGoodStreamsOfEveryFile) {
     std::vector<size_t> sizes;
     for (const image::PackMethod& method : kMethods) {
       size_t told = 0;
-      const std::string stream = Pack(file, method, [&told](size_t count) { told += count; });
+      const std::string stream = PackStream(file, method, [&told](size_t count) { told += count; });
       EXPECT_EQ(told, file.size());
       ExpectGood(stream, file, method.plansResets);
       sizes.push_back(stream.size());
@@ -111,7 +103,7 @@ TEST(StreamPacker, EndsWellAroundEachWideningAndReset) {
     // Behind limit - 258 codes the next free code is `limit`.
     for (size_t size = limit - 258 - 2; size <= limit - 258 + 2; ++size) {
       SCOPED_TRACE(size);
-      ExpectGood(Pack(PairsOnce(size), image::kPackFast), PairsOnce(size));
+      ExpectGood(PackStream(PairsOnce(size), image::kPackFast), PairsOnce(size));
     }
   }
 }

@@ -30,15 +30,15 @@ class ToolBench : public testing::Test, public TemporaryFolder {
     return names;
   }
 
-  // Runs a tool, moriv-image unless told; an argument "@name" is a path in the test's folder. A run
-  // that is refused says so in one line and leaves the folder as it was.
-  using Tool = int(int, const char* const*, std::ostream&, std::ostream&);
-  ToolRun Run(std::vector<std::string> arguments, Tool tool = image::RunImageTool) const {
-    std::vector<const char*> argv = {"tool"};
-    for (std::string& argument : arguments) {
-      if (argument.starts_with('@')) argument = Host(argument.substr(1)).string();
-      argv.push_back(argument.c_str());
-    }
+  // Runs the tool; its arguments stand between blanks, and "@name" is a path in the test's folder.
+  // A run that is refused says so in one line and leaves the folder as it was.
+  ToolRun Run(const std::string& commandLine) const {
+    std::vector<std::string> arguments = {"tool"};
+    std::istringstream words(commandLine);
+    for (std::string word; words >> word;)
+      arguments.push_back(word[0] == '@' ? Host(word.substr(1)).string() : word);
+    std::vector<const char*> argv;
+    for (const std::string& argument : arguments) argv.push_back(argument.c_str());
     const std::vector<std::string> before = NamesIn(".");
     std::ostringstream out, err;
     const int status = tool(static_cast<int>(argv.size()), argv.data(), out, err);
@@ -55,6 +55,8 @@ class ToolBench : public testing::Test, public TemporaryFolder {
     EXPECT_EQ(run.status, 2) << said;
     EXPECT_NE(run.err.find(said), std::string::npos) << said << ": " << run.err;
   }
+
+  decltype(&image::RunImageTool) tool = image::RunImageTool;
 };
 
 // Holds stub.exe, a.exe (45056 bytes, version 4.1.7), b.dll (3000 bytes, random), empty.txt and
@@ -99,7 +101,8 @@ name = "readme.txt"
                const std::string& output = "@new.exe") const {
     const bool isFile = description.starts_with('@');
     if (!isFile) Write("text.toml", description);
-    return Run({"pack", isFile ? description : "@text.toml", "--stub", stub, "-o", output});
+    return Run("pack " + (isFile ? description : "@text.toml") + " --stub " + stub + " -o " +
+               output);
   }
 
   ImageBuilder sample;  // image.exe taken apart
