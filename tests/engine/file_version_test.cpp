@@ -30,6 +30,9 @@ TEST(VersionText, EverySeparatorClosesANumber) {
     EXPECT_EQ(fields, version) << text;
   }
   Version fields = {};
+  int16_t four[] = {0, 0, 0, 77};
+  EXPECT_EQ(ParseVersionText("1.2.3.4", four), StatusOk);
+  EXPECT_EQ(four[3], 77) << "there are three fields";
   EXPECT_EQ(ParseVersionText(nullptr, fields.data()), StatusBadArgument);
   EXPECT_EQ(ParseVersionText("1", nullptr), StatusBadArgument);
 }

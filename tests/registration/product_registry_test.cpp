@@ -239,6 +239,9 @@ TEST_F(ProductRegistry, AProductIsRegisteredWithADirectoryHoweverShort) {
     EXPECT_EQ(Get(1), *directory != '\0' ? "a" : "null, ");
   }
   EXPECT_EQ(RegisterProduct(nullptr), StatusNotRegistered);
+  SetupRequest record = {};
+  EXPECT_EQ(ReadRegisteredProduct(&record), 1);
+  EXPECT_EQ(record.productFound, 1);
 }
 
 TEST_F(ProductRegistry, ANameThatFitsNoNodeBlocksARemovalToo) {
