@@ -56,7 +56,7 @@ void ExpectGood(const std::string& stream, const std::string& file, bool isPlann
   for (size_t bit = 24; stream.size() * 8 - bit >= width;) {
     uint32_t code = 0;
     for (const size_t end = bit + width; bit < end; ++bit)
-      code = code << 1 | (static_cast<uint8_t>(stream[bit / 8]) >> (7 - bit % 8) & 1u);
+      code = code << 1 | (unsigned{static_cast<uint8_t>(stream[bit / 8])} >> (7 - bit % 8) & 1u);
     const bool isLastThatFits = nextFree == (1u << width) - 1;
     ASSERT_EQ(code == 257, isLastThatFits && width < 15) << nextFree;
     ASSERT_TRUE(code == 258 ? isPlanned || nextFree == 32767 : nextFree != 32767) << nextFree;
