@@ -25,7 +25,7 @@ demo-dialog: native win32
 
 # Unit tests, fault loops and scenarios, natively and under Wine; ends with CTest's own closing line.
 test: all
-	@tools/bootstrap --wine32
+	@tools/bootstrap --wow64
 	@tools/test
 
 # What keeps the house in order: tools/check says what it checks.

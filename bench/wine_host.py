@@ -1,5 +1,5 @@
-"""The Windows builds under Wine: the 32-bit program where this host can run it, else the 64-bit
-one."""
+"""The Windows builds under Wine: the 32-bit program on a 64-bit Windows where this host can run it,
+else the 64-bit one."""
 
 import shutil
 import subprocess
@@ -16,21 +16,21 @@ class WineHost:
     """The Wine that the figures are taken with; `why_not` says why there is none."""
 
     def __init__(self):
-        self.bits, self.why_not = 0, ''
-        for bits in (32, 64):
-            answer = subprocess.run([TOOL, 'can-run', str(bits)], capture_output=True, text=True)
+        self.world, self.bits, self.why_not = '', 0, ''
+        for world, bits in (('wow64', 32), ('wine64', 64)):
+            answer = subprocess.run([TOOL, 'can-run', world], capture_output=True, text=True)
             if answer.returncode == 0:
-                self.bits, self.why_not = bits, ''
+                self.world, self.bits, self.why_not = world, bits, ''
                 break
             self.why_not = answer.stdout.strip().removeprefix('no: ')
         self.build = Path(f'build/bench-win{self.bits}')
-        self.prefix = BUILD / f'prefix{self.bits}'
+        self.prefix = BUILD / f'prefix-{self.world}'
 
     def __enter__(self):
         """A fresh prefix: an installed product would say where the next install goes."""
         if not self.why_not:
             shutil.rmtree(self.prefix, ignore_errors=True)
-            output_of([TOOL, 'prefix', self.prefix, self.bits])
+            output_of([TOOL, 'prefix', self.prefix, self.world])
         return self
 
     def __exit__(self, *error):

@@ -1,7 +1,8 @@
 """The files of a machine's drives, and what a run changed among them.
 
 A machine's folder has one folder a drive, drive_c and so on. Paths are the machine's own
-(C:\\a\\b); a directory's ends with a backslash.
+(C:\\a\\b); a directory's ends with a backslash. Some folders may bear another name for the machine's
+programs than on the host.
 """
 
 import os
@@ -11,12 +12,13 @@ from pathlib import Path
 
 
 class FileTree:
-    def __init__(self, machine_folder):
-        self.folder = Path(machine_folder)
+    def __init__(self, machine_folder, renamed=()):
+        """renamed: pairs of a folder's path as programs name it and as it lies here."""
+        self.folder, self.renamed = Path(machine_folder), renamed
 
     def host(self, path):
         """Host path of one of the machine's, which need not exist."""
-        drive, _, rest = path.partition(':')
+        drive, _, rest = _rename(path, self.renamed).partition(':')
         return self.folder / f'drive_{drive.lower()}' / rest.strip('\\').replace('\\', '/')
 
     def read(self, path):
@@ -44,7 +46,15 @@ class FileTree:
         stamps = {}
         for drive in sorted(self.folder.glob('drive_?')):
             _walk(drive, f'{drive.name[-1].upper()}:\\', stamps)
-        return stamps
+        back = [(here, named) for named, here in self.renamed]
+        return {_rename(path, back): stamp for path, stamp in stamps.items()} if back else stamps
+
+
+def _rename(path, pairs):
+    for old, new in pairs:
+        if f'{path}\\'.lower().startswith(f'{old}\\'.lower()):
+            return new + path[len(old):]
+    return path
 
 
 def _walk(folder, path, stamps):

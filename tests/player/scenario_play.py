@@ -130,11 +130,11 @@ class _Player:
         return _as_checks(done, before) if report and self.accept else report
 
     def _run(self, section):
-        program, arguments = _program_and_arguments(section.argument)
+        program, arguments, quoted = _command(section.argument)
         if program in self.packed:
             self.last_image = program
         begun = datetime.now().replace(microsecond=0)  # a heading has whole seconds
-        outcome = self.machine.run(program, arguments)
+        outcome = self.machine.run(program, arguments, quoted)
         self.times.append((self.machine.now or begun, self.machine.now or datetime.now()))
         return outcome
 
@@ -235,11 +235,13 @@ def _as_checks(done, before):
     return named_pages.with_words(log_text.with_words('\n'.join(lines))).split('\n')
 
 
-def _program_and_arguments(text):
-    """The path, in quotes when it has blanks, and all behind it and one blank; without a path the image
-    that every scenario has."""
+def _command(text):
+    """The path, all behind it and one blank, and whether it stands in quotes; without a path the image that
+    every scenario has, in quotes."""
     match = re.match('"([^"]*)"(?: |$)(.*)|([A-Za-z]:\S*) ?(.*)', text)
-    return (match[1] or match[3], match[2] or match[4]) if match else (DEFAULT_IMAGE, text)
+    if not match:
+        return DEFAULT_IMAGE, text, True
+    return match[1] or match[3], match[2] or match[4], match[1] is not None
 
 
 def _difference(what, said, done):

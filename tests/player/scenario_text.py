@@ -18,7 +18,7 @@ DEFAULT_IMAGE = r'C:\Setup.exe'
 LOG = r'C:\windows\MorivLog.txt'
 
 _KEYWORD = re.compile(f'({"|".join(PREPARATIONS + ACTIONS + CHECKS)})(?:$| |(?=,))(.*)')
-_ONLY = re.compile('only (stand-in|Wine): (.+)')
+_ONLY = re.compile('only (stand-in|Wine|wow64): (.+)')
 
 
 class ScenarioError(pytest.Collector.CollectError):
@@ -36,7 +36,7 @@ class Section(namedtuple('Section', 'keyword argument place body checks')):
         return self.keyword
 
 
-# title: its first comment line; only: its one world, stand-in or Wine, or ''; reason: why only there.
+# title: its first comment line; only: its one kind of world, or ''; reason: why only there.
 Scenario = namedtuple('Scenario', 'name title only reason sections')
 
 

@@ -1,4 +1,4 @@
-"""The two worlds in which a scenario can be played: the stand-in machine, and Wine.
+"""The worlds in which a scenario can be played: the stand-in machine, and two of Wine.
 
 A world gives machines, one after the other or (the stand-in) several at once. A machine has a file
 tree and a registry, starts programs and can be restarted.
@@ -20,7 +20,7 @@ from registry_text import Registry
 
 ROOT = Path(__file__).resolve().parent.parent.parent
 BUILD = ROOT / 'build'
-WORLDS = ('stand-in', 'wine64', 'wine32')
+WORLDS = ('stand-in', 'wine64', 'wow64')
 LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
 TIME_LIMIT = int(os.environ.get('MORIV_TIME_LIMIT', 60))  # seconds, for one program
 
@@ -39,11 +39,11 @@ class WorldError(Exception):
 
 def make_world(name, native, work, wine=BUILD / 'wine'):
     """native: folder of the native build; work: folder for machines; wine: folder for Wine prefixes."""
-    return StandIn(native, work) if name == 'stand-in' else Wine(name, wine)
+    return StandIn(native, work) if name == 'stand-in' else {'wine64': Wine64, 'wow64': Wow64}[name](wine)
 
 
 class Machine:
-    """What the machines of both worlds do alike. Has its files, and a script for the next run's user."""
+    """What all machines do alike. Has its files, and a script for the next run's user."""
 
     codepage = 'cp1252'
     now = None   # its own time, when it is set
@@ -52,15 +52,17 @@ class Machine:
     def add_drive(self, letter):
         """Under a world where it is not enough that a drive has a folder."""
 
-    def run(self, program, arguments):
+    def run(self, program, arguments, quoted=True):
+        """quoted: the program's path stands in quotes in its command line."""
         user, self.user = self.user, None
         if user is not None:
             self.script.write_text('\n'.join(user) + '\n', encoding='utf-8')
-        return self._run(program, arguments, user is not None)
+        return self._run(program, arguments, quoted, user is not None)
 
 
 class StandIn:
     name = 'stand-in'
+    kinds = (name,)  # what scenarios for one kind of world call it
     at_once = 2
 
     def __init__(self, native, work):
@@ -101,7 +103,7 @@ class StandInMachine(Machine):
     def set_registry(self, registry):
         (self.folder / 'registry.reg').write_bytes(registry.regedit4())
 
-    def _run(self, program, arguments, has_user):
+    def _run(self, program, arguments, quoted, has_user):
         command = [self.files.host(program), *([arguments] if arguments else [])]
         environment = os.environ | {'MORIV_MACHINE': str(self.folder), 'LC_ALL': 'C.UTF-8'}
         if has_user:
@@ -149,6 +151,7 @@ def _split_exit_code(lines):
 
 class Wine:
     at_once = 1
+    renamed = ()  # folders, as programs name them and as they lie in the prefix
     tool = ROOT / 'tools' / 'wine'
 
     # All that the program and the scenarios touch; the rest of Wine's registry is not looked at. The
@@ -157,17 +160,17 @@ class Wine:
         'Zeb', 'Netscape', r'Classes\http\shell\open\command', r'Classes\htmlfile\shell\open\command',
         *(rf'Microsoft\Windows\CurrentVersion\{key}' for key in ('Uninstall', 'RunOnce', 'App Paths')))]
 
-    def __init__(self, name, folder):
-        self.name, self.bits = name, name.removeprefix('wine')
-        self.prefix, build = folder / f'scenarios{self.bits}', BUILD / f'win{self.bits}'
+    def __init__(self, folder):
+        self.kinds = ('Wine', self.name)
+        self.prefix, build = folder / f'scenarios-{self.name}', BUILD / f'win{self.bits}'
         self.stub, self.driver = build / 'MorivSetup.exe', build / 'tests' / 'dialog_driver.exe'
         self.agent = None  # its process
 
     def open(self):
-        answer = subprocess.run([self.tool, 'can-run', self.bits], capture_output=True, text=True)
+        answer = subprocess.run([self.tool, 'can-run', self.name], capture_output=True, text=True)
         if answer.returncode != 0:
             # Only what the host can't do and what was asked for is left out without a failure.
-            asked_for = os.environ.get('MORIV_WINE') == 'none' or self.bits == '32'
+            asked_for = os.environ.get('MORIV_WINE') == 'none' or self.bits == 32
             raise WorldError(f'left out: {(answer.stdout or answer.stderr).strip()}',
                              LEFT_OUT if asked_for else 1)
         agent = self.driver.with_name('scenario_agent.exe')
@@ -176,7 +179,7 @@ class Wine:
         # Two runs in one prefix would see each other's files; the second one waits.
         self.lock = open(f'{self.prefix}.in-use', 'w')
         fcntl.flock(self.lock, fcntl.LOCK_EX)
-        _call(self.tool, 'prefix', self.prefix, self.bits)
+        _call(self.tool, 'prefix', self.prefix, self.name)
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
         with open(f'{self.prefix}.agent-log', 'wb') as errors:
@@ -213,12 +216,27 @@ class Wine:
         raise WorldError(f'the agent under Wine ended at "{command}"; see {self.prefix}.agent-log')
 
 
+class Wine64(Wine):
+    name, bits = 'wine64', 64
+    views = (64,)
+
+
+class Wow64(Wine):
+    """The 32-bit program on a 64-bit Windows. The agent is a 32-bit program too, and sees the registry and
+    the system directory as the program does."""
+
+    name, bits = 'wow64', 32
+    views = (64, 32)  # of the registry; the last one is the program's
+    renamed = ((r'C:\windows\system32', r'C:\windows\syswow64'),
+               (r'C:\windows\sysnative', r'C:\windows\system32'))
+
+
 class WineMachine(Machine):
     tells_requests = False
 
     def __init__(self, world):
         self.world = world
-        self.files, self.script = FileTree(world.prefix), Path(f'{world.prefix}.user')
+        self.files, self.script = FileTree(world.prefix, world.renamed), Path(f'{world.prefix}.user')
 
     def registry(self):
         registry = Registry(terminates=True)
@@ -251,23 +269,24 @@ class WineMachine(Machine):
         if not link.is_symlink():
             link.symlink_to(f'../{drive}')
 
-    def _run(self, program, arguments, has_user):
+    def _run(self, program, arguments, quoted, has_user):
         """A user's script is played by tools/windows/dialog_driver.cpp, which writes what is shown."""
+        command_line = f'"{program}" {arguments}' if quoted else f'{program} {arguments}'
         if not has_user:
-            code, rest = _split_exit_code(self._start(program, arguments))
+            code, rest = _split_exit_code(self._start(program, command_line))
             return Outcome(code, [], ' '.join(rest))
         shown = Path(f'{self.world.prefix}.shown')
         shown.write_bytes(b'')
         driver, script, output = (_windows_path(p) for p in (self.world.driver, self.script, shown))
-        answer = self._start(driver, f'{script} {output} "{program}" {arguments}')
+        answer = self._start(driver, f'{driver} {script} {output} {command_line}')
         code, lines = _split_exit_code(shown.read_text(encoding='utf-8', errors='replace').splitlines())
         trouble = '' if code is not None else f'the driver gave no exit code: {" ".join(answer)}'
         return Outcome(code, lines, trouble)
 
-    def _start(self, program, arguments):
+    def _start(self, program, command_line):
         """A busy host refuses to start a program now and then, with an internal error."""
         for _ in range(3):
-            answer = self.world.ask(f'run {TIME_LIMIT} {program}\t{arguments}')
+            answer = self.world.ask(f'run {TIME_LIMIT} {program}\t{command_line}')
             if answer != ['cannot start: 1359']:
                 break
         return answer
@@ -291,7 +310,9 @@ class WineMachine(Machine):
         for drive in self.world.prefix.glob('drive_[!c]'):
             drive.rmdir()
             (self.world.prefix / 'dosdevices' / f'{drive.name[-1]}:').unlink(missing_ok=True)
-        self.set_registry(self.world.fresh_registry)
+        for view in self.world.views:
+            self.world.ask(f'view {view}')
+            self.set_registry(self.world.fresh_registry)
 
 
 def _windows_path(path):

@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Plays scenarios in one world: pytest with the plugin of tests/player/. README.md tells how.
 
-    run_scenarios.py [--world stand-in|wine64|wine32] [--fail-fast] [--accept] [NAME...]
+    run_scenarios.py [--world stand-in|wine64|wow64] [--fail-fast] [--accept] [NAME...]
 
 A NAME is a scenario's, a folder's, one of the programs of tests/player/, or "all" for scenarios and
 programs; without any, the scenarios. --help lists pytest's options too.

@@ -9,9 +9,11 @@
 // code page, names of values and data are hexadecimal bytes ("-" for none), keys lie under
 // HKEY_LOCAL_MACHINE.
 //
-//   run SECONDS PROGRAM<TAB>ARGUMENTS  starts the program with exactly these arguments and waits:
+//   run SECONDS PROGRAM<TAB>COMMAND    starts the program with exactly this command line and waits:
 //                                      "exit code: N", "ended after N seconds" or
 //                                      "cannot start: ERROR"
+//   view BITS                          from now on keys are those that a program of 32 or 64 bits
+//                                      sees; without it those that this program sees
 //   key KEY                            makes the key; the values that follow are its own
 //   value TYPE NAME DATA               sets a value
 //   delete KEY                         deletes a key and all below it, if it is there
@@ -61,12 +63,11 @@ std::string BytesFromHex(const std::string& text) {
 void RunProgram(std::string line) {
   const DWORD seconds = std::strtoul(TakeWord(&line).c_str(), nullptr, 10);
   const std::string program = TakeWord(&line, '\t');
-  std::string commandLine = "\"" + program + "\" " + line;
   STARTUPINFOA startup = {};
   startup.cb = sizeof startup;
   PROCESS_INFORMATION process = {};
-  if (!CreateProcessA(program.c_str(), commandLine.data(), nullptr, nullptr, FALSE, 0, nullptr,
-                      "C:\\", &startup, &process)) {
+  if (!CreateProcessA(program.c_str(), line.data(), nullptr, nullptr, FALSE, 0, nullptr, "C:\\",
+                      &startup, &process)) {
     std::printf("cannot start: %lu\n", GetLastError());
     return;
   }
@@ -83,6 +84,8 @@ void RunProgram(std::string line) {
   CloseHandle(process.hProcess);
 }
 
+REGSAM registryView = 0;
+
 // The key that "value" acts on: the last one that "key" named.
 HKEY selectedKey = nullptr;
 
@@ -93,8 +96,9 @@ void CloseSelectedKey() {
 
 void SelectKey(const std::string& key) {
   CloseSelectedKey();
-  const LSTATUS error = RegCreateKeyExA(HKEY_LOCAL_MACHINE, key.c_str(), 0, nullptr, 0,
-                                        KEY_ALL_ACCESS, nullptr, &selectedKey, nullptr);
+  const LSTATUS error =
+      RegCreateKeyExA(HKEY_LOCAL_MACHINE, key.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS | registryView,
+                      nullptr, &selectedKey, nullptr);
   if (error != ERROR_SUCCESS) PrintFailure(key.c_str(), error);
 }
 
@@ -110,8 +114,18 @@ void SetValue(std::string line) {
 
 void DeleteKey(const std::string& key) {
   CloseSelectedKey();
-  const LSTATUS error = RegDeleteTreeA(HKEY_LOCAL_MACHINE, key.c_str());
-  if (error != ERROR_SUCCESS && error != ERROR_FILE_NOT_FOUND) PrintFailure(key.c_str(), error);
+  HKEY opened = nullptr;
+  LSTATUS error =
+      RegOpenKeyExA(HKEY_LOCAL_MACHINE, key.c_str(), 0, KEY_ALL_ACCESS | registryView, &opened);
+  if (error == ERROR_FILE_NOT_FOUND) return;
+  if (error == ERROR_SUCCESS) {
+    error = RegDeleteTreeA(opened, nullptr);
+    RegCloseKey(opened);
+  }
+  if (error == ERROR_SUCCESS) {
+    error = RegDeleteKeyExA(HKEY_LOCAL_MACHINE, key.c_str(), registryView, 0);
+  }
+  if (error != ERROR_SUCCESS) PrintFailure(key.c_str(), error);
 }
 
 void DumpValues(HKEY key) {
@@ -135,7 +149,8 @@ void DumpValues(HKEY key) {
 
 void DumpKey(const std::string& path) {
   HKEY key = nullptr;
-  const LSTATUS error = RegOpenKeyExA(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ, &key);
+  const LSTATUS error =
+      RegOpenKeyExA(HKEY_LOCAL_MACHINE, path.c_str(), 0, KEY_READ | registryView, &key);
   if (error == ERROR_FILE_NOT_FOUND) return;
   if (error != ERROR_SUCCESS) return PrintFailure(path.c_str(), error);
   std::printf("key %s\n", path.c_str());
@@ -151,6 +166,8 @@ void CarryOut(std::string line) {
   const std::string command = TakeWord(&line);
   if (command == "run") {
     RunProgram(line);
+  } else if (command == "view") {
+    registryView = line == "64" ? KEY_WOW64_64KEY : KEY_WOW64_32KEY;
   } else if (command == "key") {
     SelectKey(line);
   } else if (command == "value") {
