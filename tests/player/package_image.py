@@ -22,9 +22,9 @@ Record = namedtuple('Record', 'recordSize fileName destination versionLanguage v
 # The image that a scenario has unless it needs another one.
 USUAL_FILES = ('zebdial.exe = 5000 bytes -> %INSTALL_DIR%', 'zebnet.dll = 3000 bytes -> %INSTALL_DIR%')
 
-# What images are made with: host paths of a program without a package, of the tool that packs one, and
-# of folders with real files, by the word for such a file.
-Tools = namedtuple('Tools', 'stub image_tool folders')
+# What images are made with: host paths of the world's program without a package, of the tool that packs
+# one, of folders with real files, by the word for such a file, and of the 64-bit Windows program.
+Tools = namedtuple('Tools', 'stub image_tool folders stub64')
 
 _PACKED = {}  # images by all that goes into them: most scenarios have the same
 
@@ -37,6 +37,7 @@ class PackedImage:
         """usual: the body changes the usual image, a file of the same name takes the other's place."""
         options = {'default_directory': "'C:\\Program Files\\Moriv'", 'default_language': "'french'"}
         flags, lines = [], {}  # lines of files, by name
+        stub = tools.stub
         for line in [*(USUAL_FILES if usual else ()), *body]:
             name, _, value = line.partition(' = ')
             if ' -> ' in line:
@@ -45,17 +46,19 @@ class PackedImage:
                 lines = {name: f'{name} = sample {name} -> %INSTALL_DIR%' for name in lines}
             elif line in ('allow unknown macros', 'packed best'):
                 flags.append('--' + line.removeprefix('packed ').replace(' ', '-'))
+            elif line == '64-bit program':
+                stub = tools.stub64
             else:
                 options[name.replace(' ', '_')] = value if value.isdigit() else f"'{value}'"
         parts = [re.fullmatch('(.+?) = (.*) -> (.*)', line).groups() for line in lines.values()]
         self.files = [(name, destination) for name, _, destination in parts]
         self.contents = {name: file_content(words, f'packed {name}', tools) for name, words, _ in parts}
-        key = str((tools.stub, options, flags, self.files)), *self.contents.values()
+        key = str((stub, options, flags, self.files)), *self.contents.values()
         if key not in _PACKED:
-            _PACKED[key] = self._pack(tools, options, flags)
+            _PACKED[key] = self._pack(tools.image_tool, stub, options, flags)
         self.bytes = _PACKED[key]
 
-    def _pack(self, tools, options, flags):
+    def _pack(self, image_tool, stub, options, flags):
         lines = ['[package]', *(f'{name} = {value}' for name, value in options.items())]
         with TemporaryDirectory() as folder:
             for name, destination in self.files:
@@ -63,8 +66,8 @@ class PackedImage:
                 lines += ['[[file]]', f"source = '{name}'", f"destination = '{destination}'"]
             description, image = Path(folder, 'package.toml'), Path(folder, 'image.packed')
             description.write_text('\n'.join(lines) + '\n', encoding='utf-8')
-            done = subprocess.run([tools.image_tool, 'pack', description, '--stub', tools.stub,
-                                   '-o', image, *flags], capture_output=True, text=True)
+            done = subprocess.run([image_tool, 'pack', description, '--stub', stub, '-o', image,
+                                   *flags], capture_output=True, text=True)
             if done.returncode != 0:
                 raise ValueError(done.stderr.strip())
             return image.read_bytes()

@@ -131,7 +131,8 @@ class Player:
         self.work = options.native / 'scenarios'
         self.world = make_world(options.world, options.native, self.work / 'stand-in', options.wine)
         folders = {'sample': BUILD / 'win32' / 'samples', 'real': self.work / f'{options.world}-real'}
-        self.tools = Tools(self.world.stub, options.native / 'moriv-image', folders)
+        self.tools = Tools(self.world.stub, options.native / 'moriv-image', folders,
+                           BUILD / 'win64' / 'MorivSetup.exe')
         self.pool = None
 
     def tell(self, line):

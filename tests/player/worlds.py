@@ -22,6 +22,7 @@ ROOT = Path(__file__).resolve().parent.parent.parent
 BUILD = ROOT / 'build'
 WORLDS = ('stand-in', 'wine64', 'wow64')
 LEFT_OUT = 77  # exit status that CTest reports as "Skipped"
+READ_ONLY_DRIVE = 'R'
 TIME_LIMIT = int(os.environ.get('MORIV_TIME_LIMIT', 60))  # seconds, for one program
 
 # What a program did: its exit code (None when it ended without one), the lines that it showed, and
@@ -50,7 +51,7 @@ class Machine:
     user = None  # what the user of the next run does, line by line; the run behind it has none
 
     def add_drive(self, letter):
-        """Under a world where it is not enough that a drive has a folder."""
+        """What it needs beside its folder. READ_ONLY_DRIVE becomes a disk that programs can't write to."""
 
     def run(self, program, arguments, quoted=True):
         """quoted: the program's path stands in quotes in its command line."""
@@ -95,6 +96,10 @@ class StandInMachine(Machine):
         settings = dict(line.split(' = ', 1) for line in lines if ' = ' in line)
         self.codepage = f'cp{settings.get("codepage", 1252)}'
         self.now = datetime.fromisoformat(settings['now']) if 'now' in settings else None
+
+    def add_drive(self, letter):
+        if letter == READ_ONLY_DRIVE:
+            (self.folder / 'machine.ini').write_text(f'[disk {letter}]\nreadonly = 1\n')
 
     def registry(self):
         text = (self.folder / 'registry.reg').read_bytes().decode(self.codepage, 'replace')
@@ -182,9 +187,12 @@ class Wine:
         _call(self.tool, 'prefix', self.prefix, self.name)
         # A display of their own for all windows of the session.
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
+        read_only = self.prefix / f'drive_{READ_ONLY_DRIVE.lower()}'
+        read_only.mkdir(exist_ok=True)
         with open(f'{self.prefix}.agent-log', 'wb') as errors:
             self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent],
-                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors)
+                                          stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors,
+                                          env=os.environ | {'MORIV_WINE_READ_ONLY': str(read_only)})
         self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
             self.fresh_registry.make(key)
@@ -308,7 +316,8 @@ class WineMachine(Machine):
         for path in sorted(self.files.snapshot().keys() - fresh):
             self.files.delete(path)
         for drive in self.world.prefix.glob('drive_[!c]'):
-            drive.rmdir()
+            if drive.name[-1] != READ_ONLY_DRIVE.lower():  # a mount of the agent's
+                drive.rmdir()
             (self.world.prefix / 'dosdevices' / f'{drive.name[-1]}:').unlink(missing_ok=True)
         for view in self.world.views:
             self.world.ask(f'view {view}')
