@@ -5,14 +5,16 @@
 #include <stdexcept>
 #include <string>
 
+#include "tools/image/host_text.h"
+
 namespace image {
 
 class BadInput : public std::runtime_error {
  public:
   BadInput(const std::filesystem::path& file, const std::string& what)
-      : std::runtime_error(file.string() + ": " + what) {}
+      : std::runtime_error(TextOf(file) + ": " + what) {}
   BadInput(const std::filesystem::path& file, int line, const std::string& what)
-      : std::runtime_error(file.string() + ":" + std::to_string(line) + ": " + what) {}
+      : std::runtime_error(TextOf(file) + ":" + std::to_string(line) + ": " + what) {}
 };
 
 // The host's words for the last failed system call.

@@ -10,6 +10,7 @@
 
 #include "machine/code_page.h"
 #include "tools/image/bad_input.h"
+#include "tools/image/host_text.h"
 #include "tools/image/image_contents.h"
 #include "tools/image/output_file.h"
 #include "tools/image/progress_bar.h"
@@ -119,7 +120,9 @@ class Extractor {
     }
   }
 
-  fs::path TargetOf(const std::string& name) const { return order_.folder / machine::ToUtf8(name); }
+  fs::path TargetOf(const std::string& name) const {
+    return order_.folder / PathOf(machine::ToUtf8(name));
+  }
 
   void ExpandAll(const std::vector<const PackagedFile*>& chosen) {
     uint64_t total = 0;

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "tools/image/bad_input.h"
+#include "tools/image/host_text.h"
 #include "tools/image/input_file.h"
 #include "tools/image/record_text.h"
 #include "tools/image/stream_format.h"
@@ -138,13 +139,13 @@ class DescriptionReader {
     const auto source = FindText(table, "source");
     if (!source || source->text.empty())
       Fail(LineOf(table), "this file has no \"source\"; name one");
-    file.source = source->text;
+    file.source = PathOf(source->text);
     file.sourceLine = source->line;
     const auto destination = FindAnsiText(table, "destination");
     if (!destination) Fail(LineOf(table), "this file has no \"destination\"; say where it goes");
     file.destination = *destination;
     const auto name = FindAnsiText(table, "name");
-    file.name = name ? *name : ToAnsi({file.source.filename().string(), source->line}, "source");
+    file.name = name ? *name : ToAnsi({TextOf(file.source.filename()), source->line}, "source");
     file.version = FindAnsiText(table, "version");
     file.language = FindAnsiText(table, "language");
     description_.files.push_back(std::move(file));

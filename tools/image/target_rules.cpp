@@ -181,4 +181,14 @@ std::vector<std::string> TargetKeys(std::string_view destination, std::string_vi
   return keys;
 }
 
+size_t CountCertainPlaces(std::string_view destination) {
+  const std::vector<std::string> elements = SplitElements(destination);
+  return static_cast<size_t>(
+      std::count_if(elements.begin(), elements.end(), [](const std::string& text) {
+        const MacroCode macro = ParseElement(text).macro;
+        return macro != MacroNetscape && macro != MacroExplorer && macro != MacroOpera &&
+               macro != MacroAllBrowsers;
+      }));
+}
+
 }  // namespace image

@@ -29,4 +29,7 @@ std::optional<std::string> FindDestinationFault(std::string_view destination, st
 // One text for each place that the file can go to, equal for equal places whatever their spelling.
 std::vector<std::string> TargetKeys(std::string_view destination, std::string_view name);
 
+// How many places the file goes to on every machine: a browser's plug-in directory is none.
+size_t CountCertainPlaces(std::string_view destination);
+
 }  // namespace image

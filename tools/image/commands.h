@@ -1,0 +1,31 @@
+// The commands of moriv-image, each in a file of its own: its options, and what it does with them.
+#pragma once
+
+#include <iosfwd>
+
+namespace CLI {
+class App;
+}
+
+namespace image {
+
+// What a command writes to, and what the tool is to end with when nothing is thrown.
+struct CommandRun {
+  std::ostream& out;
+  int status = 0;
+};
+
+inline constexpr int kFoundDifferent = 1;  // verify found something wrong, diff found a difference
+inline constexpr int kBadInput = 2;
+
+// Each adds one command to the tool. The command is carried out while the command line is read, and
+// throws for input that it can't take: BadInput or another std::exception with a text for people.
+//   run  outlives the tool
+void AddPackCommand(CLI::App* tool, CommandRun* run);
+void AddListCommand(CLI::App* tool, CommandRun* run);
+void AddVerifyCommand(CLI::App* tool, CommandRun* run);
+void AddExtractCommand(CLI::App* tool, CommandRun* run);
+void AddRemovalCommand(CLI::App* tool, CommandRun* run);
+void AddExplainCommand(CLI::App* tool, CommandRun* run);
+
+}  // namespace image

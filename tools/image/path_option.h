@@ -1,0 +1,17 @@
+// A path on the tool's command line.
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+#include "tools/image/host_text.h"
+
+namespace image {
+
+// As CLI::App::add_option does it for a text; `path` outlives the command.
+inline CLI::Option* AddPathOption(CLI::App* command, const std::string& name,
+                                  std::filesystem::path* path, const std::string& description) {
+  return command->add_option_function<std::string>(
+      name, [path](const std::string& text) { *path = PathOf(text); }, description);
+}
+
+}  // namespace image
