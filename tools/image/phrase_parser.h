@@ -37,7 +37,7 @@ class PhraseParser {
   Phrase NextUpTo(size_t end);
 
  private:
-  size_t LeastGain() const;
+  size_t LeastGain(size_t longest, size_t following) const;
   Phrase LongestAt(size_t position, size_t needed = 0) const;
   void Lengthen(Phrase* phrase, size_t position, size_t needed) const;
   void Shorten(Phrase* phrase, Phrase* following) const;
