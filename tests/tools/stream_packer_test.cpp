@@ -87,7 +87,7 @@ TEST(StreamPacker, MakesGoodStreamsOfEveryFile) {
       size_t told = 0;
       const std::string stream = PackStream(file, method, [&told](size_t count) { told += count; });
       EXPECT_EQ(told, file.size());
-      ExpectGood(stream, file, method.plansResets);
+      ExpectGood(stream, file, method.plansLives);
       sizes.push_back(stream.size());
     }
     EXPECT_LE(sizes[2], sizes[1]);
