@@ -17,7 +17,10 @@
 namespace image {
 namespace {
 
-constexpr uint64_t kHopelesslyBehind = 6000;  // bits
+// In bits; a life that has lasted longer has proved itself.
+uint64_t HopelesslyBehind(uint32_t phrases) {
+  return 3000 + phrases / 2;
+}
 
 // The best way from the start of the file to a candidate, the reset there included.
 struct Way {
@@ -41,7 +44,8 @@ class Planner {
   void GoOnFrom(size_t start) {
     const size_t next = start + 1;
     const size_t literals = places_[next] - places_[start];
-    ways_[next].TakeBetter({ways_[start].bits + kFirstWidth * literals + ResetBits(next, kFirstWidth), start, true});
+    ways_[next].TakeBetter(
+        {ways_[start].bits + kFirstWidth * literals + ResetBits(next, kFirstWidth), start, true});
 
     CodeWidth width;
     uint64_t bits = ways_[start].bits;
@@ -50,7 +54,7 @@ class Planner {
       bits += width.SizeWith(parser_.Next().code);
       for (; end < places_.size() && places_[end] <= parser_.Position(); ++end) {
         ways_[end].TakeBetter({bits + ResetBits(end, width.Bits()), start, false});
-        if (bits > ways_[end].bits + kHopelesslyBehind) return;
+        if (bits > ways_[end].bits + HopelesslyBehind(parser_.Count())) return;
       }
     }
   }
