@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <utility>
 
 #include "tools/image/code_writer.h"
 #include "tools/image/phrase_parser.h"
@@ -17,16 +18,16 @@
 namespace image {
 namespace {
 
-// In bits; a life that has lasted longer has proved itself.
-uint64_t HopelesslyBehind(uint32_t phrases) {
-  return 3000 + phrases / 2;
+// In bits. Where the life on the best way is an old one, its table will soon be full.
+constexpr uint64_t HopelesslyBehind(uint32_t phrasesOnBestWay) {
+  return 500 + phrasesOnBestWay / 4;
 }
 
 // The best way from the start of the file to a candidate, the reset there included.
 struct Way {
   uint64_t bits = std::numeric_limits<uint64_t>::max();
   size_t lastStart = 0;  // the candidate at which its last life begins
-  bool endsInLiterals = false;
+  uint32_t phrases = 0;  // of that life, 0 for one of literals
 
   void TakeBetter(const Way& other) {
     if (other.bits < bits) *this = other;
@@ -45,16 +46,16 @@ class Planner {
     const size_t next = start + 1;
     const size_t literals = places_[next] - places_[start];
     ways_[next].TakeBetter(
-        {ways_[start].bits + kFirstWidth * literals + ResetBits(next, kFirstWidth), start, true});
+        {ways_[start].bits + kFirstWidth * literals + ResetBits(next, kFirstWidth), start, 0});
 
     CodeWidth width;
     uint64_t bits = ways_[start].bits;
     parser_.Restart(places_[start]);
-    for (size_t end = next; end < places_.size() && !parser_.IsFull();) {
+    for (size_t end = start + 1; end < places_.size() && !parser_.IsFull();) {
       bits += width.SizeWith(parser_.Next().code);
       for (; end < places_.size() && places_[end] <= parser_.Position(); ++end) {
-        ways_[end].TakeBetter({bits + ResetBits(end, width.Bits()), start, false});
-        if (bits > ways_[end].bits + HopelesslyBehind(parser_.Count())) return;
+        ways_[end].TakeBetter({bits + ResetBits(end, width.Bits()), start, parser_.Count()});
+        if (bits > ways_[end].bits + HopelesslyBehind(ways_[end].phrases)) return;
       }
     }
   }
@@ -62,7 +63,7 @@ class Planner {
   std::vector<Life> BestWay() const {
     std::vector<Life> lives;
     for (size_t end = places_.size() - 1; end > 0; end = ways_[end].lastStart)
-      lives.push_back({places_[end], ways_[end].endsInLiterals});
+      lives.push_back({places_[end], ways_[end].phrases == 0});
     std::reverse(lives.begin(), lives.end());
     return lives;
   }

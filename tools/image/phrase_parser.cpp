@@ -17,7 +17,8 @@ constexpr size_t kMostShortened = 32;
 
 }  // namespace
 
-void PhraseParser::Restart(size_t position) {
+void PhraseParser::Restart(size_t position, int worth) {
+  worth_ = worth;
   table_.Clear();
   position_ = position;
   count_ = 0;
@@ -55,8 +56,8 @@ Phrase PhraseParser::NextUpTo(size_t end) {
 // costs is worth the more the longer the phrase is against the one behind it, and the less the
 // later it is made. Numbers found by trial, on libraries and on texts.
 size_t PhraseParser::LeastGain(size_t longest, size_t following) const {
-  const int64_t tenths =
-      30 + 4 * static_cast<int64_t>(longest) - 5 * static_cast<int64_t>(following) - count_ / 1300;
+  const int64_t tenths = worth_ + 4 * static_cast<int64_t>(longest) -
+                         5 * static_cast<int64_t>(following) - count_ / 1300;
   return static_cast<size_t>(std::max<int64_t>(tenths / 10, 1));
 }
 
