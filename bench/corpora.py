@@ -112,6 +112,15 @@ def _cut(source, pattern, count):
     raise BenchError(f'{source} has less than {count * TEXT_FILE} bytes of text')
 
 
+def make_random(size):
+    """A file of random bytes, always the same ones."""
+    folder = BUILD / 'corpora' / 'random'
+    _make_anew(folder)
+    file = folder / 'random.dat'
+    file.write_bytes(random.Random(1).randbytes(size))
+    return [file]
+
+
 def make_slices(folder, content, count):
     """The content cut into files of one size."""
     _make_anew(folder)

@@ -53,6 +53,7 @@ def measure(extent):
     decoding.measure_expander_memory(results)
     say('packing')
     packing.measure_packing(corpora, results)
+    packing.measure_packing_of_random_bytes(results)
     say('installs')
     installing.measure_native_install(libraries, extent.installing, results)
     with WineHost() as wine:

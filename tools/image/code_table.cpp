@@ -9,16 +9,16 @@ CodeTable::CodeTable() : slots_(kSlotCount) {
 }
 
 void CodeTable::Clear() {
-  std::fill(slots_.begin(), slots_.end(), Slot{kFreeSlot, kNoCode});
+  std::fill(slots_.begin(), slots_.end(), kFreeSlot);
   std::fill_n(lengths_.begin(), 256, uint16_t{1});
   std::fill_n(reaches_.begin(), 256, uint16_t{1});
 }
 
 void CodeTable::Add(uint32_t prefix, uint8_t byte, uint32_t code) {
-  const uint32_t key = KeyOf(prefix, byte);
-  uint32_t index = HomeOf(key);
-  while (slots_[index].key != kFreeSlot) index = (index + 1) % kSlotCount;
-  slots_[index] = {key, code};
+  Probe probe = ProbeFor(prefix, byte);
+  const uint32_t firstTag = probe.tag;
+  while (slots_[probe.index] != kFreeSlot) probe.Advance();
+  if (probe.tag - firstTag < kDistances) slots_[probe.index] = code << kTagBits | probe.tag;
 
   const auto length = static_cast<uint16_t>(lengths_[prefix] + 1);
   prefixes_[code] = static_cast<uint16_t>(prefix);

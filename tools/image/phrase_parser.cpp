@@ -17,7 +17,8 @@ constexpr size_t kMostShortened = 32;
 
 }  // namespace
 
-void PhraseParser::Restart(size_t position) {
+void PhraseParser::Restart(size_t position, int worth) {
+  worth_ = worth;
   table_.Clear();
   position_ = position;
   count_ = 0;
@@ -51,12 +52,13 @@ Phrase PhraseParser::NextUpTo(size_t end) {
   return phrase;
 }
 
-// How many bytes further phrase and following have to reach for a shorter phrase. The later an
-// entry is made the less it will be used. Numbers found by trial, on libraries and on texts.
-size_t PhraseParser::LeastGain() const {
-  if (count_ < 6000) return 4;
-  if (count_ < 16000) return 3;
-  return count_ < 30000 ? 2 : 1;
+// How many bytes further phrase and following have to reach for a shorter phrase. The entry that it
+// costs is worth the more the longer the phrase is against the one behind it, and the less the
+// later it is made. Numbers found by trial, on libraries and on texts.
+size_t PhraseParser::LeastGain(size_t longest, size_t following) const {
+  const int64_t tenths = worth_ + 4 * static_cast<int64_t>(longest) -
+                         5 * static_cast<int64_t>(following) - count_ / 1300;
+  return static_cast<size_t>(std::max<int64_t>(tenths / 10, 1));
 }
 
 // The longest string of the table at `position`. Where none has `needed` bytes, it may be a shorter
@@ -79,7 +81,7 @@ void PhraseParser::Lengthen(Phrase* phrase, size_t position, size_t needed) cons
 // Takes the length with which phrase and following reach furthest, if that is worth it.
 void PhraseParser::Shorten(Phrase* phrase, Phrase* following) const {
   const size_t longest = phrase->length;
-  size_t needed = longest + following->length + LeastGain();
+  size_t needed = longest + following->length + LeastGain(longest, following->length);
   for (size_t length = longest - 1; length > 0 && longest - length <= kMostShortened; --length) {
     const Phrase candidate = LongestAt(position_ + length, needed - length);
     if (length + candidate.length < needed) continue;

@@ -17,13 +17,17 @@ struct Phrase {
 
 class PhraseParser {
  public:
+  static constexpr int kUsualWorth = 30;
+
   // The file stays the caller's, and outlives the parser. Without looking ahead each phrase is the
   // longest that the table has; else it may be shorter, if the next one then reaches further.
   PhraseParser(std::span<const uint8_t> file, bool looksAhead)
       : file_(file), looksAhead_(looksAhead) {}
 
   // Empties the table and goes on at `position`. To be called before the first phrase.
-  void Restart(size_t position);
+  //   worth  of an entry, in tenths of a byte: what a shorter phrase has to gain in the beginning,
+  //          where it is as long as the one behind it
+  void Restart(size_t position, int worth = kUsualWorth);
 
   size_t Position() const { return position_; }
   // Phrases since the last Restart.
@@ -37,7 +41,7 @@ class PhraseParser {
   Phrase NextUpTo(size_t end);
 
  private:
-  size_t LeastGain() const;
+  size_t LeastGain(size_t longest, size_t following) const;
   Phrase LongestAt(size_t position, size_t needed = 0) const;
   void Lengthen(Phrase* phrase, size_t position, size_t needed) const;
   void Shorten(Phrase* phrase, Phrase* following) const;
@@ -48,6 +52,7 @@ class PhraseParser {
   CodeTable table_;
   size_t position_ = 0;
   uint32_t count_ = 0;
+  int worth_ = kUsualWorth;
   Phrase longest_;  // the longest that the table has at position_
 };
 

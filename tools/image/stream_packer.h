@@ -14,15 +14,17 @@ namespace image {
 
 // How a stream is made. Every choice gives a stream that any decoder of the format takes.
 struct PackMethod {
-  bool looksAhead;   // shorten a phrase where the next one then reaches further
-  bool plansResets;  // empty the table where that pays, not only when it is full
+  bool looksAhead;    // shorten a phrase where the next one then reaches further
+  bool usesLiterals;  // of the first width, for stretches that would grow; never more than 1.126
+                      // times the file then, and a few bytes
+  bool plansLives;    // empty the table where that pays, not only when it is full
 };
 
 // Always the longest string that the table has: what the format's plainest packer does.
-inline constexpr PackMethod kPackGreedily = {false, false};
-inline constexpr PackMethod kPackFast = {true, false};
-// The shortest, and about 20 times as slow.
-inline constexpr PackMethod kPackBest = {true, true};
+inline constexpr PackMethod kPackGreedily = {false, false, false};
+inline constexpr PackMethod kPackFast = {true, true, false};
+// The shortest, and about 10 times as slow.
+inline constexpr PackMethod kPackBest = {true, true, true};
 
 // The whole stream, its magic included; an empty file gives the magic and one zero byte, the
 // shortest stream that an expander takes.
