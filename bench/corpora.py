@@ -1,10 +1,12 @@
-"""The files that are packed, expanded and installed.
+"""The files that are packed, expanded and installed. All come from packages that the bench installs,
+so that a host with the same versions has the same bytes.
 
   libraries   40 of Wine's own libraries, stripped: the largest, one of a family (msvcp70, msvcp71
               and so on are nearly the same file), none above 3,000,000 bytes
-  text        C headers and documentation, in files of 1,000,000 bytes
+  text        sources, headers and documentation, in files of 1,000,000 bytes
 """
 
+import hashlib
 import os
 import random
 import shutil
@@ -13,6 +15,7 @@ import sys
 from dataclasses import dataclass
 from pathlib import Path
 
+from package_files import text_files_of, version_of
 from timed_runs import BenchError, output_of
 
 # All paths are relative to the root, so that a command can be told and repeated as it was run.
@@ -28,14 +31,27 @@ IMAGE_TOOL = BUILD / 'moriv-image'
 LARGEST_LIBRARY = 3_000_000
 TEXT_FILE = 1_000_000
 PEER_PACKERS = {'.Z': ('compress', '-b16', '-f', '-c'), '.gz': ('gzip', '-9', '-n', '-c')}
-HEADERS = Path('/usr/include')
-DOCUMENTS = Path('/usr/share/doc')
+
+# Package: endings. None of them gets new versions while a Debian release lasts.
+LIBRARY_PACKAGES = ('libwine', 'binutils-mingw-w64-x86-64')
+SOURCES = {'googletest': ('.cc', '.h'), 'libcli11-dev': ('.hpp',),
+           'libtomlplusplus-dev': ('.h', '.inl'), 'libstdc++-12-dev': ('.h', '.tcc')}
+DOCUMENTS = {'cmake-data': ('.rst',), 'python3-pytest': ('.py',)}
+
+# The corpora by which the goals were set, whole and of a quick run.
+KNOWN_SUMS = {
+    '062e65e1626316711ee36d83dbed47e3ee6db35728fdc5f00c4bf14e858d6fc2',  # libraries
+    '335882246968339ce72507e9b0f08c9bc82cc2bc52aa2f00cafce9f6b1c608f4',  # text
+    '78434a6122ca04c135d66812511a1217f8135b3bc35367e6b1d2efe1dd1a26f0',  # 8 libraries
+    '35bde00848de67bccfb5cbfe9faa6d00816b043d586efe3c7ced8820b5f6bf61',  # 4 files of text
+}
 
 
 @dataclass
 class Corpus:
     name: str
     words: str
+    packages: tuple  # names
     files: list
 
     @property
@@ -54,13 +70,28 @@ class Corpus:
     def size(self):
         return sum(file.stat().st_size for file in self.files)
 
+    @property
+    def versions(self):
+        return ', '.join(map(version_of, self.packages))
+
+    def content(self):
+        return b''.join(file.read_bytes() for file in self.files)
+
+    def sum(self):
+        """SHA-256 of all files, one behind the other."""
+        return hashlib.sha256(self.content()).hexdigest()
+
+    def is_known(self):
+        return self.sum() in KNOWN_SUMS
+
 
 def make_corpora(libraries, text):
     """Corpora of so many files, each with its image and its streams."""
     folder = BUILD / 'corpora'
-    corpora = [Corpus('libraries', "Wine's own libraries, stripped",
+    corpora = [Corpus('libraries', "Wine's own libraries, stripped", LIBRARY_PACKAGES,
                       make_libraries(folder / 'libraries', libraries)),
-               Corpus('text', 'C headers and documentation', make_text(folder / 'text', text))]
+               Corpus('text', 'sources, headers and documentation', (*SOURCES, *DOCUMENTS),
+                      make_text(folder / 'text', text))]
     for corpus in corpora:
         output_of(pack_command(corpus.files, corpus.image))
         write_streams(corpus)
@@ -86,10 +117,10 @@ def make_libraries(folder, count):
 
 
 def make_text(folder, count):
-    """Two thirds of it headers, one third documentation."""
+    """Two thirds of it sources and headers, one third documentation."""
     _make_anew(folder)
     documents = count // 3
-    text = [*_cut(HEADERS, '**/*.h', count - documents), *_cut(DOCUMENTS, '**/*', documents)]
+    text = [*_cut(SOURCES, count - documents), *_cut(DOCUMENTS, documents)]
     files = []
     for number, content in enumerate(text, 1):
         files.append(folder / f'text{number:02}.txt')
@@ -97,19 +128,15 @@ def make_text(folder, count):
     return files
 
 
-def _cut(source, pattern, count):
-    """The plain text files below a folder, in an order that is random but always the same."""
-    paths = sorted(path for path in source.glob(pattern)
-                   if path.is_file() and not path.is_symlink() and path.suffix != '.gz')
+def _cut(packages, count):
+    """The packages' texts, in an order that is random but always the same."""
+    paths = [path for package, endings in packages.items()
+             for path in text_files_of(package, endings)]
     random.Random(1).shuffle(paths)
-    text = bytearray()
-    for path in paths:
-        content = path.read_bytes()
-        if b'\0' not in content:
-            text += content
-        if len(text) >= count * TEXT_FILE:
-            return [bytes(text[i * TEXT_FILE:(i + 1) * TEXT_FILE]) for i in range(count)]
-    raise BenchError(f'{source} has less than {count * TEXT_FILE} bytes of text')
+    text = b''.join(path.read_bytes() for path in paths)
+    if len(text) < count * TEXT_FILE:
+        raise BenchError(f'less than {count * TEXT_FILE} bytes of text in {", ".join(packages)}')
+    return [text[i * TEXT_FILE:(i + 1) * TEXT_FILE] for i in range(count)]
 
 
 def make_random(size):
@@ -127,7 +154,7 @@ def make_slices(folder, content, count):
     size = len(content) // count
     files = []
     for number in range(count):
-        files.append(folder / f'part{number:04}.dat')
+        files.append(folder / f'part{number:05}.dat')
         files[-1].write_bytes(content[number * size:(number + 1) * size])
     return files
 

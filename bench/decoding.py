@@ -1,12 +1,11 @@
 """Expansion: speed against the peers', instructions, memory."""
 
 import re
-import statistics
 
 from corpora import BUILD
-from goals import Figure
+from goals import Figure, ratio_figure
 from results import Table
-from timed_runs import output_of, pinned, text_of
+from timed_runs import medians, output_of, pinned, text_of
 
 DECODERS = {'expander': 'the expander', 'plain': 'plain decoder',
             'libarchive': 'libarchive, `.Z`', 'zlib': 'zlib inflate, 64 KB buffers'}
@@ -22,8 +21,8 @@ def measure_decoding(corpora, rounds, results):
         command = [PROGRAM, corpus.folder, corpus.streams, rounds]
         seconds = _time_decoders(command, corpus, table)
         for peer in ('libarchive', 'zlib'):
-            results.figures[f'expand-{peer}-{corpus.name}'] = Figure(
-                seconds[peer] / seconds['expander'], table.title)
+            results.figures[f'expand-{peer}-{corpus.name}'] = ratio_figure(
+                seconds[peer], seconds['expander'], table.title, corpora=(corpus,))
     results.tables.append(table)
 
 
@@ -39,8 +38,8 @@ def measure_decoding_under_wine(corpora, rounds, wine, results):
         command = wine.command(wine.build / 'decode_bench.exe', corpus.folder, corpus.streams,
                                rounds)
         seconds = _time_decoders(command, corpus, table)
-        results.figures[keys[corpus.name]] = Figure(seconds['plain'] / seconds['expander'],
-                                                    table.title)
+        results.figures[keys[corpus.name]] = ratio_figure(seconds['plain'], seconds['expander'],
+                                                          table.title, corpora=(corpus,))
     results.tables.append(table)
 
 
@@ -61,7 +60,8 @@ def measure_instructions(corpus, results):
         table.commands.append(text_of(command))
         table.rows.append([DECODERS[decoder], f'{counts[decoder] / 1e6:.1f}',
                            f'{counts[decoder] / size:.1f}'])
-    results.figures['instructions'] = Figure(counts['expander'] / counts['plain'], table.title)
+    results.figures['instructions'] = Figure(counts['expander'] / counts['plain'], table.title,
+                                             corpora=(corpus,))
     results.tables.append(table)
 
 
@@ -75,16 +75,16 @@ def measure_expander_memory(results):
 
 
 def _time_decoders(command, corpus, table):
-    """Median seconds of each decoder; the table gets a row for each."""
+    """Seconds of each decoder's rounds; the table gets a row for each."""
     with pinned():
         lines = output_of(command).splitlines()
-    rounds = {}
+    seconds = {}
     for line in lines:
         name, figure = line.split()
-        rounds.setdefault(name, []).append(float(figure))
-    seconds = {name: statistics.median(group) for name, group in rounds.items()}
-    for name in seconds:
-        table.rows.append([DECODERS[name], corpus.name, f'{corpus.size / seconds[name] / 1e6:.0f}',
-                           f'{seconds[name] / seconds["expander"]:.2f}'])
+        seconds.setdefault(name, []).append(float(figure))
+    times = medians(seconds)
+    for name, time in times.items():
+        table.rows.append([DECODERS[name], corpus.name, f'{corpus.size / time / 1e6:.0f}',
+                           f'{time / times["expander"]:.2f}'])
     table.commands.append(text_of(command))
     return seconds

@@ -2,18 +2,20 @@
 against the program with its polls put back."""
 
 import filecmp
+import statistics
 
-from corpora import BUILD, make_slices, pack_command
-from goals import Figure
+from corpora import BUILD, make_slices, megabyte_of, pack_command
+from goals import Figure, ratio_figure
 from results import Table
-from timed_runs import (BenchError, Run, discard_output, median_seconds, output_of, peak_memory,
-                        pinned, run_in_turn)
+from timed_runs import (BenchError, Run, discard_output, medians, output_of, pinned,
+                        run_with_peak, time_in_turn)
 
 WORK = BUILD / 'runs'
 INSTALLED = 'Program Files/Moriv'
 NSIS_SCRIPT = 'bench/nsis_peer.nsi'
-OWN, EMPTY = 'silent install', 'empty program'
+OWN, EMPTY, NSIS = 'silent install', 'empty program', 'NSIS zlib'
 SMALL_PACKAGE = 241_664  # bytes in three files
+BYTES_OF_COUNTS = 4_000_000  # in packages that differ in the number of their files
 
 
 def native_install(image, name):
@@ -34,13 +36,14 @@ def measure_native_install(corpus, rounds, results):
     runs = {OWN: native_install(corpus.image, 'machine'),
             peer: Run(['bsdtar', '-xf', archive, '-C', extracted], folder=extracted)}
     with pinned():
-        seconds = median_seconds(run_in_turn(runs, rounds))
+        seconds = time_in_turn(runs, rounds)
     require_installed(corpus.files, WORK / 'machine/drive_c' / INSTALLED)
     require_installed(corpus.files, extracted)
-    table = _install_table('Install, natively', f'{len(corpus.files)} libraries, {corpus.size:,} '
-                           f'bytes, on one CPU, in turn. Medians of {rounds} rounds.',
-                           runs, seconds)
-    results.figures['install-native'] = Figure(seconds[OWN] / seconds[peer], table.title)
+    table = install_table('Install, natively', f'{len(corpus.files)} libraries, {corpus.size:,} '
+                          f'bytes, on one CPU, in turn. Medians of {rounds} rounds.',
+                          runs, seconds)
+    results.figures['install-native'] = ratio_figure(seconds[OWN], seconds[peer], table.title,
+                                                     corpora=(corpus,))
     results.tables.append(table)
 
 
@@ -49,52 +52,52 @@ def measure_wine_install(corpus, rounds, wine, results):
         results.figures['install-wine'] = Figure(why_not=wine.why_not, words={'peer': 'a peer'})
         results.figures['wine-memory'] = Figure(why_not=wine.why_not)
         return
-    polling, peer = 'the same with its polls put back', 'NSIS zlib'
-    runs = {OWN: _wine_install(corpus.files, wine, 'MorivSetup.exe'),
-            polling: _wine_install(corpus.files, wine, 'polling_setup.exe'),
+    polling, peer = 'the same with its polls put back', NSIS
+    runs = {OWN: wine_install(corpus.files, wine, 'MorivSetup.exe'),
+            polling: wine_install(corpus.files, wine, 'polling_setup.exe'),
             EMPTY: Run(wine.command(wine.build / 'empty_program.exe'), success=1)}
     if wine.bits == 32:
-        runs[peer] = _nsis_install(corpus.files, wine)
+        runs[peer] = nsis_install(corpus.files, wine)
     else:
         peer = polling
     with pinned():
-        seconds = median_seconds(run_in_turn(runs, rounds))
+        seconds = time_in_turn(runs, rounds)
         peaks = {}
         for name, run in runs.items():
-            peaks[name] = peak_memory(run)
+            _, peaks[name] = run_with_peak(run)
             if run.makes:
                 require_installed(corpus.files, run.makes)
-    table = _install_table(f'Install of the {wine.bits}-bit Windows program under Wine',
-                           'The same libraries; program and Wine server on one CPU. Medians of '
-                           f'{rounds} rounds.', runs, seconds)
+    table = install_table(f'Install of the {wine.bits}-bit Windows program under Wine',
+                          'The same libraries; program and Wine server on one CPU. Medians of '
+                          f'{rounds} rounds.', runs, seconds)
     table.heads.append('Peak memory, MB')
     for row, peak in zip(table.rows, peaks.values()):
         row.append(f'{peak / 1e6:.1f}')
-    results.figures['install-wine'] = Figure(seconds[OWN] / seconds[peer], table.title,
-                                             words={'peer': peer})
+    results.figures['install-wine'] = ratio_figure(seconds[OWN], seconds[peer], table.title,
+                                                   words={'peer': peer}, corpora=(corpus,))
     results.figures['wine-memory'] = Figure((peaks[OWN] - peaks[EMPTY]) / 1e6, table.title)
     results.tables.append(table)
 
 
 def measure_small_wine_install(corpus, rounds, wine, results):
-    why_not = wine.why_not or ('' if wine.bits == 32 else 'no 32-bit Wine here')
-    if why_not:
-        results.figures['install-wine-small'] = Figure(why_not=why_not)
+    if wine.why_no_peer:
+        results.figures['install-wine-small'] = Figure(why_not=wine.why_no_peer)
         return
     files = make_slices(WORK / 'small', corpus.files[0].read_bytes()[:SMALL_PACKAGE], 3)
-    peer = 'NSIS zlib'
-    runs = {OWN: _wine_install(files, wine, 'MorivSetup.exe'), peer: _nsis_install(files, wine)}
+    runs = {OWN: wine_install(files, wine, 'MorivSetup.exe'), NSIS: nsis_install(files, wine)}
     with pinned():
-        seconds = median_seconds(run_in_turn(runs, rounds))
-    table = _install_table('Install of three small files under Wine', f'{SMALL_PACKAGE:,} bytes. '
-                           f'Medians of {rounds} rounds.', runs, seconds)
-    results.figures['install-wine-small'] = Figure(seconds[OWN] / seconds[peer], table.title)
+        seconds = time_in_turn(runs, rounds)
+    table = install_table('Install of three small files under Wine', f'{SMALL_PACKAGE:,} bytes. '
+                          f'Medians of {rounds} rounds.', runs, seconds)
+    results.figures['install-wine-small'] = ratio_figure(seconds[OWN], seconds[NSIS], table.title,
+                                                         corpora=(corpus,))
     results.tables.append(table)
 
 
-def measure_file_counts(content, counts, rounds, results):
+def measure_file_counts(corpus, counts, rounds, results):
     """Packages of the same bytes in ever more files, against a copy of the same files. Returns the
     lines of a plot, in milliseconds."""
+    content = corpus.content()[:BYTES_OF_COUNTS]
     runs = {}
     for count in counts:
         files = make_slices(WORK / f'files{count}', content, count)
@@ -103,25 +106,27 @@ def measure_file_counts(content, counts, rounds, results):
         runs['install', count] = native_install(image, f'machine-files{count}')
         runs['cp', count] = Run(['cp', '-r', files[0].parent, copy], makes=copy)
     seconds = _time_and_discard(runs, rounds)
+    times = medians(seconds)
     most = counts[-1]
     table = Table('More files of the same total', f'{len(content):,} bytes of text, natively. '
                   f'Medians of {rounds} rounds.',
                   ['Files', 'Install, ms', '`cp -r`, ms', 'Install / `cp -r`'],
-                  [[str(count), f'{seconds["install", count] * 1e3:.1f}',
-                    f'{seconds["cp", count] * 1e3:.1f}',
-                    f'{seconds["install", count] / seconds["cp", count]:.2f}'] for count in counts],
+                  [[str(count), f'{times["install", count] * 1e3:.1f}',
+                    f'{times["cp", count] * 1e3:.1f}',
+                    f'{times["install", count] / times["cp", count]:.2f}'] for count in counts],
                   [runs[program, most].text() for program in ('install', 'cp')],
                   plot='performance-files.svg')
-    results.figures['time-per-file'] = Figure(seconds['install', most] / seconds['cp', most],
-                                              table.title)
+    results.figures['time-per-file'] = ratio_figure(seconds['install', most], seconds['cp', most],
+                                                    table.title, corpora=(corpus,))
     results.tables.append(table)
-    return {program: [(count, seconds[program, count] * 1e3) for count in counts]
+    return {program: [(count, times[program, count] * 1e3) for count in counts]
             for program in ('install', 'cp')}
 
 
-def measure_sizes(sample, sizes, rounds, results):
+def measure_sizes(corpus, sizes, rounds, results):
     """Packages of one file, the same MB over and over. What an install of one byte takes is taken
     off, since it would hide growth. Returns the lines of a plot, in milliseconds a MB."""
+    sample = megabyte_of(corpus)
     runs = {}
     for size in (0, *sizes):
         file = WORK / f'size{size}' / 'payload.dat'
@@ -132,43 +137,47 @@ def measure_sizes(sample, sizes, rounds, results):
         file.unlink()
         runs[size] = native_install(image, f'machine-size{size}')
     seconds = _time_and_discard(runs, rounds)
-    per_megabyte = {size: (seconds[size] - seconds[0]) / size * 1e3 for size in sizes}
+    least = statistics.median(seconds[0])
+    per_megabyte = {size: [(time - least) / size * 1e3 for time in seconds[size]]
+                    for size in sizes}
+    line = medians(per_megabyte)
     table = Table('Larger packages', f'One file, natively. An install of one byte takes '
-                  f'{seconds[0] * 1e3:.1f} ms, which is taken off in the last column. Medians of '
+                  f'{least * 1e3:.1f} ms, which is taken off in the last column. Medians of '
                   f'{rounds} rounds.', ['MB', 'Install, s', 'ms a MB'],
-                  [[str(size), f'{seconds[size]:.3f}', f'{per_megabyte[size]:.2f}']
+                  [[str(size), f'{statistics.median(seconds[size]):.3f}', f'{line[size]:.2f}']
                    for size in sizes],
                   [runs[sizes[-1]].text()], plot='performance-growth.svg')
-    results.figures['growth'] = Figure(per_megabyte[sizes[-1]] / per_megabyte[4], table.title,
-                                       words={'large': sizes[-1]})
+    results.figures['growth'] = ratio_figure(per_megabyte[sizes[-1]], per_megabyte[4], table.title,
+                                             words={'large': sizes[-1]}, corpora=(corpus,))
     results.tables.append(table)
-    return {'install': list(per_megabyte.items())}
+    return {'install': list(line.items())}
 
 
 def _time_and_discard(runs, rounds):
     with pinned():
-        seconds = median_seconds(run_in_turn(runs, rounds))
+        seconds = time_in_turn(runs, rounds)
     for run in runs.values():
         discard_output(run)
     return seconds
 
 
-def _wine_install(files, wine, program):
+def wine_install(files, wine, program):
     """The first run registers the directory, so all use the same."""
     image = WORK / program
     output_of(pack_command(files, image, stub=wine.build / program))
     return Run(wine.command(image, '/s', r'/d:C:\Moriv'), makes=wine.drive() / 'Moriv', success=1)
 
 
-def _nsis_install(files, wine):
+def nsis_install(files, wine):
     installer = WORK / 'nsis_peer.exe'
     output_of(['makensis', '-V1', '-NOCD', f'-DOUTPUT={installer}', f'-DFOLDER={files[0].parent}',
                NSIS_SCRIPT])
     return Run(wine.command(installer, '/S'), makes=wine.drive() / 'Peer')
 
 
-def _install_table(title, text, runs, seconds):
+def install_table(title, text, runs, seconds):
+    times = medians(seconds)
     return Table(title, text, ['Program', 'Seconds', 'Silent install / it'],
-                 [[name, f'{time:.3f}', f'{seconds[OWN] / time:.2f}']
-                  for name, time in seconds.items()],
+                 [[name, f'{time:.3f}', f'{times[OWN] / time:.2f}']
+                  for name, time in times.items()],
                  [run.text() for run in runs.values()])

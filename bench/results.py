@@ -10,11 +10,10 @@ class Table:
     heads: list
     rows: list       # of texts
     commands: list   # that gave the figures, as texts
-    plot: str = ''   # file name of a picture under it
+    plots: dict = field(default_factory=dict)  # under it: SVG text by file name
 
 
 @dataclass
 class Results:
     figures: dict = field(default_factory=dict)  # Figure by Goal.key
     tables: list = field(default_factory=list)
-    plots: dict = field(default_factory=dict)    # SVG text by file name

@@ -24,7 +24,8 @@ class Run:
     makes: Optional[Path] = None   # a folder, taken away before each run
     folder: Optional[Path] = None  # a folder, made anew before each run
     environment: dict = field(default_factory=dict)
-    success: int = 0              # exit status
+    success: int = 0               # exit status
+    tells_seconds: bool = False    # what it prints is the time that counts
 
     def text(self):
         settings = [f'{name}={shlex.quote(str(value))}' for name, value in self.environment.items()]
@@ -60,14 +61,17 @@ def run_once(run):
         run.folder.mkdir(parents=True)
     start = time.perf_counter()
     process = subprocess.Popen([str(word) for word in run.command], stdin=subprocess.DEVNULL,
-                               stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL,
+                               stdout=subprocess.PIPE if run.tells_seconds else subprocess.DEVNULL,
+                               stderr=subprocess.DEVNULL,
                                env=os.environ | {k: str(v) for k, v in run.environment.items()})
+    told = process.stdout.read() if run.tells_seconds else b''
     _, status, usage = os.wait4(process.pid, 0)
     seconds = time.perf_counter() - start
     process.returncode = os.waitstatus_to_exitcode(status)
     if process.returncode != run.success:
         raise BenchError(f'exit status {process.returncode}: {run.text()}')
-    return Sample(seconds, usage.ru_utime + usage.ru_stime)
+    return Sample(float(told) if run.tells_seconds else seconds,
+                  usage.ru_utime + usage.ru_stime)
 
 
 def run_in_turn(runs, rounds):
@@ -81,17 +85,23 @@ def run_in_turn(runs, rounds):
     return samples
 
 
-def median_seconds(samples):
-    return {name: statistics.median(sample.seconds for sample in group)
-            for name, group in samples.items()}
+def time_in_turn(runs, rounds):
+    """Seconds of each round, by name."""
+    return {name: [sample.seconds for sample in group]
+            for name, group in run_in_turn(runs, rounds).items()}
 
 
-def peak_memory(run):
-    """Bytes. Asked of time(1): a child of this program would be charged with its memory too."""
+def medians(groups):
+    return {name: statistics.median(group) for name, group in groups.items()}
+
+
+def run_with_peak(run):
+    """The sample and the peak memory in bytes. That is asked of time(1): a child of this program would
+    be charged with its memory too."""
     with NamedTemporaryFile('r') as answer:
-        run_once(replace(run, command=['/usr/bin/time', '-q', '-f', '%M', '-o', answer.name,
-                                       *run.command]))
-        return int(answer.read()) * 1024
+        sample = run_once(replace(run, command=['/usr/bin/time', '-q', '-f', '%M', '-o',
+                                                answer.name, *run.command]))
+        return sample, int(answer.read()) * 1024
 
 
 def text_of(command):
