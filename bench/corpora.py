@@ -1,5 +1,5 @@
-"""The files that are packed, expanded and installed. All come from packages that the bench installs,
-so that a host with the same versions has the same bytes.
+"""The files that are packed, expanded and installed. All come from packages that the bench
+installs, so that a host with the same versions has the same bytes.
 
   libraries   40 of Wine's own libraries, stripped: the largest, one of a family (msvcp70, msvcp71
               and so on are nearly the same file), none above 3,000,000 bytes
@@ -148,14 +148,14 @@ def make_random(size):
     return [file]
 
 
-def make_slices(folder, content, count):
-    """The content cut into files of one size."""
+def make_slices(folder, content, count, head=b''):
+    """The content cut into files of one size, each with the head before it."""
     _make_anew(folder)
     size = len(content) // count
     files = []
     for number in range(count):
         files.append(folder / f'part{number:05}.dat')
-        files[-1].write_bytes(content[number * size:(number + 1) * size])
+        files[-1].write_bytes(head + content[number * size:(number + 1) * size])
     return files
 
 

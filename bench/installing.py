@@ -2,20 +2,18 @@
 against the program with its polls put back."""
 
 import filecmp
-import statistics
 
-from corpora import BUILD, make_slices, megabyte_of, pack_command
+from corpora import BUILD, make_slices, pack_command
 from goals import Figure, ratio_figure
 from results import Table
-from timed_runs import (BenchError, Run, discard_output, medians, output_of, pinned,
-                        run_with_peak, time_in_turn)
+from timed_runs import (BenchError, Run, medians, output_of, pinned, run_with_peak,
+                        time_in_turn)
 
 WORK = BUILD / 'runs'
 INSTALLED = 'Program Files/Moriv'
 NSIS_SCRIPT = 'bench/nsis_peer.nsi'
 OWN, EMPTY, NSIS = 'silent install', 'empty program', 'NSIS zlib'
 SMALL_PACKAGE = 241_664  # bytes in three files
-BYTES_OF_COUNTS = 4_000_000  # in packages that differ in the number of their files
 
 
 def native_install(image, name):
@@ -92,73 +90,6 @@ def measure_small_wine_install(corpus, rounds, wine, results):
     results.figures['install-wine-small'] = ratio_figure(seconds[OWN], seconds[NSIS], table.title,
                                                          corpora=(corpus,))
     results.tables.append(table)
-
-
-def measure_file_counts(corpus, counts, rounds, results):
-    """Packages of the same bytes in ever more files, against a copy of the same files. Returns the
-    lines of a plot, in milliseconds."""
-    content = corpus.content()[:BYTES_OF_COUNTS]
-    runs = {}
-    for count in counts:
-        files = make_slices(WORK / f'files{count}', content, count)
-        image, copy = WORK / f'files{count}.image', WORK / f'copy{count}'
-        output_of(pack_command(files, image))
-        runs['install', count] = native_install(image, f'machine-files{count}')
-        runs['cp', count] = Run(['cp', '-r', files[0].parent, copy], makes=copy)
-    seconds = _time_and_discard(runs, rounds)
-    times = medians(seconds)
-    most = counts[-1]
-    table = Table('More files of the same total', f'{len(content):,} bytes of text, natively. '
-                  f'Medians of {rounds} rounds.',
-                  ['Files', 'Install, ms', '`cp -r`, ms', 'Install / `cp -r`'],
-                  [[str(count), f'{times["install", count] * 1e3:.1f}',
-                    f'{times["cp", count] * 1e3:.1f}',
-                    f'{times["install", count] / times["cp", count]:.2f}'] for count in counts],
-                  [runs[program, most].text() for program in ('install', 'cp')],
-                  plot='performance-files.svg')
-    results.figures['time-per-file'] = ratio_figure(seconds['install', most], seconds['cp', most],
-                                                    table.title, corpora=(corpus,))
-    results.tables.append(table)
-    return {program: [(count, times[program, count] * 1e3) for count in counts]
-            for program in ('install', 'cp')}
-
-
-def measure_sizes(corpus, sizes, rounds, results):
-    """Packages of one file, the same MB over and over. What an install of one byte takes is taken
-    off, since it would hide growth. Returns the lines of a plot, in milliseconds a MB."""
-    sample = megabyte_of(corpus)
-    runs = {}
-    for size in (0, *sizes):
-        file = WORK / f'size{size}' / 'payload.dat'
-        file.parent.mkdir()
-        file.write_bytes(sample * size or sample[:1])
-        image = WORK / f'size{size}.image'
-        output_of(pack_command([file], image))
-        file.unlink()
-        runs[size] = native_install(image, f'machine-size{size}')
-    seconds = _time_and_discard(runs, rounds)
-    least = statistics.median(seconds[0])
-    per_megabyte = {size: [(time - least) / size * 1e3 for time in seconds[size]]
-                    for size in sizes}
-    line = medians(per_megabyte)
-    table = Table('Larger packages', f'One file, natively. An install of one byte takes '
-                  f'{least * 1e3:.1f} ms, which is taken off in the last column. Medians of '
-                  f'{rounds} rounds.', ['MB', 'Install, s', 'ms a MB'],
-                  [[str(size), f'{statistics.median(seconds[size]):.3f}', f'{line[size]:.2f}']
-                   for size in sizes],
-                  [runs[sizes[-1]].text()], plot='performance-growth.svg')
-    results.figures['growth'] = ratio_figure(per_megabyte[sizes[-1]], per_megabyte[4], table.title,
-                                             words={'large': sizes[-1]}, corpora=(corpus,))
-    results.tables.append(table)
-    return {'install': list(line.items())}
-
-
-def _time_and_discard(runs, rounds):
-    with pinned():
-        seconds = time_in_turn(runs, rounds)
-    for run in runs.values():
-        discard_output(run)
-    return seconds
 
 
 def wine_install(files, wine, program):

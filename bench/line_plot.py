@@ -9,8 +9,8 @@ COLOURS = ('#1f6fb4', '#c4541c', '#2e8b45', '#7d4fa3')
 
 
 def line_plot(title, x_title, y_title, lines, by_decades=False):
-    """lines: [(x, y), ...] by name; every x above 0. The y axis begins at 0, or it is logarithmic too:
-    then what grows in proportion is a straight line."""
+    """lines: [(x, y), ...] by name; every x above 0. The y axis begins at 0, or it is logarithmic
+    too: then what grows in proportion is a straight line."""
     xs = sorted({x for points in lines.values() for x, _ in points})
     ys = [y for points in lines.values() for _, y in points]
     ticks = _decades(ys) if by_decades else _even_ticks(max(ys))

@@ -14,7 +14,7 @@ def version_of(package):
 
 
 def text_files_of(package, endings):
-    """The package's plain text files with these endings, by name; none where it is not installed."""
+    """The package's plain text files with these endings, by name; none where it isn't installed."""
     if version_of(package).endswith(')'):
         return []
     lines = output_of(['dpkg-query', '-L', package]).splitlines()

@@ -3,8 +3,8 @@
 //
 //   page_watch PROGRAM
 //
-// Exit status 1 without a page in half a minute, and for an update page: then a check for older
-// files has ended at the first one.
+// Exit status 1 without a page in half a minute, and for a page that offers the update first: then
+// the check for older files has ended at one.
 #include <windows.h>
 // After windows.h.
 #include <cstdio>
@@ -62,7 +62,8 @@ int main(int argc, char** argv) {
   }
   const HWND dialog = WaitForPage(program, start);
   const double seconds = Now() - start;
-  const bool isGood = dialog != nullptr && !IsShown(dialog, IDC_UPDATE);
+  const bool isGood =
+      dialog != nullptr && LOWORD(SendMessageA(dialog, DM_GETDEFID, 0, 0)) != IDC_UPDATE;
   TerminateProcess(program.hProcess, 0);
   WaitForSingleObject(program.hProcess, INFINITE);
   if (isGood) std::printf("%.6f\n", seconds);

@@ -11,16 +11,24 @@ from goals import GOALS, verdict
 COMPILERS = ('g++', 'i686-w64-mingw32-g++-win32', 'x86_64-w64-mingw32-g++-win32')
 PEERS = ('libarchive13', 'libarchive-tools', 'zlib1g', 'ncompress', 'gzip', 'nsis', 'valgrind',
          'wine')
-HEADS = ['What', 'Measured', 'Floor', 'Goal', '']
+HEADS = ['What', 'Measured', 'Half of the rounds', 'Floor', 'Goal', '']
 
 INTRODUCTION = """# Performance
 
 Made by `make bench`; edits would be lost. Every figure is measured on the host below, in one run with what
 it is compared with, as the ratio of two medians. Ratios can be compared between hosts, times can't. A figure
 that misses its floor fails `make bench`; one that misses only its goal is marked.
+
+Of a timed figure the page also tells between what the middle half of the rounds lies, each taken by itself:
+so far do two runs differ. A goal between the two is neither reached nor missed, but within the noise.
 """
 QUICK_NOTE = """
 This was a quick run: fewer rounds, smaller corpora.
+"""
+CORPORA_NOTE = """
+
+A sum is the SHA-256 of all files of a corpus, one behind the other in the order of their names: the same
+packages give the same files. MB are 1,000,000 bytes.
 """
 AGAIN = """## Again
 
@@ -28,8 +36,9 @@ AGAIN = """## Again
     make bench BENCH=quick     # a first look; its page and plots go to build/bench
 
 The peers come from Debian, by `tools/bootstrap bench`. All timed runs share one CPU, each after a round
-that warms the caches. Leave the machine alone meanwhile. The commands under the tables can be given again,
-from the root, as long as `build/` stands.
+that warms the caches; those under Wine have a display of their own (`xvfb-run -a` before the command). Leave
+the machine alone meanwhile. The commands under the tables can be given again, from the root, as long as
+`build/` stands.
 """
 
 
@@ -42,8 +51,8 @@ def summary_rows(results, linked=False):
         if linked and figure.section:
             what = f'[{what}](#{_anchor(figure.section)})'
         measured = figure.why_not if figure.value is None else _number(figure.value, goal.unit)
-        floor = '' if goal.floor is None else _limit(goal.floor, goal)
-        rows.append([what, measured, floor, _limit(goal.goal, goal), verdict(goal, figure)])
+        rows.append([what, measured, _spread(figure.spread), _limit(goal.floor, goal),
+                     _limit(goal.goal, goal), verdict(goal, figure)])
     return rows
 
 
@@ -57,17 +66,19 @@ def document(results, corpora, quick):
     parts = [INTRODUCTION + (QUICK_NOTE if quick else ''),
              _markdown_table(HEADS, summary_rows(results, linked=True)),
              '## Host\n\n' + _markdown_table(['', ''], _host()),
-             '## Corpora\n\n' + '\n'.join(
-                 f'- **{corpus.name}**: {corpus.words}, {len(corpus.files)} files, '
-                 f'{corpus.size:,} bytes.' for corpus in corpora)
-             + '\n\nMB are 1,000,000 bytes.\n']
+             '## Corpora\n\n' + '\n'.join(map(_corpus_line, corpora)) + CORPORA_NOTE]
     for table in results.tables:
         parts.append(f'## {table.title}\n\n{table.text}\n\n'
                      + _markdown_table(table.heads, table.rows) + '\n'
                      + ''.join(f'    {command}\n' for command in table.commands))
-        if table.plot:
-            parts.append(f'![{table.title}]({table.plot})\n')
+        parts += [f'![{table.title}]({plot})\n' for plot in table.plots]
     return '\n'.join([*parts, AGAIN])
+
+
+def _corpus_line(corpus):
+    note = '' if corpus.is_known() else ' **Not the files by which the goals were set.**'
+    return (f'- **{corpus.name}**: {corpus.words}, {len(corpus.files)} files, {corpus.size:,} '
+            f'bytes, of {corpus.versions}. Sum `{corpus.sum()}`.{note}')
 
 
 def _markdown_table(heads, rows):
@@ -85,7 +96,13 @@ def _number(value, unit):
     return f'{value:.3f}' if unit == '' else f'{value:.2f} {unit}'
 
 
+def _spread(spread):
+    return f'{spread[0]:.3g} to {spread[1]:.3g}' if spread else ''
+
+
 def _limit(limit, goal):
+    if limit is None:
+        return ''
     number = f'{limit:,}' if goal.unit == 'bytes' else f'{limit:g}'
     return ('at least ' if goal.more_is_better else 'at most ') + number
 

@@ -1,6 +1,6 @@
 """What a start costs under Wine: the dialog's until its page stands, and a removal program's."""
 
-from corpora import make_slices, pack_command
+from corpora import IMAGE_TOOL, make_slices, pack_command
 from goals import Figure, ratio_figure
 from installing import EMPTY, SMALL_PACKAGE, WORK
 from results import Table
@@ -11,17 +11,18 @@ KEYS = {'dialog-start': (DIALOG, EMPTY_DIALOG), 'removal-start': (REMOVAL_PROGRA
 
 
 def measure_starts(corpus, rounds, wine, results):
-    """After measure_many_files: of its last removal the removal program is left, and no product."""
+    """On a machine without the product."""
     if wine.why_not:
         results.figures |= {key: Figure(why_not=wine.why_not) for key in KEYS}
         return
-    image = WORK / 'three.exe'
+    image, removal = WORK / 'three.exe', WORK / 'MorivRmv.exe'
     files = make_slices(WORK / 'three', corpus.content()[:SMALL_PACKAGE], 3)
     output_of(pack_command(files, image, stub=wine.build / 'MorivSetup.exe'))
+    output_of([IMAGE_TOOL, 'removal', image, '-o', removal])
     runs = {DIALOG: wine.until_page(image),
             EMPTY_DIALOG: wine.until_page(wine.build / 'empty_dialog.exe'),
             # A help that is silent: it does nothing.
-            REMOVAL_PROGRAM: Run(wine.command(r'C:\windows\MorivRmv.exe', '/h', '/s')),
+            REMOVAL_PROGRAM: Run(wine.command(removal, '/h', '/s')),
             EMPTY: Run(wine.command(wine.build / 'empty_program.exe'), success=1)}
     with pinned():
         seconds = time_in_turn(runs, rounds)

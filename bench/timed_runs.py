@@ -24,8 +24,8 @@ class Run:
     makes: Optional[Path] = None   # a folder, taken away before each run
     folder: Optional[Path] = None  # a folder, made anew before each run
     environment: dict = field(default_factory=dict)
-    success: int = 0               # exit status
-    tells_seconds: bool = False    # what it prints is the time that counts
+    success: int = 0              # exit status
+    tells_seconds: bool = False   # what it prints is the time that counts
 
     def text(self):
         settings = [f'{name}={shlex.quote(str(value))}' for name, value in self.environment.items()]
@@ -96,8 +96,8 @@ def medians(groups):
 
 
 def run_with_peak(run):
-    """The sample and the peak memory in bytes. That is asked of time(1): a child of this program would
-    be charged with its memory too."""
+    """The sample and the peak memory in bytes. That is asked of time(1): a child of this program
+    would be charged with its memory too."""
     with NamedTemporaryFile('r') as answer:
         sample = run_once(replace(run, command=['/usr/bin/time', '-q', '-f', '%M', '-o',
                                                 answer.name, *run.command]))

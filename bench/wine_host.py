@@ -14,8 +14,8 @@ TOOL = Path('tools/wine')
 
 
 class WineHost:
-    """The Wine that the figures are taken with, with a display of its own; `why_not` says why there is
-    none."""
+    """The Wine that the figures are taken with, on a display of its own; `why_not` says why there
+    is none."""
 
     def __init__(self):
         self.world, self.bits, self.why_not = '', 0, ''
