@@ -5,7 +5,7 @@ import re
 from corpora import BUILD
 from goals import Figure, ratio_figure
 from results import Table
-from timed_runs import medians, output_of, pinned, text_of
+from timed_runs import median_ratio, medians, output_of, pinned, text_of
 
 DECODERS = {'expander': 'the expander', 'plain': 'plain decoder',
             'libarchive': 'libarchive, `.Z`', 'zlib': 'zlib inflate, 64 KB buffers'}
@@ -82,9 +82,8 @@ def _time_decoders(command, corpus, table):
     for line in lines:
         name, figure = line.split()
         seconds.setdefault(name, []).append(float(figure))
-    times = medians(seconds)
-    for name, time in times.items():
+    for name, time in medians(seconds).items():
         table.rows.append([DECODERS[name], corpus.name, f'{corpus.size / time / 1e6:.0f}',
-                           f'{time / times["expander"]:.2f}'])
+                           f'{median_ratio(seconds[name], seconds["expander"]):.2f}'])
     table.commands.append(text_of(command))
     return seconds

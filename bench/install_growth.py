@@ -7,7 +7,8 @@ from goals import ratio_figure
 from installing import WORK, native_install
 from line_plot import line_plot
 from results import Table
-from timed_runs import Run, discard_output, medians, output_of, pinned, time_in_turn
+from timed_runs import (Run, discard_output, median_ratio, medians, output_of, pinned,
+                        time_in_turn)
 
 BYTES_OF_COUNTS = 4_000_000  # in packages that differ in the number of their files
 
@@ -32,7 +33,8 @@ def measure_file_counts(corpus, counts, rounds, results):
                   ['Files', 'Install, ms', '`cp -r`, ms', 'Install / `cp -r`'],
                   [[str(count), f'{times["install", count] * 1e3:.1f}',
                     f'{times["cp", count] * 1e3:.1f}',
-                    f'{times["install", count] / times["cp", count]:.2f}'] for count in counts],
+                    f'{median_ratio(seconds["install", count], seconds["cp", count]):.2f}']
+                   for count in counts],
                   [runs[program, most].text() for program in ('install', 'cp')],
                   {'performance-files.svg': line_plot('4 MB in ever more files', 'files', 'ms',
                                                       lines)})

@@ -6,8 +6,8 @@ import filecmp
 from corpora import BUILD, make_slices, pack_command
 from goals import Figure, ratio_figure
 from results import Table
-from timed_runs import (BenchError, Run, medians, output_of, pinned, run_with_peak,
-                        time_in_turn)
+from timed_runs import (BenchError, Run, median_ratio, medians, output_of, pinned,
+                        run_with_peak, time_in_turn)
 
 WORK = BUILD / 'runs'
 INSTALLED = 'Program Files/Moriv'
@@ -107,8 +107,7 @@ def nsis_install(files, wine):
 
 
 def install_table(title, text, runs, seconds):
-    times = medians(seconds)
     return Table(title, text, ['Program', 'Seconds', 'Silent install / it'],
-                 [[name, f'{time:.3f}', f'{times[OWN] / time:.2f}']
-                  for name, time in times.items()],
+                 [[name, f'{time:.3f}', f'{median_ratio(seconds[OWN], seconds[name]):.2f}']
+                  for name, time in medians(seconds).items()],
                  [run.text() for run in runs.values()])

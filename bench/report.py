@@ -16,11 +16,11 @@ HEADS = ['What', 'Measured', 'Half of the rounds', 'Floor', 'Goal', '']
 INTRODUCTION = """# Performance
 
 Made by `make bench`; edits would be lost. Every figure is measured on the host below, in one run with what
-it is compared with, as the ratio of two medians. Ratios can be compared between hosts, times can't. A figure
-that misses its floor fails `make bench`; one that misses only its goal is marked.
+it is compared with, as the median of the rounds' ratios. Ratios can be compared between hosts, times can't.
+A figure that misses its floor fails `make bench`; one that misses only its goal is marked.
 
-Of a timed figure the page also tells between what the middle half of the rounds lies, each taken by itself:
-so far do two runs differ. A goal between the two is neither reached nor missed, but within the noise.
+Of a timed figure the page also tells between what the middle half of the rounds lies: about so far do two
+runs differ. A goal between the two is neither reached nor missed, but within the noise.
 """
 QUICK_NOTE = """
 This was a quick run: fewer rounds, smaller corpora.

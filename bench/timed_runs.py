@@ -95,6 +95,15 @@ def medians(groups):
     return {name: statistics.median(group) for name, group in groups.items()}
 
 
+def ratios(over, under):
+    """Round by round: what slows the host slows both."""
+    return [one / other for one, other in zip(over, under)]
+
+
+def median_ratio(over, under):
+    return statistics.median(ratios(over, under))
+
+
 def run_with_peak(run):
     """The sample and the peak memory in bytes. That is asked of time(1): a child of this program
     would be charged with its memory too."""
