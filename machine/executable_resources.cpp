@@ -9,12 +9,6 @@
 #include "machine/resource_file.h"
 #include "machine/version_block.h"
 
-// The .res bytes that the native program embeds. Weak: a program without resources links too.
-extern "C" {
-extern const uint8_t moriv_resources_begin[] __attribute__((weak));
-extern const uint8_t moriv_resources_end[] __attribute__((weak));
-}
-
 namespace machine {
 namespace {
 
@@ -186,16 +180,6 @@ std::optional<std::vector<uint8_t>> QueryVersion(const std::vector<uint8_t>& res
   if (!value->isText) return Copy(Bytes(resource).subspan(value->offset, value->size));
   const std::string text = VersionText(resource, *value);
   return std::vector<uint8_t>(text.begin(), text.end());
-}
-
-std::optional<std::vector<uint8_t>> OwnResource(int type, int id) {
-  const uint8_t* begin = moriv_resources_begin;
-  const uint8_t* end = moriv_resources_end;
-  if (begin == nullptr || end == nullptr) return std::nullopt;
-  const std::optional<Bytes> data =
-      FindInResourceFile(Bytes(begin, static_cast<size_t>(end - begin)), type, id);
-  if (!data) return std::nullopt;
-  return Copy(*data);
 }
 
 }  // namespace machine

@@ -26,8 +26,4 @@ std::optional<std::vector<uint8_t>> FindVersionResource(std::span<const uint8_t>
 std::optional<std::vector<uint8_t>> QueryVersion(const std::vector<uint8_t>& resource,
                                                  const std::string& path);
 
-// A resource by numbers in the .res bytes that this program carries: type (6 strings, 14 icon
-// group, 16 version ...), id. Language-neutral entries first. nullopt when there is none.
-std::optional<std::vector<uint8_t>> OwnResource(int type, int id);
-
 }  // namespace machine

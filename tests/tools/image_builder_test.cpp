@@ -61,9 +61,9 @@ TEST_F(ImagePacking, DependsOnNothingButItsInputsAndIsSmallerWithBest) {
 TEST_F(ImagePacking, LeavesNothingWhenItIsInterrupted) {
   const std::vector<std::string> before = NamesIn(".");
   const auto interrupt = [&] {
-    image::DeleteTemporaryFilesOnSignal();
-    const image::OutputFile one(Host("one.exe"), image::OutputFile::Kind::kProgram);
-    const image::OutputFile two(Host("two.exe"), image::OutputFile::Kind::kProgram);
+    image::DeleteTemporaryFilesWhenStopped();
+    const image::OutputFile one(Host("one.exe"), image::FileKind::kProgram);
+    const image::OutputFile two(Host("two.exe"), image::FileKind::kProgram);
     if (NamesIn(".").size() == before.size() + 2) kill(getpid(), SIGTERM);
     sleep(60);
   };

@@ -34,7 +34,7 @@ class ImageBuilder {
 
     const InputFile stub(order_.stub);
     CheckStub(stub);
-    OutputFile output(order_.output, OutputFile::Kind::kProgram);
+    OutputFile output(order_.output, FileKind::kProgram);
     CopyExecutable(stub, stub.Size(), &output);
     position_ = stub.Size();
     WriteRecords(&output);

@@ -137,7 +137,7 @@ class Extractor {
   std::unique_ptr<OutputFile> Expand(const PackagedFile& packaged, ProgressBar* progress) const {
     const FileRecord& record = packaged.record;
     const std::string name = FieldText(record.fileName);
-    auto output = std::make_unique<OutputFile>(TargetOf(name), OutputFile::Kind::kData);
+    auto output = std::make_unique<OutputFile>(TargetOf(name), FileKind::kData);
     const std::string fault = ExpandFile(file_, packaged, [&](std::span<const uint8_t> piece) {
       output->Write(piece);
       progress->Advance(piece.size());
