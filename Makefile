@@ -1,67 +1,71 @@
-# The front doors. Everything behind them is CMake (CMakePresets.json), CTest and the scripts in
-# tools/. On a bare Debian the first of them to run installs what is missing.
-PRESETS := native win32 win64
+# The front doors. Everything behind them is CMake (CMakePresets.json), CTest and the scripts in tools/. On a
+# bare Debian each door installs what it needs and is missing. The words behind ## are what `make help` says.
+TOOLS := moriv-image moriv-machine
 BENCH_PRESETS := bench bench-win32 bench-win64
-CMAKE_QUIET := --log-level=WARNING
 
-.PHONY: all demo demo-dialog test check bench fuzz mutate screenshots win32-emulated dist clean \
-  bootstrap \
-  $(PRESETS)
+.PHONY: all help demo demo-dialog tests-built test check bench fuzz mutate screenshots win32-emulated dist clean
 
-all: $(PRESETS)
+all: ## the setup program for Windows (32 and 64 bits) and for Linux, and the tools
+	@tools/bootstrap build
+	@tools/build win32 MorivSetup samples
+	@tools/build win64 MorivSetup
+	@tools/build native MorivSetup $(TOOLS)
+	@echo 'make help says what else there is.'
 
-bootstrap:
-	@tools/bootstrap
+help: ## these lines
+	@sed -n 's/^\([a-z0-9-]*\):.*## \(.*\)/\1|\2/p' $(MAKEFILE_LIST) | \
+	  while IFS='|' read -r door words; do printf 'make %-16s %s\n' "$$door" "$$words"; done
 
-$(PRESETS): bootstrap
-	@cmake --preset $@ $(CMAKE_QUIET) >/dev/null
-	@cmake --build --preset $@
-
-demo: native win32
+demo: ## an install and a removal of sample programs on a machine that is a folder; 2 minutes
+	@tools/bootstrap demo
+	@tools/build win32 samples
+	@tools/build native MorivSetup $(TOOLS)
 	@tools/demo
 
-demo-dialog: native win32
+demo-dialog: ## the same by the dialog, with a scripted user
+	@tools/bootstrap demo
+	@tools/build win32 samples
+	@tools/build native MorivSetup $(TOOLS)
 	@tools/demo-dialog
 
-# Unit tests, fault loops and scenarios, natively and under Wine; ends with CTest's own closing line.
-test: all
-	@tools/bootstrap --wow64
+tests-built:
+	@tools/bootstrap test
+	@for preset in win32 win64 native; do tools/build --tests $$preset all || exit 1; done
+
+test: tests-built ## every test, natively and under Wine; 10 minutes the first time
 	@tools/test
 
-# What keeps the house in order: tools/check says what it checks.
-check: all
+check: tests-built ## format, lint, sanitizers, imports, sizes, two builds compared
+	@tools/bootstrap check
 	@tools/check
 
-# The figures of docs/performance.md; BENCH=quick gives a first look and leaves that page alone.
-bench:
-	@tools/bootstrap --bench
+bench: ## the figures of docs/performance.md; BENCH=quick gives a first look and leaves that page alone
+	@tools/bootstrap bench
 	@for preset in $(BENCH_PRESETS); do \
-	  cmake --preset $$preset $(CMAKE_QUIET) >/dev/null && cmake --build --preset $$preset || exit 1; \
+	  cmake --preset $$preset --log-level=WARNING >/dev/null && cmake --build --preset $$preset || exit 1; \
 	done
 	@bench/run_bench.py $(BENCH)
 
-# Goes on from the corpus of the fuzz targets, or of one: make fuzz MINUTES=10 TARGET=image
 MINUTES := 5
-fuzz: bootstrap
+fuzz: ## goes on from the corpus of the fuzz targets, or of one: make fuzz MINUTES=10 TARGET=image
+	@tools/bootstrap fuzz
 	@tools/fuzz $(MINUTES) $(TARGET)
 
-# Small faults in src/, one at a time: which tests notice, and which faults nobody does. The tool's
-# options: make mutate MUTATE='-n 50 src/engine'
 MUTATE := -n 300
-mutate: all
+mutate: tests-built ## faults put into src/ one at a time: who notices; MUTATE='-n 50 src/engine' for its options
 	@tools/mutate $(MUTATE)
 
-# Every page in five languages, from the real program under Wine, into docs/screenshots/.
-screenshots: all
+screenshots: all ## every page in five languages, from the real program under Wine, into docs/screenshots/
+	@tools/bootstrap pictures
+	@tools/build win64 all
 	@tools/screenshots
 
-# The 32-bit program in scenarios, in an emulator where the kernel runs no 32-bit code.
-win32-emulated: all
+win32-emulated: tests-built ## the 32-bit program in scenarios, in an emulator where the kernel runs no 32-bit code
 	@tools/win32-emulated
 
-# The release folder, build/dist/: programs without a package, tools, documents, SHA-256 sums.
-dist: all
+dist: all ## the release, build/dist/: programs without a package, tools, documents, SHA-256 sums
+	@tools/bootstrap dist
 	@tools/dist
 
-clean:
+clean: ## takes build/ away
 	rm -rf build

@@ -27,7 +27,7 @@ AGAIN = """## Again
     make bench                 # everything, and this page
     make bench BENCH=quick     # a first look; its page and plots go to build/bench
 
-The peers come from Debian, by `tools/bootstrap --bench`. All timed runs share one CPU, each after a round
+The peers come from Debian, by `tools/bootstrap bench`. All timed runs share one CPU, each after a round
 that warms the caches. Leave the machine alone meanwhile. The commands under the tables can be given again,
 from the root, as long as `build/` stands.
 """

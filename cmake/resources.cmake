@@ -32,7 +32,8 @@ function(add_program_resources target source)
     set_source_files_properties(${object} PROPERTIES EXTERNAL_OBJECT ON GENERATED ON)
   else()
     set(embed ${CMAKE_CURRENT_BINARY_DIR}/${name}_res.S)
-    file(WRITE ${embed}
+    # Written only when it differs, since all that is linked with it would be linked again.
+    file(CONFIGURE OUTPUT ${embed} CONTENT
 "    .section .moriv_res,\"a\",@progbits
     .balign 4
     .globl moriv_resources_begin

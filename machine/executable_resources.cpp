@@ -5,7 +5,7 @@
 #include <string_view>
 
 #include "machine/bounded_bytes.h"
-#include "machine/host_file.h"
+#include "machine/mapped_file.h"
 #include "machine/resource_file.h"
 #include "machine/version_block.h"
 
@@ -164,7 +164,7 @@ std::vector<uint8_t> Copy(Bytes bytes) {
 }  // namespace
 
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& path) {
-  return FindVersionResource(MappedHostFile(path).bytes());
+  return FindVersionResource(MappedFile(path).bytes());
 }
 
 std::optional<std::vector<uint8_t>> FindVersionResource(Bytes file) {

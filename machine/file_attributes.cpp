@@ -10,6 +10,7 @@ bool SetReadOnly(const fs::path& file, bool readOnly) {
   constexpr fs::perms kAllWrite =
       fs::perms::owner_write | fs::perms::group_write | fs::perms::others_write;
   std::error_code error;
+  if (fs::is_regular_file(file, error) && fs::hard_link_count(file, error) > 1) return false;
   if (readOnly) {
     fs::permissions(file, kAllWrite, fs::perm_options::remove, error);
   } else {

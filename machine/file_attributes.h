@@ -7,7 +7,8 @@
 
 namespace machine {
 
-// False when the host refuses.
+// False when the host refuses, and for a file that has a second name on the host, since its
+// attributes are that name's too.
 bool SetReadOnly(const std::filesystem::path& file, bool readOnly);
 
 // Makes a new file whose name ends in .exe executable, so that the host can start it.

@@ -1,10 +1,13 @@
 // Files of the host.
 #pragma once
 
+#include <sys/types.h>
+
 #include <cstdint>
 #include <filesystem>
 #include <optional>
-#include <span>
+#include <string>
+#include <string_view>
 #include <vector>
 
 namespace machine {
@@ -12,20 +15,18 @@ namespace machine {
 // The bytes of a regular file; nullopt when it is none or can't be read.
 std::optional<std::vector<uint8_t>> ReadHostFile(const std::filesystem::path& file);
 
-// A regular file mapped into memory, for a reader of a few places in a large one: only the pages
-// that are looked at are read.
-class MappedHostFile {
- public:
-  explicit MappedHostFile(const std::filesystem::path& file);
-  ~MappedHostFile();
-  MappedHostFile(const MappedHostFile&) = delete;
-  MappedHostFile& operator=(const MappedHostFile&) = delete;
+// Reads a file of the machine's own folder, its settings or its registry. One that is absent leaves
+// `text` without a value. False, with "NAME: what" in `error`, for what can't be read and for all
+// but a plain file: a link could lead out of the folder, and a pipe would never end.
+bool ReadOwnFile(const std::filesystem::path& file, std::optional<std::string>* text,
+                 std::string* error);
 
-  // Empty for an empty file and for one that is none or can't be read.
-  std::span<const uint8_t> bytes() const { return bytes_; }
+// Makes or replaces a file as a whole: a new file is written beside it and renamed. No link is
+// written through: a name that something has is not the new file's. False, with all as it was, when
+// the host refuses.
+bool ReplaceHostFile(const std::filesystem::path& file, std::string_view bytes);
 
- private:
-  std::span<const uint8_t> bytes_;
-};
+// Writes all of the bytes to a host's descriptor. False when the host took only part of them.
+bool WriteAt(int descriptor, std::string_view bytes, off_t position);
 
 }  // namespace machine

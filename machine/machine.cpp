@@ -43,9 +43,12 @@ bool MakeHostDirectory(const fs::path& directory, std::string* error) {
 
 // Opens what the folder holds; a part that is missing has its defaults.
 bool Open(const fs::path& folder, const fs::path& image, std::string* error) {
-  if (!MakeHostDirectory(folder, error)) return false;
   std::error_code failure;
   machineFolder = fs::canonical(folder, failure);
+  if (failure) {
+    *error = folder.string() + ": " + failure.message();
+    return false;
+  }
 
   if (!ReadSettings(machineFolder / kSettingsFile, &settings, error)) {
     *error = (machineFolder / *error).string();
@@ -95,12 +98,19 @@ bool Furnish(std::string* error) {
 }  // namespace
 
 bool Start(const fs::path& folder, const fs::path& image, std::string* error) {
-  if (!Open(folder, image, error) || (IsFresh() && !Furnish(error))) {
+  if (!MakeHostDirectory(folder, error) || !Open(folder, image, error) ||
+      (IsFresh() && !Furnish(error))) {
     Close();
     return false;
   }
   SetFaults(settings.faults);
   return true;
+}
+
+bool StartAsItIs(const fs::path& folder, std::string* error) {
+  if (Open(folder, fs::path(), error)) return true;
+  Close();
+  return false;
 }
 
 std::string Stop() {
@@ -118,7 +128,8 @@ const fs::path& Folder() {
 }
 
 bool MakeFresh(const fs::path& folder, std::string* error) {
-  const bool made = Open(folder, fs::path(), error) && Furnish(error);
+  const bool made =
+      MakeHostDirectory(folder, error) && Open(folder, fs::path(), error) && Furnish(error);
   Close();
   return made;
 }

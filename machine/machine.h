@@ -23,6 +23,10 @@ namespace machine {
 bool Start(const std::filesystem::path& folder, const std::filesystem::path& image,
            std::string* error);
 
+// The same without a program, its faults, and anything made: a part that is missing stays away. For
+// the machine tool.
+bool StartAsItIs(const std::filesystem::path& folder, std::string* error);
+
 // Ends the machine. Returns what the program left open, as "2 files, 1 key", or "" for nothing.
 std::string Stop();
 

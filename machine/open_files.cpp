@@ -10,6 +10,7 @@
 #include "machine/disk_room.h"
 #include "machine/dos_path.h"
 #include "machine/file_attributes.h"
+#include "machine/host_file.h"
 #include "machine/machine.h"
 
 namespace machine {
@@ -39,8 +40,12 @@ bool IsRefusedByHolders(const Location& location, const OpenMode& mode) {
   });
 }
 
+bool Writes(const OpenMode& mode) {
+  return mode.create || (mode.access & kWrite) != 0;
+}
+
 bool CanOpen(const Location& location, const OpenMode& mode) {
-  const bool writes = mode.create || (mode.access & kWrite) != 0;
+  const bool writes = Writes(mode);
   if (location.isRoot || (writes && IsReadOnlyDrive(location.drive))) return false;
   if (!location.exists) return mode.create && location.parentExists && !location.endsInSeparator;
   if (location.isDirectory || (writes && location.isReadOnly)) return false;
@@ -61,11 +66,28 @@ int HostFlags(DWORD access) {
   }
 }
 
-// A host descriptor on the file, cut or made if the mode says so; -1 when the host refuses.
+// A file that has other names on the host may be somebody's outside the machine.
+bool HasOneName(int host) {
+  struct stat status;
+  return fstat(host, &status) == 0 && status.st_nlink <= 1;
+}
+
+// A host descriptor on a file that is there, or else on a new one, to write it.
+int OpenToWrite(const Location& location, const OpenMode& mode) {
+  int flags = HostFlags(mode.access | kWrite);
+  if (mode.create) flags |= location.exists ? O_CREAT : O_CREAT | O_NOFOLLOW;
+  const int host = open(location.host.c_str(), flags, 0666);
+  // It is cut only when it is known to be the machine's alone.
+  if (host < 0 || (HasOneName(host) && (!mode.create || ftruncate(host, 0) == 0))) return host;
+  close(host);
+  return -1;
+}
+
+// A host descriptor on the file, cut or made if the mode says so; -1 when it is refused.
 int OpenOnHost(const Location& location, const OpenMode& mode) {
-  if (!mode.create) return open(location.host.c_str(), HostFlags(mode.access));
-  const int host = open(location.host.c_str(), HostFlags(mode.access) | O_CREAT | O_TRUNC, 0666);
-  if (host < 0) return -1;
+  if (!Writes(mode)) return open(location.host.c_str(), HostFlags(mode.access));
+  const int host = OpenToWrite(location, mode);
+  if (host < 0 || !mode.create) return host;
   GiveRoomBack(location.drive, location.size);
   MarkProgram(location.host);
   if (mode.readOnly) SetReadOnly(location.host, true);
@@ -83,17 +105,6 @@ int FreeNumber() {
 std::optional<uint64_t> Growth(uint64_t size, uint64_t position, uint64_t count) {
   if (count > static_cast<uint64_t>(INT64_MAX) - position) return std::nullopt;
   return std::max(size, position + count) - size;
-}
-
-bool WriteAll(int host, const char* bytes, size_t count, off_t position) {
-  while (count > 0) {
-    const ssize_t written = pwrite(host, bytes, count, position);
-    if (written <= 0) return false;
-    bytes += written;
-    position += written;
-    count -= static_cast<size_t>(written);
-  }
-  return true;
 }
 
 // The program's number for a host's descriptor, which it owns from now on; -1 for none.
@@ -192,7 +203,7 @@ bool WriteBytes(OpenFile& file, const void* buffer, size_t count) {
   if ((file.mode.share & kWrite) != 0) file.size = FileSize(file);
   const auto growth = Growth(file.size, static_cast<uint64_t>(file.position), count);
   if (!growth || !TakeRoom(file.drive, *growth)) return false;
-  if (WriteAll(file.host, static_cast<const char*>(buffer), count, file.position)) {
+  if (WriteAt(file.host, {static_cast<const char*>(buffer), count}, file.position)) {
     file.position += static_cast<int64_t>(count);
     file.size += *growth;
     return true;

@@ -39,8 +39,9 @@ struct OpenFile {
 
 // Opens a file of the program's. Refuses what Windows refuses: directories, writing a read-only
 // file or drive, what another open file does not share, what the system does with the running
-// image. Returns its number, which CloseOpenFile ends, or -1. Numbers are small and at least 3: the
-// lower ones are the standard streams'.
+// image; and writing a file that has a second name on the host. Returns its number, which
+// CloseOpenFile ends, or -1. Numbers are small and at least 3: the lower ones are the standard
+// streams'.
 int OpenProgramFile(ObjectKind kind, std::string_view dosPath, const OpenMode& mode);
 
 // Null for a number that is not open or not of that kind.

@@ -3,11 +3,11 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "machine/host_file.h"
+#include "machine/mapped_file.h"
 
 namespace machine {
 
-MappedHostFile::MappedHostFile(const std::filesystem::path& file) {
+MappedFile::MappedFile(const std::filesystem::path& file) {
   const int descriptor = open(file.c_str(), O_RDONLY | O_CLOEXEC);
   if (descriptor == -1) return;
   struct stat status = {};
@@ -19,7 +19,7 @@ MappedHostFile::MappedHostFile(const std::filesystem::path& file) {
   close(descriptor);
 }
 
-MappedHostFile::~MappedHostFile() {
+MappedFile::~MappedFile() {
   if (!bytes_.empty()) munmap(const_cast<uint8_t*>(bytes_.data()), bytes_.size());
 }
 

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cstdio>
 #include <cstdlib>
-#include <fstream>
 #include <optional>
 #include <string_view>
 
@@ -60,11 +59,6 @@ void MakeSystemKeys(const RegistryRoots& roots) {
   }
 }
 
-[[noreturn]] void FailToSave() {
-  std::fprintf(stderr, "%s: the registry can't be written\n", registryFile.c_str());
-  std::exit(EXIT_FAILURE);
-}
-
 }  // namespace
 
 std::optional<std::vector<std::string>> SplitKeyPath(std::string_view path) {
@@ -87,19 +81,13 @@ bool IsValueName(std::string_view name) {
 
 bool LoadRegistry(const std::filesystem::path& file, std::string* error) {
   RegistryRoots roots;
-  if (!std::filesystem::exists(file)) {
+  std::optional<std::string> text;
+  if (!ReadOwnFile(file, &text, error)) return false;
+  if (!text) {
     MakeSystemKeys(roots);
-  } else {
-    const auto bytes = ReadHostFile(file);
-    if (!bytes) {
-      *error = file.filename().string() + ":1: the file can't be read";
-      return false;
-    }
-    const std::string text(bytes->begin(), bytes->end());
-    if (!ReadRegistryText(text, roots, error)) {
-      *error = file.filename().string() + ':' + *error;
-      return false;
-    }
+  } else if (!ReadRegistryText(*text, roots, error)) {
+    *error = file.filename().string() + ':' + *error;
+    return false;
   }
   CloseRegistry();
   registryFile = file;
@@ -110,15 +98,9 @@ bool LoadRegistry(const std::filesystem::path& file, std::string* error) {
 // A registry that can't be kept would make every later answer a lie: the process ends.
 void SaveRegistry() {
   if (!registryRoots) return;
-  std::filesystem::path newFile = registryFile;
-  newFile += ".new";
-  std::ofstream stream(newFile, std::ios::binary | std::ios::trunc);
-  stream << WriteRegistryText(*registryRoots);
-  stream.close();
-  if (!stream) FailToSave();
-  std::error_code code;
-  std::filesystem::rename(newFile, registryFile, code);
-  if (code) FailToSave();
+  if (ReplaceHostFile(registryFile, WriteRegistryText(*registryRoots))) return;
+  std::fprintf(stderr, "%s: the registry can't be written\n", registryFile.c_str());
+  std::exit(EXIT_FAILURE);
 }
 
 void CloseRegistry() {

@@ -28,7 +28,8 @@ struct RegistryKey {
   bool deleted = false;  // an open handle to a deleted key stays valid and answers an error
 };
 
-// Reads the file (a missing one gives a fresh registry). False with "FILE:LINE: what" in `error`.
+// Reads the file (a missing one gives a fresh registry). False with "FILE: what" or
+// "FILE:LINE: what" in `error`.
 bool LoadRegistry(const std::filesystem::path& file, std::string* error);
 // Writes the whole file, by rename. Called at each change.
 void SaveRegistry();

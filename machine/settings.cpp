@@ -4,15 +4,14 @@
 
 #include <ini.h>
 
+#include <algorithm>
 #include <charconv>
 #include <chrono>
-#include <cstdio>
-#include <cstring>
 #include <limits>
-#include <memory>
 #include <sstream>
 #include <string_view>
 
+#include "machine/host_file.h"
 #include "machine/seam_functions.h"
 
 namespace machine {
@@ -234,8 +233,8 @@ std::string ApplySetting(Settings& settings, const std::string& heading, const s
 // The parser goes on to the end of the file; the first mistake is the one told.
 struct SettingsParse {
   Settings settings;
-  FILE* file = nullptr;
-  int line = 0;  // the line read last
+  std::string_view rest;  // of the file's text
+  int line = 0;           // the line read last
   int mistakeLine = 0;
   std::string mistake;
 
@@ -249,11 +248,15 @@ struct SettingsParse {
 char* ReadIniLine(char* buffer, int size, void* context) {
   auto* parse = static_cast<SettingsParse*>(context);
   ++parse->line;
-  char* const text = std::fgets(buffer, size, parse->file);
-  if (text != nullptr && std::strchr(text, '\n') == nullptr && std::feof(parse->file) == 0) {
+  if (parse->rest.empty()) return nullptr;
+  std::string_view line = parse->rest.substr(0, parse->rest.find('\n'));
+  parse->rest.remove_prefix(std::min(line.size() + 1, parse->rest.size()));
+  if (line.size() >= static_cast<size_t>(size)) {
     parse->Note("line too long");
+    line = {};
   }
-  return text;
+  buffer[line.copy(buffer, line.size())] = '\0';
+  return buffer;
 }
 
 int TakeSetting(void* context, const char* section, const char* key, const char* value) {
@@ -266,22 +269,13 @@ int TakeSetting(void* context, const char* section, const char* key, const char*
 }  // namespace
 
 bool ReadSettings(const std::filesystem::path& file, Settings* settings, std::string* error) {
-  const std::string name = file.filename().string();
-  std::error_code missing;
-  if (!std::filesystem::exists(file, missing)) {
-    *settings = Settings{};
-    return true;
-  }
-  const std::unique_ptr<FILE, int (*)(FILE*)> stream(std::fopen(file.c_str(), "rb"), std::fclose);
-  if (stream == nullptr) {
-    *error = name + ": cannot be read";
-    return false;
-  }
+  std::optional<std::string> text;
+  if (!ReadOwnFile(file, &text, error)) return false;
 
   ini_max_line = kMaxLine;
   ini_allow_multiline = false;  // an indented line is a line of its own
   SettingsParse parse;
-  parse.file = stream.get();
+  if (text) parse.rest = *text;
   const int badLine = ini_parse_stream(ReadIniLine, &parse, TakeSetting, &parse);
   // Positive: the first line that is neither section, key nor comment.
   if (badLine > 0 && (parse.mistake.empty() || badLine < parse.mistakeLine)) {
@@ -289,7 +283,8 @@ bool ReadSettings(const std::filesystem::path& file, Settings* settings, std::st
     parse.mistake = "neither [SECTION] nor KEY = VALUE";
   }
   if (!parse.mistake.empty()) {
-    *error = name + ":" + std::to_string(parse.mistakeLine) + ": " + parse.mistake;
+    *error =
+        file.filename().string() + ":" + std::to_string(parse.mistakeLine) + ": " + parse.mistake;
     return false;
   }
   *settings = std::move(parse.settings);

@@ -1,10 +1,10 @@
 #include <windows.h>
 
-#include "machine/host_file.h"
+#include "machine/mapped_file.h"
 
 namespace machine {
 
-MappedHostFile::MappedHostFile(const std::filesystem::path& file) {
+MappedFile::MappedFile(const std::filesystem::path& file) {
   const HANDLE opened = CreateFileW(file.c_str(), GENERIC_READ, FILE_SHARE_READ, nullptr,
                                     OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
   if (opened == INVALID_HANDLE_VALUE) return;
@@ -21,7 +21,7 @@ MappedHostFile::MappedHostFile(const std::filesystem::path& file) {
   CloseHandle(opened);
 }
 
-MappedHostFile::~MappedHostFile() {
+MappedFile::~MappedFile() {
   if (!bytes_.empty()) UnmapViewOfFile(bytes_.data());
 }
 

@@ -12,7 +12,7 @@ namespace {
 
 class InstallPass {
  public:
-  static constexpr bool kReports = true;
+  static constexpr bool kAddsEvents = true;
   static constexpr bool kTakesStreams = true;
 
   explicit InstallPass(SetupContext* context) : context_(context) {}
@@ -40,7 +40,7 @@ StatusCode PrepareTarget(SetupContext* context, const char* path) {
   if (replaces && DeleteFileChecked(path) != 1) {
     return GiveUp(&context->events, EventDeleteFailed, path, StatusDeleteFailed);
   }
-  ShowMessage(context, replaces ? CatalogFileUpdated : CatalogFileCopied, path);
+  ShowMessage(context, replaces ? CatalogUpdatingFile : CatalogCopyingFile, path);
   const StatusCode status = MakeDirectories(path);
   return status == StatusOk ? status : GiveUp(&context->events, EventNoDirectory, path, status);
 }

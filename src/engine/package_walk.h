@@ -2,7 +2,8 @@
 // the record, resolve it to its targets, let the pass do its work, and go on behind the stream.
 //
 // A pass is a type with
-//   static constexpr bool kReports         add the walk's fatal events and the browser events
+//   static constexpr bool kAddsEvents      the walk adds events: the fatal one of its failure, and
+//                                          those on browsers
 //   static constexpr bool kTakesStreams    Work consumes the stream of a record that has targets
 //   StatusCode Begin()                     once, before the first record and also when there is
 //                                          none; not 1 ends the walk
@@ -30,7 +31,7 @@ inline bool SkipStream(DataFile* file, const FileRecord& record) {
 
 template <typename Pass>
 StatusCode Fail(SetupContext* context, uint32_t event, const char* text, StatusCode status) {
-  return Pass::kReports ? GiveUp(&context->events, event, text, status) : status;
+  return Pass::kAddsEvents ? GiveUp(&context->events, event, text, status) : status;
 }
 
 template <typename Pass>
@@ -44,7 +45,7 @@ StatusCode WalkRecord(SetupContext* context, Pass& pass, int index) {
 
   TargetList targets = {};
   StatusCode status =
-      ResolveTargets(context, &targets, context->installDir, record, Pass::kReports);
+      ResolveTargets(context, &targets, context->installDir, record, Pass::kAddsEvents);
   if (status < StatusOk) {
     FreeTargets(&targets);
     char text[kEventTextSize] = {};

@@ -8,7 +8,7 @@ namespace {
 
 class RemovalPass {
  public:
-  static constexpr bool kReports = true;
+  static constexpr bool kAddsEvents = true;
   static constexpr bool kTakesStreams = false;
 
   explicit RemovalPass(SetupContext* context) : context_(context) {}

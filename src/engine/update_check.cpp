@@ -8,7 +8,7 @@ namespace {
 
 class UpdateCheck {
  public:
-  static constexpr bool kReports = false;
+  static constexpr bool kAddsEvents = false;
   static constexpr bool kTakesStreams = false;
 
   StatusCode Begin() { return StatusOk; }

@@ -10,9 +10,9 @@
 namespace {
 
 // A library that lies beside the program, in a folder of downloads perhaps, must not be loaded for
-// one of the system's. Of the libraries of the import table the system takes its own anyway; but
-// those load others by their bare names. Unread: a system without the function, or one that
-// refuses, is served as it always was.
+// one of the system's. The import table's are loaded by now, and of those the NT family takes its
+// own whatever lies beside the program; but they load others by their bare names. Unread: a system
+// without the function, or one that refuses, is served as it always was.
 void LoadLibrariesFromSystemDirectory() {
   const auto setDirectories = FindProcedure<decltype(&SetDefaultDllDirectories)>(
       GetModuleHandleA("kernel32.dll"), "SetDefaultDllDirectories");

@@ -167,7 +167,7 @@ constexpr LanguageRow kLanguages[] = {
     {ProductItalian, "IT", {nullptr, nullptr}},
 };
 
-int32_t LanguageItem(const char* service) {
+int32_t ItemOfLanguage(const char* service) {
   return service != nullptr ? kItemServiceLanguage : kItemLanguage;
 }
 
@@ -227,7 +227,7 @@ int32_t ProductSetItem(int32_t item, const char* service, const char* subKey, co
 
 int32_t ProductGetLanguage(const char* service) {
   char text[15] = {};
-  if (ProductGetItem(LanguageItem(service), service, nullptr, text, sizeof(text)) == nullptr) {
+  if (ProductGetItem(ItemOfLanguage(service), service, nullptr, text, sizeof(text)) == nullptr) {
     return ProductUnknownLanguage;
   }
   for (const LanguageRow& row : kLanguages) {
@@ -244,5 +244,5 @@ int32_t ProductSetLanguage(const char* service, int32_t number) {
   for (const LanguageRow& row : kLanguages) {
     if (row.number == number) text = row.written;
   }
-  return ProductSetItem(LanguageItem(service), service, nullptr, text);
+  return ProductSetItem(ItemOfLanguage(service), service, nullptr, text);
 }

@@ -63,7 +63,7 @@ StatusCode WriteRemovalProgram(SetupContext* context, char* path, int32_t size) 
 
   const bool replaces = FileExists(target) == 1;
   if (replaces && DeleteFileChecked(target) != 1) return StatusDeleteFailed;
-  ShowMessage(context, replaces ? CatalogFileUpdated : CatalogFileCopied, target);
+  ShowMessage(context, replaces ? CatalogUpdatingFile : CatalogCopyingFile, target);
 
   if (image->OpenForRead() != 1) return StatusOpenFailed;
   const std::unique_ptr<DataFile> copy(new (std::nothrow) DataFile(target));

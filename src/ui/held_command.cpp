@@ -5,7 +5,7 @@
 namespace {
 
 struct HeldCommand {
-  bool isOpen;
+  bool isHolding;
   bool hasCommand;
   WPARAM command;
   HWND control;  // null when no control bears the command's id, as for Escape on an end page
@@ -22,25 +22,25 @@ bool IsStillOffered() {
 
 }  // namespace
 
-void HoldCommands() {
+CommandHold::CommandHold() {
   held = {};
-  held.isOpen = true;
+  held.isHolding = true;
 }
 
-bool HoldCommand(WPARAM command, HWND control) {
-  if (!held.isOpen) return false;
+CommandHold::~CommandHold() {
+  held.isHolding = false;
+  if (held.hasCommand && IsStillOffered()) {
+    PostMessageA(wizardState.window, WM_COMMAND, held.command,
+                 reinterpret_cast<LPARAM>(held.control));
+  }
+}
+
+bool KeepCommand(WPARAM command, HWND control) {
+  if (!held.isHolding) return false;
   if (!held.hasCommand) {
     held.hasCommand = true;
     held.command = command;
     held.control = control;
   }
   return true;
-}
-
-void ReleaseCommands() {
-  held.isOpen = false;
-  if (held.hasCommand && IsStillOffered()) {
-    PostMessageA(wizardState.window, WM_COMMAND, held.command,
-                 reinterpret_cast<LPARAM>(held.control));
-  }
 }

@@ -6,11 +6,16 @@
 
 #include "platform/win32.h"
 
-void HoldCommands();
+// Commands are held while it lives; one at a time. Its end posts the kept command, unless the
+// command's control has been hidden, disabled, destroyed or renumbered meanwhile: then it no longer
+// offers what the user clicked on.
+class CommandHold {
+ public:
+  CommandHold();
+  ~CommandHold();
+  CommandHold(const CommandHold&) = delete;
+  CommandHold& operator=(const CommandHold&) = delete;
+};
 
 // Keeps the command, as WM_COMMAND brings it, if commands are held. False when they aren't.
-bool HoldCommand(WPARAM command, HWND control);
-
-// Ends the holding and posts the kept command, unless its control has been hidden, disabled,
-// destroyed or renumbered meanwhile: then it no longer offers what the user clicked on.
-void ReleaseCommands();
+bool KeepCommand(WPARAM command, HWND control);

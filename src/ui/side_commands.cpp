@@ -1,9 +1,11 @@
 #include "ui/side_commands.h"
 
+#include "core/hooks.h"
 #include "log/event_log.h"
 #include "platform/registry_key.h"
 #include "ui/catalog.h"
 #include "ui/control_ids.h"
+#include "ui/dialog_controls.h"
 
 namespace {
 
@@ -43,23 +45,23 @@ bool TakePickedPath(LPITEMIDLIST list, char (&path)[kPathSize]) {
 
 }  // namespace
 
-void BrowseForDirectory(HWND dialog, SetupContext* context) {
+void BrowseForDirectory(SetupContext* context) {
   char prompt[kPathSize] = {};
   char displayName[kPathSize] = {};
   LoadCatalogText(context, CatalogPickerPrompt, prompt);
   BROWSEINFOA browse = {};
-  browse.hwndOwner = dialog;
+  browse.hwndOwner = wizardState.window;
   browse.pszDisplayName = displayName;
   browse.lpszTitle = prompt;
   const LPITEMIDLIST list = SHBrowseForFolderA(&browse);
   if (list == nullptr) return;
   char path[kPathSize] = {};
   if (!TakePickedPath(list, path)) return;
-  SendMessageA(GetDlgItem(dialog, IDC_DIRECTORY), WM_SETTEXT, 0, reinterpret_cast<LPARAM>(path));
+  SendMessageA(Control(IDC_DIRECTORY), WM_SETTEXT, 0, reinterpret_cast<LPARAM>(path));
   if (context != nullptr) (void)CopyText(context->installDir, path);  // the same size
 }
 
-void OpenWebAddress(HWND, const SetupContext* context) {
+void OpenWebAddress(SetupContext* context) {
   char command[kPathSize] = {};
   char address[kPathSize] = {};
   if (ReadBrowserCommand(command, sizeof(command)) != 1 || command[0] == '\0') return;
@@ -69,9 +71,9 @@ void OpenWebAddress(HWND, const SetupContext* context) {
   if (AppendText(command, address)) StartCommand(command);
 }
 
-void OpenLogFile(HWND dialog, const SetupContext*) {
+void OpenLogFile(SetupContext*) {
   char path[kLogPathSize] = {};
-  if (FindLogPath(path)) ShellExecuteA(dialog, "Open", path, nullptr, nullptr, SW_SHOW);
+  if (FindLogPath(path)) ShellExecuteA(wizardState.window, "Open", path, nullptr, nullptr, SW_SHOW);
 }
 
 int ReadBrowserCommand(char* buffer, size_t size) {

@@ -21,12 +21,6 @@ constexpr WORD kDialogId = 116;
 
 // ---- Commands
 
-// A side command of the dialog.
-template <auto kSideCommand>
-void AsCommand(SetupContext* context) {
-  kSideCommand(wizardState.window, context);
-}
-
 constexpr WORD kAnyNotification = UINT16_MAX;
 constexpr uint32_t kAnyPhase = UINT32_MAX;
 
@@ -41,18 +35,17 @@ struct CommandRow {
 // Enter gives command 1 also while no page stands, and a second click can be under way when the
 // first has hidden the button.
 constexpr CommandRow kCommands[] = {
-    {IDOK, kAnyNotification, BusyDone, [](SetupContext* context) { CloseWizard(context->result); }},
+    {IDOK, kAnyNotification, BusyDone, LeaveSuccessPage},
     {IDCANCEL, kAnyNotification, kAnyPhase, AskCancel},
-    {IDC_FAILURE_END, kAnyNotification, BusyFailed,
-     [](SetupContext*) { CloseWizard(StatusDialogAborted); }},
-    {IDC_LOGO, STN_CLICKED, kAnyPhase, AsCommand<OpenWebAddress>},
-    {IDC_LINK, STN_CLICKED, kAnyPhase, AsCommand<OpenWebAddress>},
-    {IDC_BROWSE, kAnyNotification, kAnyPhase, AsCommand<BrowseForDirectory>},
+    {IDC_FAILURE_END, kAnyNotification, BusyFailed, LeaveFailurePage},
+    {IDC_LOGO, STN_CLICKED, kAnyPhase, OpenWebAddress},
+    {IDC_LINK, STN_CLICKED, kAnyPhase, OpenWebAddress},
+    {IDC_BROWSE, kAnyNotification, kAnyPhase, BrowseForDirectory},
     {IDC_NEXT, kAnyNotification, BusyIdle, StartInstall},
     {IDC_UPDATE, kAnyNotification, BusyIdle, StartInstall},
     {IDC_REMOVE, kAnyNotification, BusyIdle, StartRemoval},
-    {IDC_LANGUAGE, CBN_SELCHANGE, kAnyPhase, [](SetupContext*) { SelectListedLanguage(); }},
-    {IDC_DETAILS, kAnyNotification, kAnyPhase, AsCommand<OpenLogFile>},
+    {IDC_LANGUAGE, CBN_SELCHANGE, kAnyPhase, SelectListedLanguage},
+    {IDC_DETAILS, kAnyNotification, kAnyPhase, OpenLogFile},
 };
 
 const CommandRow* FindCommand(WPARAM command) {
@@ -74,7 +67,7 @@ bool IsUnderABox() {
 void OnCommand(WPARAM command, HWND control) {
   const CommandRow* const row = FindCommand(command);
   if (wizardState.window == nullptr || row == nullptr || IsUnderABox()) return;
-  if (HoldCommand(command, control)) return;
+  if (KeepCommand(command, control)) return;
   if (row->phase == kAnyPhase || row->phase == wizardState.busy) row->carryOut(wizardState.context);
 }
 

@@ -111,52 +111,22 @@ int SetUpUpdatePage(SetupContext* context, bool isFree) {
   return IDCANCEL;
 }
 
+// The directory can't be changed while the product is there.
+void ShowInstalledProduct(const SetupContext& context) {
+  PutDirectory(context);
+  for (const int id : {IDC_DIRECTORY, IDC_BROWSE, IDC_LANGUAGE_LABEL, IDC_LANGUAGE, IDC_REMOVE}) {
+    Show(id);
+  }
+  EnableWindow(Control(IDC_DIRECTORY), FALSE);
+  EnableWindow(Control(IDC_BROWSE), FALSE);
+}
+
 void FailForServices(SetupContext* context, const char* services) {
   FailRun(context, GiveUp(&context->events, EventServicesRemain, services, StatusServicesRemain));
 }
 
-// Shows none when there is nothing to remove, or services stand in the way of a removal.
-void ChoosePage(SetupContext* context) {
-  (void)FindInstalledProduct(context);
-  const bool isRemoval = (context->options & OptionRemove) != 0;
-  const bool isFound = context->productFound == 1;
-  if (isRemoval && !isFound) {
-    StartRemoval(context);
-    return;
-  }
-
-  int defaultControl = 0;
-  if (!isFound) {
-    defaultControl = SetUpInstallPage(context);
-  } else {
-    const bool isFree = CheckDependingServices(nullptr, 0) != 0;
-    PutDirectory(*context);
-    for (const int id : {IDC_DIRECTORY, IDC_BROWSE, IDC_LANGUAGE_LABEL, IDC_LANGUAGE, IDC_REMOVE}) {
-      Show(id);
-    }
-    EnableWindow(Control(IDC_DIRECTORY), FALSE);
-    EnableWindow(Control(IDC_BROWSE), FALSE);
-    if (isRemoval) {
-      SetTitle(CatalogRemovalTitle, *context);
-      if (!isFree) {
-        char services[kEventTextSize] = {};
-        (void)CheckDependingServices(services, sizeof(services));
-        FailForServices(context, services);
-        return;
-      }
-      defaultControl = SetUpRemovalPage(context);
-    } else {
-      defaultControl = SetUpUpdatePage(context, isFree);
-    }
-  }
-  MakeDefault(defaultControl);
-  (void)ShowSpaceLine(wizardState.window, context);
-  Show(IDC_SPACE);
-  SetFocus(Control(defaultControl));
-}
-
 // Sends the user back to the directory, with a beep.
-void RefuseDirectory() {
+void ReturnToDirectory() {
   MessageBeep(MB_ICONEXCLAMATION);
   SetFocus(Control(IDC_DIRECTORY));
   SelectDirectoryText();
@@ -241,11 +211,40 @@ void SettleLanguage(SetupContext* context) {
   Post(WM_STEP_PAGE);
 }
 
-// Its check for older files dispatches messages; what the user clicks meanwhile waits for its end.
+// Shows no page when there is nothing to remove, or services stand in the way of a removal.
 void SetUpPage(SetupContext* context) {
-  HoldCommands();
-  ChoosePage(context);
-  ReleaseCommands();
+  const CommandHold hold;  // the check for older files dispatches messages
+  (void)FindInstalledProduct(context);
+  const bool isRemoval = (context->options & OptionRemove) != 0;
+  const bool isFound = context->productFound == 1;
+  if (isRemoval && !isFound) {
+    StartRemoval(context);
+    return;
+  }
+
+  int defaultControl = 0;
+  if (!isFound) {
+    defaultControl = SetUpInstallPage(context);
+  } else {
+    const bool isFree = CheckDependingServices(nullptr, 0) != 0;
+    ShowInstalledProduct(*context);
+    if (isRemoval) {
+      SetTitle(CatalogRemovalTitle, *context);
+      if (!isFree) {
+        char services[kEventTextSize] = {};
+        (void)CheckDependingServices(services, sizeof(services));
+        FailForServices(context, services);
+        return;
+      }
+      defaultControl = SetUpRemovalPage(context);
+    } else {
+      defaultControl = SetUpUpdatePage(context, isFree);
+    }
+  }
+  MakeDefault(defaultControl);
+  (void)ShowSpaceLine(wizardState.window, context);
+  Show(IDC_SPACE);
+  SetFocus(Control(defaultControl));
 }
 
 void StartInstall(SetupContext* context) {
@@ -256,14 +255,14 @@ void StartInstall(SetupContext* context) {
   SendMessageA(Control(IDC_DIRECTORY), WM_GETTEXT, sizeof(directory),
                reinterpret_cast<LPARAM>(directory));
   if (IsValidPath(directory) != 1) {
-    RefuseDirectory();
+    ReturnToDirectory();
     return;
   }
   (void)CopyText(context->installDir, directory);  // the same size
   if (CheckDiskSpace(context) != StatusOk) {
     Warn(&context->events, EventNoDiskSpace, context->installDir);
     ShowMessage(context, Exists(IDC_UPDATE) ? CatalogNoSpace : CatalogNoSpaceChooseOther, nullptr);
-    RefuseDirectory();
+    ReturnToDirectory();
     return;
   }
   HideWorkControls();
@@ -365,7 +364,15 @@ void AskCancel(SetupContext* context) {
   }
 }
 
-void SelectListedLanguage() {
+void LeaveSuccessPage(SetupContext* context) {
+  CloseWizard(context->result);
+}
+
+void LeaveFailurePage(SetupContext*) {
+  CloseWizard(StatusDialogAborted);
+}
+
+void SelectListedLanguage(SetupContext*) {
   const LRESULT index = SendMessageA(Control(IDC_LANGUAGE), CB_GETCURSEL, 0, 0);
   const LanguageItem* const item = LanguageItemAt(wizardState.window, static_cast<WPARAM>(index));
   if (item != nullptr) Post(WM_SET_LANGUAGE, static_cast<WPARAM>(item->languageOffset));

@@ -37,8 +37,9 @@ void SetUpPage(SetupContext* context);
 
 // Takes the language in force and renews all texts in it.
 void SetLanguage(SetupContext* context, int32_t language);
-// The language that the list shows becomes the one in force, by way of a message.
-void SelectListedLanguage();
+// The command of the list: the language that it shows becomes the one in force, by way of a
+// message.
+void SelectListedLanguage(SetupContext* context);
 
 // Install and update. The first is the command; a null context does nothing.
 void StartInstall(SetupContext* context);
@@ -62,6 +63,10 @@ void AskCancel(SetupContext* context);
 // Releases what the dialog and the run hold and ends the dialog with this status. Writes no log: a
 // run that is cancelled on a page leaves the old one as it was.
 void CloseWizard(StatusCode status);
+
+// The buttons that end the dialog: with the run's result, or with StatusDialogAborted.
+void LeaveSuccessPage(SetupContext* context);
+void LeaveFailurePage(SetupContext* context);
 
 // Draws a control that draws itself, or an item of the language list. The context may be null.
 void DrawControl(const SetupContext* context, WPARAM id, const DRAWITEMSTRUCT& item);

@@ -114,6 +114,31 @@ TEST(Drives, LinksAreFollowedInsideTheMachineOnly) {
   }
 }
 
+TEST(Drives, NoFileOutsideIsWrittenUnderASecondName) {
+  TestMachine pc;
+  pc.Write("drive_c/own", "own");
+  const TemporaryFolder outside;
+  outside.Write("file", "kept");
+  fs::create_hard_link(outside.Host("file"), pc.Host("drive_c/file"));
+  fs::create_symlink(outside.Host("file"), pc.Host("registry.reg.new"));
+  const char* const file = "C:\\file";
+  EXPECT_EQ(Told({Opens(Open(file)), CopyFileA(file, "C:\\copy", FALSE),
+                  Opens(Open(file, GENERIC_WRITE)), Opens(Create(file)),
+                  CopyFileA("C:\\own", file, FALSE), _creat(file, _S_IREAD | _S_IWRITE) >= 0,
+                  _sopen(file, _O_WRONLY | _O_BINARY, _SH_DENYNO) >= 0, _chmod(file, _S_IREAD) == 0,
+                  DeleteFileA(file), pc.Has("drive_c/file")}),
+            "yynnnnnnyn");
+  // The registry is written too.
+  HKEY key = nullptr;
+  EXPECT_EQ(
+      RegCreateKeyExA(HKEY_LOCAL_MACHINE, "New", 0, nullptr, 0, KEY_READ, nullptr, &key, nullptr),
+      0);
+  RegCloseKey(key);
+  EXPECT_NE(pc.Read("registry.reg").find("New]"), std::string::npos);
+  EXPECT_EQ(outside.Read("file"), "kept");
+  EXPECT_EQ(machine::Stop(), "");
+}
+
 TEST(Disks, FullOneTakesAWriteWholeOrNotAtAll) {
   TestMachine pc("[disk c]\nwritable = 10\n");
   const auto room = [] { return *machine::CurrentSettings().disks['C'].writable; };

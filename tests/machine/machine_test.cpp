@@ -2,6 +2,7 @@
 #include "machine/machine.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include "machine/faults.h"
 #include "machine/open_objects.h"
@@ -49,6 +50,22 @@ TEST(Machine, UnusableFolderIsNamed) {
   folder.Write("registry.reg", "REGEDIT4\n[HKEY_LOCAL_MACHINE\\A]\nb\n");
   EXPECT_NE(Start(folder).find("registry.reg:3: neither"), std::string::npos);
   EXPECT_EQ(GetFileAttributesA("C:\\"), INVALID_FILE_ATTRIBUTES);
+  for (const char* part : {"machine.ini", "registry.reg"}) {
+    const std::filesystem::path file = folder.Host(part);
+    const std::string error = file.string() + ": is no plain file that can be read";
+    std::filesystem::remove(file);
+    ASSERT_EQ(mkfifo(file.c_str(), 0600), 0);
+    EXPECT_EQ(Start(folder), error);
+    for (const char* target : {"/dev/null", "nothing"}) {
+      std::filesystem::remove(file);
+      std::filesystem::create_symlink(target, file);
+      EXPECT_EQ(Start(folder), error) << target;
+    }
+    std::filesystem::remove(file);
+    std::filesystem::create_directory(file);
+    EXPECT_EQ(Start(folder), error);
+    std::filesystem::remove(file);
+  }
 }
 
 TEST(Machine, StopTellsAndForgetsWhatIsOpen) {

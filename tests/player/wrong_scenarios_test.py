@@ -27,7 +27,7 @@ FALSEHOODS = [
     ('restart_after_a_removal', '  - C:\\windows\\Moriv.INF\n', ''),
     ('report_file_is_appended_to', '  heading\n  |1- File', '  |1- File'),
     ('run_without_events_leaves_the_log', 'exit -1000005', 'exit -1000005\nlog\n  fatal x'),
-    ('log_heading_to_the_letter', 'Saturday', 'saturday'),
+    ('log_heading_in_english', 'Saturday', 'saturday'),
     ('dialog_fresh_install', '  page installed\n', '  page installed in German\n'),
     ('dialog_refused_directory', '    |903 Edit shown enabled ""|\n', ''),
     ('power_lost_in_an_install', 'exit none', 'exit 1'),

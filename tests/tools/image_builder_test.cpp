@@ -29,7 +29,7 @@ std::string WithDirectory(const std::string& directory) {
 
 }  // namespace
 
-// Versions are those of the resource, as told, and none.
+// Versions are those of the resource, those that the description gives, and none.
 TEST_F(ImagePacking, FillsEveryFieldAsTheListingTells) {
   EXPECT_TRUE(Read("image.exe").starts_with(Read("stub.exe")));
   EXPECT_TRUE(sample.Bytes() == Read("image.exe"));  // no gap, and every size as it is

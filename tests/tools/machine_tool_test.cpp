@@ -31,6 +31,11 @@ TEST_F(MachineTool, MakesAMachineThatItShows) {
   Write("pc/drive_c/windows/morivlog.TXT", "caf\xE9\r\nend\r\n");
   EXPECT_EQ(Run("show @pc log").out, "caf\xC3\xA9\nend\n");
   EXPECT_EQ(Run("restart @pc").status, 0);  // nothing waits
+
+  Write("half/machine.ini", "");
+  for (const char* commandLine : {"show @half", "restart @half"})
+    EXPECT_EQ(Run(commandLine).status, 0);
+  EXPECT_EQ(NamesIn("half").size(), 1u);  // nothing was made
 }
 
 TEST_F(MachineTool, RefusesWhatIsNoMachineOrIsOneAlready) {
@@ -40,7 +45,8 @@ TEST_F(MachineTool, RefusesWhatIsNoMachineOrIsOneAlready) {
   Write("bad/machine.ini", "[system]\ncolour = 3\n");
   for (const char* commandLine :
        {"new @pc", "new @pc2 --platform os2", "new @pc2 --language 65536", "show @empty",
-        "show @missing", "show @pc disks", "restart @empty", "restart", "show @bad", ""}) {
+        "show @missing", "show @pc disks", "restart @empty", "restart @missing", "restart",
+        "show @bad", ""}) {
     ExpectRefused(Run(commandLine));
   }
   EXPECT_TRUE(NamesIn("empty").empty());

@@ -34,7 +34,7 @@ TEST(DialogResource, HasItsControlsInTheirPlaces) {
   EXPECT_EQ(rows, R"rows(0  90C808C0 0,0 315x174 (Installation de la machine virtuelle Moriv)
 65535 Static 50000006 0,0 41x174 ()
 900 Static 5000010E 6,9 30x28 ()
-911 Static 50020100 4,158 37x10 (www.moriv.example)
+911 Static 50020100 4,158 37x10 (zeb.test)
 910 Static 50021000 49,8 259x31 (ZEB)
 901 Static 50020000 49,58 259x46 (Message d'installation ....)
 65535 Static 50001007 49,48 259x1 ()

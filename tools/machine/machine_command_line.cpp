@@ -13,6 +13,7 @@
 
 #include "machine/code_page.h"
 #include "machine/drives.h"
+#include "machine/host_file.h"
 #include "machine/machine.h"
 #include "tools/machine/drive_tree.h"
 
@@ -24,19 +25,19 @@ namespace fs = std::filesystem;
 constexpr int kBadInput = 2;
 constexpr char kLogName[] = "MorivLog.txt";
 
-// A machine that runs as long as the object lives.
+// A machine that runs, with nothing made for it, as long as the object lives.
 class RunningMachine {
  public:
   explicit RunningMachine(const fs::path& folder) {
     std::string error;
-    if (!machine::Start(folder, {}, &error)) throw std::runtime_error(error);
+    if (!machine::StartAsItIs(folder, &error)) throw std::runtime_error(error);
   }
   ~RunningMachine() { machine::Stop(); }
   RunningMachine(const RunningMachine&) = delete;
   RunningMachine& operator=(const RunningMachine&) = delete;
 };
 
-// A folder without anything of a machine in it would be made one by its first start.
+// A folder that has no part of a machine is taken for a slip of the pen.
 void RequireMachine(const fs::path& folder) {
   if (fs::is_directory(folder / "drive_c") || fs::exists(folder / "registry.reg") ||
       fs::exists(folder / "machine.ini")) {
@@ -173,10 +174,9 @@ class MachineTool {
     std::string error;
     if (!machine::MakeFresh(folder_, &error)) throw std::runtime_error(error);
     const fs::path ini = fs::path(folder_) / "machine.ini";
-    std::ofstream file(ini);
-    file << MachineIni(platform_, std::to_string(language_));
-    file.close();
-    if (!file) throw std::runtime_error(ini.string() + ": can't be written");
+    if (!machine::ReplaceHostFile(ini, MachineIni(platform_, std::to_string(language_)))) {
+      throw std::runtime_error(ini.string() + ": can't be written");
+    }
     const RunningMachine proof(folder_);
   }
 

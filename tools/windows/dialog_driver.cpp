@@ -70,6 +70,7 @@ void WaitForMessage(HWND dialog, const std::wstring& text) {
     if (ReadMessageArea(dialog).find(text) != std::wstring::npos) return;
     Sleep(1);
   }
+  Show(dialog);
   Fail("the message area never had the text");
 }
 
