@@ -39,9 +39,9 @@ records +3
 space needed +48056
 (.+\n)+default directory +"C:\\Program Files\\Moriv"
 default language +french \(10000\)
-(.*\n)+ *\d+ +45056 +\d+ +4\.1\.7 +"040c04b0" +"a\.exe" +"%INSTALL_DIR%"
- *\d+ +3000 +\d+ +1\.2\.3 +"040904b0" +"b\.dll" +"%SYS_DIR%\\moriv;%PLUGIN_ALL_DIR%"
- *\d+ +0 +4 +-\.-\.- +"" +"readme\.txt" +"%INSTALL_DIR%\\docs"
+(.*\n)+ *\d+ +\d+ +45056 +\d+ +4\.1\.7 +"040c04b0" +"a\.exe" +"%INSTALL_DIR%"
+ *\d+ +\d+ +3000 +\d+ +1\.2\.3 +"040904b0" +"b\.dll" +"%SYS_DIR%\\moriv;%PLUGIN_ALL_DIR%"
+ *\d+ +\d+ +0 +4 +-\.-\.- +"" +"readme\.txt" +"%INSTALL_DIR%\\docs"
 )");
   const std::string listed = Run("list @image.exe").out;
   EXPECT_TRUE(std::regex_match(listed, listing)) << listed;

@@ -9,8 +9,9 @@ class App;
 
 namespace image {
 
-// What a command writes to, and what the tool is to end with when nothing is thrown.
+// What a command reads from and writes to, and what the tool is to end with when nothing is thrown.
 struct CommandRun {
+  std::istream& in;
   std::ostream& out;
   int status = 0;
 };
@@ -26,6 +27,7 @@ void AddListCommand(CLI::App* tool, CommandRun* run);
 void AddVerifyCommand(CLI::App* tool, CommandRun* run);
 void AddExtractCommand(CLI::App* tool, CommandRun* run);
 void AddRemovalCommand(CLI::App* tool, CommandRun* run);
+void AddDiffCommand(CLI::App* tool, CommandRun* run);
 void AddExplainCommand(CLI::App* tool, CommandRun* run);
 
 }  // namespace image

@@ -12,7 +12,7 @@ void AddPackCommand(CLI::App* tool, CommandRun*) {
   AddPathOption(command, "PACKAGE", &order->description, "TOML file that describes the package")
       ->required();
   AddPathOption(command, "--stub", &order->stub, "Setup program without a package")->required();
-  AddPathOption(command, "-o,--output", &order->output, "Image to write")->required();
+  AddOutputOption(command, &order->output, "Image to write");
   AddPathOption(command, "--source-dir", &order->sourceFolder,
                 "Folder of the files, if not PACKAGE's");
   command->add_flag("--allow-unknown-macros", order->allowUnknownMacros,
