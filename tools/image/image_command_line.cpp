@@ -6,6 +6,7 @@
 #include <ostream>
 #include <string>
 
+#include "tools/image/bad_input.h"
 #include "tools/image/commands.h"
 
 namespace image {
@@ -26,13 +27,14 @@ void Tell(std::ostream& err, std::string text) {
 int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostream& err) {
   CLI::App tool("Makes, shows, checks and unpacks setup images, and explains how runs ended.",
                 "moriv-image");
-  CommandRun run{out};
+  CommandRun run{out, 0, {}};
   tool.require_subcommand(1);
   for (const auto add : kCommands) add(&tool, &run);
   try {
     tool.parse(argc, argv);
     out.flush();
     if (!out) throw std::runtime_error("the output can't be written");
+    for (const std::string& warning : run.warnings) Tell(err, "warning: " + warning);
     return run.status;
   } catch (const CLI::CallForHelp& help) {
     return tool.exit(help, out, err);
@@ -40,6 +42,8 @@ int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostr
     return tool.exit(help, out, err);
   } catch (const CLI::ParseError& error) {
     Tell(err, std::string(error.what()) + "; see moriv-image --help");
+  } catch (const BadInputs& faults) {
+    for (const std::string& line : faults.Lines()) Tell(err, line);
   } catch (const std::bad_alloc&) {
     Tell(err, "not enough memory");
   } catch (const std::exception& error) {
