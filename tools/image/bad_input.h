@@ -4,6 +4,8 @@
 #include <filesystem>
 #include <stdexcept>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "tools/image/host_text.h"
 
@@ -15,6 +17,18 @@ class BadInput : public std::runtime_error {
       : std::runtime_error(TextOf(file) + ": " + what) {}
   BadInput(const std::filesystem::path& file, int line, const std::string& what)
       : std::runtime_error(TextOf(file) + ":" + std::to_string(line) + ": " + what) {}
+};
+
+// Several such lines at once.
+class BadInputs : public std::runtime_error {
+ public:
+  // There is one line at least.
+  explicit BadInputs(std::vector<std::string> lines)
+      : std::runtime_error(lines.front()), lines_(std::move(lines)) {}
+  const std::vector<std::string>& Lines() const { return lines_; }
+
+ private:
+  std::vector<std::string> lines_;
 };
 
 // The host's words for the last failed system call.

@@ -14,7 +14,7 @@ void AddExtractCommand(CLI::App* tool, CommandRun* run) {
   AddPathOption(command, "IMAGE", &order->image, "Image")->required();
   command->add_option("NAME", order->names,
                       "Files to expand, by name or as #2 by number, if not all");
-  AddOutputOption(command, &order->folder, "Folder to write to");
+  AddPathOption(command, "-o,--output", &order->folder, "Folder to write to")->required();
   command->add_flag("--tree", order->isTree, "Make folders for the first place of each file");
   command->add_flag("--force", order->replaceExisting, "Replace files that exist");
   command->callback([order, run] {

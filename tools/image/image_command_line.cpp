@@ -6,6 +6,7 @@
 #include <memory>
 #include <string>
 
+#include "tools/image/bad_input.h"
 #include "tools/image/commands.h"
 #include "tools/terminal/printable_text.h"
 
@@ -50,7 +51,7 @@ int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostr
   CLI::App tool(
       "Makes, shows, checks, compares and unpacks setup images, and explains how runs ended.",
       "moriv-image");
-  CommandRun run{std::cin, out};
+  CommandRun run{std::cin, out, 0, {}};
   tool.require_subcommand(1);
   tool.set_version_flag("--version", "moriv-image " MORIV_VERSION);
   for (const auto add : kCommands) add(&tool, &run);
@@ -60,6 +61,7 @@ int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostr
     tool.parse(argc, argv);
     out.flush();
     if (!out) throw std::runtime_error("the output can't be written");
+    for (const std::string& warning : run.warnings) Tell(err, "warning: " + warning);
     return run.status;
   } catch (const CLI::CallForHelp& help) {
     return tool.exit(help, out, err);
@@ -69,6 +71,8 @@ int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostr
     return tool.exit(help, out, err);
   } catch (const CLI::ParseError& error) {
     Tell(err, std::string(error.what()) + "; see moriv-image --help");
+  } catch (const BadInputs& faults) {
+    for (const std::string& line : faults.Lines()) Tell(err, line);
   } catch (const std::bad_alloc&) {
     Tell(err, "not enough memory");
   } catch (const std::exception& error) {

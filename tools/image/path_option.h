@@ -8,11 +8,19 @@
 
 namespace image {
 
-// As CLI::App::add_option does it for a text; `path` outlives the command.
+// As CLI::App::add_option does it for a text; `path` outlives the command. An option takes no "-":
+// nothing is written to standard output, or read from elsewhere, for it.
 inline CLI::Option* AddPathOption(CLI::App* command, const std::string& name,
                                   std::filesystem::path* path, const std::string& description) {
   return command->add_option_function<std::string>(
-      name, [path](const std::string& text) { *path = PathOf(text); }, description);
+      name,
+      [path, name](const std::string& text) {
+        if (text == "-" && name.starts_with('-')) {
+          throw CLI::ValidationError(name, "\"-\" is no file; name one (./- is one of that name)");
+        }
+        *path = PathOf(text);
+      },
+      description);
 }
 
 // The same for one path or more.
@@ -25,16 +33,6 @@ inline CLI::Option* AddPathsOption(CLI::App* command, const std::string& name,
         for (const std::string& text : texts) paths->push_back(PathOf(text));
       },
       description);
-}
-
-// -o: what the command writes. Standard output, which "-" means elsewhere, takes none of it.
-inline CLI::Option* AddOutputOption(CLI::App* command, std::filesystem::path* path,
-                                    const std::string& description) {
-  return AddPathOption(command, "-o,--output", path, description)
-      ->required()
-      ->check([](const std::string& text) {
-        return text == "-" ? "can't be standard output; name a file or a folder" : "";
-      });
 }
 
 }  // namespace image

@@ -32,7 +32,7 @@ void AddRemovalCommand(CLI::App* tool, CommandRun*) {
       tool->add_subcommand("removal", "Make the removal program that an install would write");
   const auto order = std::make_shared<RemovalOrder>();
   AddPathOption(command, "IMAGE", &order->image, "Setup image")->required();
-  AddOutputOption(command, &order->output, "Removal program to write");
+  AddPathOption(command, "-o,--output", &order->output, "Removal program to write")->required();
   command->add_option("--language", order->language, std::string(kLanguageNames) + ", or a number");
   command->callback([order] { WriteRemoval(*order); });
 }

@@ -5,29 +5,12 @@
 #include "tools/image/host_text.h"
 #include "tools/image/record_text.h"
 #include "tools/image/record_version.h"
-#include "tools/image/version_data.h"
 
 namespace image {
 namespace {
 
 std::string Differs(const std::string& what, const std::string& found, const std::string& wanted) {
   return what + " is " + found + ", the sources make it " + wanted;
-}
-
-// The fields of a record that come from its description and its source.
-FileRecord RecordOf(const FileDescription& file, const std::filesystem::path& source) {
-  FileRecord record = {};
-  // A text that doesn't fit was never packed.
-  (void)SetFieldText(record.fileName, file.name.text);
-  (void)SetFieldText(record.destination, file.destination.text);
-  VersionData version = ReadVersionData(source);
-  if (file.version) ParseVersion(file.version->text, version.fields);
-  record.versionFirst = version.fields[0];
-  record.versionSecond = version.fields[1];
-  record.versionThird = version.fields[2];
-  (void)SetFieldText(record.versionLanguage,
-                     file.language ? file.language->text : version.language);
-  return record;
 }
 
 }  // namespace
@@ -57,12 +40,15 @@ std::string SourceBytes::Fault() const {
 }
 
 SourceComparison::SourceComparison(const std::filesystem::path& description,
-                                   const std::filesystem::path& folder)
-    : description_(ReadDescription(description)),
-      folder_(folder.empty() ? description.parent_path() : folder) {}
+                                   const std::filesystem::path& folder) {
+  FaultList faults(description);
+  description_ = ReadDescription(description, folder, &faults);
+  made_ = MakeRecords(description_, true, &faults);
+  faults.ThrowIfAny();
+}
 
 void SourceComparison::CompareHeader(const PackageHeader& header, const FaultTeller& tell) const {
-  const size_t count = description_.files.size();
+  const size_t count = made_.records.size();
   if (header.recordCount != count) {
     tell(Differs("recordCount", std::to_string(header.recordCount), std::to_string(count)));
   }
@@ -77,20 +63,20 @@ void SourceComparison::CompareHeader(const PackageHeader& header, const FaultTel
     tell(Differs("defaultLanguage", DescribeLanguage(header.defaultLanguage),
                  DescribeLanguage(description_.defaultLanguage)));
   }
-  if (description_.spaceNeeded && header.spaceNeeded != *description_.spaceNeeded) {
-    tell(Differs("spaceNeeded", std::to_string(header.spaceNeeded),
-                 std::to_string(*description_.spaceNeeded)));
+  const uint64_t space = description_.spaceNeeded.value_or(
+      static_cast<uint32_t>(std::min<uint64_t>(made_.spaceNeeded, UINT32_MAX)));
+  if (header.spaceNeeded != space) {
+    tell(Differs("spaceNeeded", std::to_string(header.spaceNeeded), std::to_string(space)));
   }
 }
 
 bool SourceComparison::CompareRecord(size_t index, const FileRecord& record,
                                      const FaultTeller& tell) const {
-  if (index >= description_.files.size()) {
+  if (index >= made_.records.size()) {
     tell("the sources have no file of this number");
     return false;
   }
-  const FileDescription& file = description_.files[index];
-  const FileRecord wanted = RecordOf(file, SourceOf(file));
+  const FileRecord& wanted = made_.records[index];
   const auto compare = [&tell](const std::string& what, const std::string& found,
                                const std::string& expected) {
     if (found != expected) tell(Differs(what, found, expected));
@@ -108,11 +94,7 @@ bool SourceComparison::CompareRecord(size_t index, const FileRecord& record,
 }
 
 std::unique_ptr<SourceBytes> SourceComparison::OpenSource(size_t index) const {
-  return std::make_unique<SourceBytes>(SourceOf(description_.files[index]));
-}
-
-std::filesystem::path SourceComparison::SourceOf(const FileDescription& file) const {
-  return folder_ / file.source;
+  return std::make_unique<SourceBytes>(description_.SourceOf(description_.files[index]));
 }
 
 }  // namespace image

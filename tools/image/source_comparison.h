@@ -14,6 +14,7 @@
 #include "package/package_format.h"
 #include "tools/image/input_file.h"
 #include "tools/image/package_description.h"
+#include "tools/image/record_maker.h"
 
 namespace image {
 
@@ -37,7 +38,7 @@ class SourceBytes {
 
 class SourceComparison {
  public:
-  // Throws BadInput for a description that can't be used.
+  // Throws BadInput or BadInputs for a description or a source that can't be used.
   SourceComparison(const std::filesystem::path& description, const std::filesystem::path& folder);
 
   void CompareHeader(const PackageHeader& header, const FaultTeller& tell) const;
@@ -48,10 +49,8 @@ class SourceComparison {
   std::unique_ptr<SourceBytes> OpenSource(size_t index) const;
 
  private:
-  std::filesystem::path SourceOf(const FileDescription& file) const;
-
   PackageDescription description_;
-  std::filesystem::path folder_;
+  PackageRecords made_;
 };
 
 }  // namespace image

@@ -70,17 +70,17 @@ bool ParseVersion(std::string_view text, int16_t (&fields)[3]) {
 
 std::optional<std::string> FindMisreadVersion(const VersionData& version) {
   if (version.text.empty()) return std::nullopt;
-  std::string told;
-  int count = 0;
+  std::string parts[3] = {"0", "0", "0"};
   const char* const end = version.text.data() + version.text.size();
-  for (const char* next = version.text.data(); next != end && count < 3; ++count) {
+  const char* next = version.text.data();
+  for (std::string& part : parts) {
     next = std::find_if(next, end, IsDigit);
     const char* const behind = std::find_if_not(next, end, IsDigit);
     const char* const first = std::find_if(next, behind, [](char c) { return c != '0'; });
-    told += (count == 0 ? "" : ".") + (first == behind ? "0" : std::string(first, behind));
+    if (first != behind) part.assign(first, behind);
     next = behind;
   }
-  for (; count < 3; ++count) told += count == 0 ? "0" : ".0";
+  const std::string told = parts[0] + '.' + parts[1] + '.' + parts[2];
   if (told == DescribeVersion(version.fields)) return std::nullopt;
   return told;
 }
