@@ -38,7 +38,7 @@ TEST_F(ImageVerifier, FindsEachChange) {
   };
   const std::pair<std::function<void(Parts)>, const char*> rows[] = {
       {[](Parts p) { p.header.removalImageFlag = 2; }, "removalImageFlag is 2"},
-      {[](Parts p) { p.header.spaceNeeded++; }, "spaceNeeded is 48057"},
+      {[](Parts p) { p.header.spaceNeeded--; }, "spaceNeeded is 48055"},
       {[](Parts p) { p.header.packageLength--; }, "packageLength"},
       {[](Parts p) { p.header.defaultDirectory[259] = 'x'; }, "defaultDirectory"},
       {[](Parts p) { SetField(p.header.defaultDirectory, "C:\\..\\x"); }, "\"..\""},
