@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <filesystem>
+#include <limits>
 #include <string>
 #include <vector>
 
@@ -16,8 +17,8 @@ class FaultList {
 
   // A fault of the description; `what` names the key.
   void Add(int line, const std::string& what);
-  // A fault of another file, which the description has no line for.
-  void Add(const BadInput& fault) { faults_.push_back({0, fault.what()}); }
+  // A fault that no line of the description has; it is told behind the others.
+  void Add(const BadInput& fault) { faults_.push_back({kNoLine, fault.what()}); }
   // What is told and taken all the same.
   void Warn(int line, const std::string& what);
 
@@ -28,6 +29,8 @@ class FaultList {
   std::vector<std::string> Warnings() const;
 
  private:
+  static constexpr int kNoLine = std::numeric_limits<int>::max();
+
   struct Remark {
     int line;
     std::string text;

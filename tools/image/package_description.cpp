@@ -172,7 +172,7 @@ class DescriptionReader {
       if (description_.files.size() <= kMostFiles) continue;
       faults_.Add(description_.files[kMostFiles].sourceLine,
                   "\"source\": more than 65535 files; leave some out");
-      return;
+      faults_.ThrowIfAny();
     }
   }
 
