@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <string>
 #include <system_error>
+#include <utility>
+#include <vector>
 
 #include "tools/image/host_text.h"
 
@@ -17,6 +19,18 @@ class BadInput : public std::runtime_error {
       : std::runtime_error(TextOf(file) + ": " + what) {}
   BadInput(const std::filesystem::path& file, int line, const std::string& what)
       : std::runtime_error(TextOf(file) + ":" + std::to_string(line) + ": " + what) {}
+};
+
+// Several such lines at once.
+class BadInputs : public std::runtime_error {
+ public:
+  // There is one line at least.
+  explicit BadInputs(std::vector<std::string> lines)
+      : std::runtime_error(lines.front()), lines_(std::move(lines)) {}
+  const std::vector<std::string>& Lines() const { return lines_; }
+
+ private:
+  std::vector<std::string> lines_;
 };
 
 // Of the last call of the C runtime or of host_files.h that failed.
