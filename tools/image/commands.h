@@ -33,5 +33,6 @@ void AddExtractCommand(CLI::App* tool, CommandRun* run);
 void AddRemovalCommand(CLI::App* tool, CommandRun* run);
 void AddDiffCommand(CLI::App* tool, CommandRun* run);
 void AddExplainCommand(CLI::App* tool, CommandRun* run);
+void AddPlanCommand(CLI::App* tool, CommandRun* run);
 
 }  // namespace image
