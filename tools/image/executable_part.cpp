@@ -7,7 +7,7 @@
 
 #include "machine/bounded_bytes.h"
 #include "machine/executable_resources.h"
-#include "machine/host_file.h"
+#include "machine/mapped_file.h"
 #include "tools/image/bad_input.h"
 #include "tools/image/image_contents.h"
 #include "tools/image/stream_format.h"
@@ -44,7 +44,7 @@ void RequireSetupProgram(const std::filesystem::path& stub) {
   const std::string mend = "; use the setup program as it was built";
   if (FindHeader(file)) throw BadInput(stub, "has a package behind it already" + mend);
   if (file.Size() > kLargestSize) throw BadInput(stub, "has 2 GiB or more; use a smaller file");
-  const machine::MappedHostFile mapped(stub);
+  const machine::MappedFile mapped(stub);
   const std::span<const uint8_t> program = mapped.bytes();
   if (const auto extent = machine::FindProgramExtent(program)) {
     if (extent->isSigned) {

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
+#include <iostream>
 #include <utility>
 
 #include "tools/image/host_files.h"
@@ -50,7 +51,7 @@ void ProgressBar::Draw(Clock::time_point now) {
 // sequence that clears a line.
 void ProgressBar::Show(const std::string& line) {
   const std::string blanks(shownWidth_ - std::min(shownWidth_, line.size()), ' ');
-  std::fputs(('\r' + line + blanks + (line.empty() ? "\r" : "")).c_str(), stderr);
+  std::cerr << '\r' + line + blanks + (line.empty() ? "\r" : "");  // in one go: it must not flicker
   shownWidth_ = line.size();
 }
 
