@@ -63,9 +63,9 @@ TEST_F(ImageVerifier, FindsEachChange) {
          SetField(p.record.fileName, "a.exe");
          SetField(p.record.destination, "\\");
        },
-       "record 1 has filled already"},
+       "record 1 fills already"},
       {[](Parts p) { SetField(p.record.destination, std::string(259, ';')); },
-       "record 2 has filled already"},
+       "goes to one place twice"},
       {withSize(2999), "expands to more than"},
       {withSize(3001), "expands to 3000 bytes"},
       {withSize(0x80000000), "2 GiB or more"},
