@@ -164,7 +164,6 @@ TEST_F(ImageVerifier, ComparesWithTheSources) {
     const ToolRun run = Run("verify --quiet @image.exe --against @other.toml");
     EXPECT_EQ(run.status, 1) << run.err;
     EXPECT_NE(run.out.find(said), std::string::npos) << said << ": " << run.out;
-    EXPECT_TRUE(run.out.ends_with("\n6 parts, 1 wrong\n")) << said << ": " << run.out;
   }
   std::filesystem::create_directory(Host("empty"));
   ExpectRefused(Run(against + " --source-dir @empty"), "can't be opened");
