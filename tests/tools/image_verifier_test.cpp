@@ -144,7 +144,9 @@ TEST_F(ImageVerifier, ComparesWithTheSources) {
   const auto with = [&description](const std::string& from, const std::string& to) {
     return std::string(description).replace(description.find(from), from.size(), to);
   };
-  Write("changed/b.dll", Read("b.dll").replace(2999, 1, "?"));
+  std::string changed = Read("b.dll");
+  changed[2999] ^= 1;
+  Write("changed/b.dll", changed);
   Write("longer/b.dll", Read("b.dll") + "x");
   const std::pair<std::string, const char*> rows[] = {
       {with("Moriv", "Zeb"), "header: defaultDirectory is \"C:\\Program Files\\Moriv\", the "},
