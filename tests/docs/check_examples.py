@@ -1,8 +1,11 @@
 #!/usr/bin/python3
 """Plays the examples of moriv-image in README.md and docs/image-tool.md: check_examples.py BUILD, the
 folder of the native build. Every "$" command there is run, and what stands below it must come out;
-numbers may be others, since they change with the compiler, and "..." stands for any lines."""
+numbers may be others, since they change with the compiler, and "..." stands for any lines. Every key of
+the tool's JSON is to stand on its page."""
 
+import json
+import os
 import re
 import shlex
 import shutil
@@ -17,10 +20,10 @@ BLOCK = re.compile(r'(?:^ {4}.*\n|^\n(?= {4}))+', re.MULTILINE)
 COMMAND = re.compile(r'^\$ ((?:build/native/)?moriv-image .*)$')
 
 
-def blocks(name, text=None):
+def blocks(name):
     """The indented blocks of a page, without their indent."""
-    text = text or (ROOT / name).read_text('utf-8')
-    return [re.sub('^ {4}', '', block, flags=re.MULTILINE) for block in BLOCK.findall(text)]
+    return [re.sub('^ {4}', '', block, flags=re.MULTILINE).strip('\n') + '\n'
+            for block in BLOCK.findall((ROOT / name).read_text('utf-8'))]
 
 
 def examples(name):
@@ -58,7 +61,7 @@ def prepare(package):
     image[at + 20000:at + 20002] = b'\xff\xff'
     Path('damaged').write_bytes(image)
     logs = [block for block in blocks('docs/log.md') if 'Fatal Error' in block]
-    Path('MorivLog.txt').write_text('\n\n' + logs[-1].rstrip('\n') + '\n', newline='\r\n')
+    Path('MorivLog.txt').write_text('\n\n' + logs[-1], newline='\r\n')
     for name, text in {'Setup-4.1.7.exe': package, 'Setup-4.1.8.exe': newer(package)}.items():
         Path('package.toml').write_text(text)
         run(f'moriv-image pack package.toml --source-dir build/win32/samples '
@@ -74,6 +77,21 @@ def newer(package):
             third.replace('source = "zebddb.exe"', 'source = "zebddb.exe"\nname = "zebbase.exe"'))
 
 
+def keys(value):
+    if isinstance(value, dict):
+        return set(value).union(*map(keys, value.values()))
+    return set().union(*map(keys, value)) if isinstance(value, list) else set()
+
+
+def check_keys():
+    page = (ROOT / 'docs/image-tool.md').read_text('utf-8')
+    documented = set(re.findall('`(\\w+)`', page[page.index('\n## JSON'):]))
+    for command in ('list damaged', 'verify damaged', 'diff Setup-4.1.7.exe Setup-4.1.8.exe',
+                    'explain MorivLog.txt'):
+        unknown = keys(json.loads(run(f'moriv-image {command} --json'))) - documented
+        assert not unknown, f'{command}: {unknown}'
+
+
 def main():
     count = 0
     with tempfile.TemporaryDirectory() as folder:
@@ -82,19 +100,20 @@ def main():
             (Path(folder) / link).parent.mkdir(parents=True, exist_ok=True)
             (Path(folder) / link).symlink_to(target)
         (Path(folder) / 'build/demo').mkdir()
-        import os
         os.chdir(folder)
         shutil.copy('build/win32/samples/zebdial.exe', '.')
         for name in ('README.md', 'docs/image-tool.md'):
             for block in blocks(name):
-                if block.startswith('[package]') and not Path('my.toml').exists():
+                if block.startswith('[package]'):
                     Path('my.toml').write_text(block)
             for command, shown in examples(name):
                 said = '\n'.join(' '.join(line.split()) for line in run(command).splitlines())
                 said = re.sub(r'\d+', '0', said).strip() + '\n'
                 assert pattern(shown).fullmatch(said.lstrip('\n')), f'{name}: {command}\n{said}'
                 count += 1
-            prepare(Path('samples/reference.toml').read_text())
+            if name == 'README.md':
+                prepare(Path('samples/reference.toml').read_text())
+        check_keys()
     print(f'{count} examples')
 
 

@@ -337,3 +337,30 @@ TEST_F(ImagePacking, TakesPatternsTreesAndListsAndReportsThem) {
   Write("data/a;b/x", "");
   ExpectRefused(Pack(tree), "means something else");
 }
+
+// The descriptions of docs/image-tool.md are packed without a warning, and its message is what is
+// said.
+TEST_F(ImagePacking, IsAsItsDocumentShowsIt) {
+  for (const char* name : {"zebdial.exe", "plug-in.dll", "lib/net.dll", "data/fonts/small.fon",
+                           "data/read.me", "deep.dat", "flat.dat"}) {
+    Write(name, name);
+  }
+  std::istringstream document(FileBytes(MORIV_SOURCE_DIR "/docs/image-tool.md"));
+  std::string block, listings, messages;
+  for (std::string line; std::getline(document, line);) {
+    if (line.starts_with("    moriv-image: package.toml:10:")) messages += line.substr(4) + '\n';
+    if (line.empty() || line.starts_with("    ")) {
+      block += line + '\n';
+    } else if (const std::string text = std::exchange(block, ""); text.find("[[") != text.npos) {
+      const ToolRun run = Pack(text);
+      EXPECT_EQ(std::pair(run.status, run.err), std::pair(0, std::string())) << text;
+      listings += Run("list @new.exe").out;
+    }
+  }
+  EXPECT_TRUE(
+      std::regex_search(listings, std::regex(R"("small.fon" +"%INSTALL_DIR%\\data\\fonts")")));
+  EXPECT_NE(listings.find("\"%INSTALL_DIR%\\one\\two\""), std::string::npos) << listings;
+  Write("package.toml", std::string(7, '\n') + WithDestination("%INSTALL_DIR%\\data;%SYSTEM%"));
+  const std::string said = Pack("@package.toml").err;
+  EXPECT_EQ(std::regex_replace(said, std::regex(Host("").string()), ""), messages);
+}

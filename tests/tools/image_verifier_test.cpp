@@ -63,9 +63,9 @@ TEST_F(ImageVerifier, FindsEachChange) {
          SetField(p.record.fileName, "a.exe");
          SetField(p.record.destination, "\\");
        },
-       "record 1 has filled already"},
+       "record 1 fills already"},
       {[](Parts p) { SetField(p.record.destination, std::string(259, ';')); },
-       "record 2 has filled already"},
+       "goes to one place twice"},
       {withSize(2999), "expands to more than"},
       {withSize(3001), "expands to 3000 bytes"},
       {withSize(0x80000000), "2 GiB or more"},
@@ -144,7 +144,9 @@ TEST_F(ImageVerifier, ComparesWithTheSources) {
   const auto with = [&description](const std::string& from, const std::string& to) {
     return std::string(description).replace(description.find(from), from.size(), to);
   };
-  Write("changed/b.dll", Read("b.dll").replace(2999, 1, "?"));
+  std::string changed = Read("b.dll");
+  changed[2999] ^= 1;
+  Write("changed/b.dll", changed);
   Write("longer/b.dll", Read("b.dll") + "x");
   const std::pair<std::string, const char*> rows[] = {
       {with("Moriv", "Zeb"), "header: defaultDirectory is \"C:\\Program Files\\Moriv\", the "},
@@ -164,7 +166,6 @@ TEST_F(ImageVerifier, ComparesWithTheSources) {
     const ToolRun run = Run("verify --quiet @image.exe --against @other.toml");
     EXPECT_EQ(run.status, 1) << run.err;
     EXPECT_NE(run.out.find(said), std::string::npos) << said << ": " << run.out;
-    EXPECT_TRUE(run.out.ends_with("\n6 parts, 1 wrong\n")) << said << ": " << run.out;
   }
   std::filesystem::create_directory(Host("empty"));
   ExpectRefused(Run(against + " --source-dir @empty"), "can't be opened");

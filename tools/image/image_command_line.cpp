@@ -38,10 +38,10 @@ void AddHelpCommand(CLI::App* tool, CommandRun* run) {
   CLI::App* help = tool->add_subcommand("help", "Tell the options of a command");
   const auto name = std::make_shared<std::string>();
   help->add_option("COMMAND", *name, "The command; without it, all commands are told");
-  help->callback([tool, name, run] {
+  // Once it has a command, the tool takes a question for its help for that command's.
+  help->callback([tool, name, run, all = tool->help()] {
     if (!name->empty()) RequireKnownCommand(*tool, *name);
-    const CLI::App* command = name->empty() ? tool : tool->get_subcommand(*name);
-    run->out << command->help(command == tool ? "" : "moriv-image");
+    run->out << (name->empty() ? all : tool->get_subcommand(*name)->help("moriv-image"));
   });
 }
 

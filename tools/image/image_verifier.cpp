@@ -179,7 +179,9 @@ class Verifier {
       const auto [place, isNew] = fillers_.emplace(std::hash<std::string>()(key), number);
       if (!isNew && !filler) filler = place->second;
     }
-    if (filler) Wrong("goes to a place that record " + Number(*filler) + " has filled already");
+    if (!filler) return;
+    Wrong(*filler == number ? "goes to one place twice"
+                            : "goes to a place that record " + Number(*filler) + " fills already");
   }
 
   void CheckVersion(const FileRecord& record) {

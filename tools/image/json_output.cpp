@@ -15,9 +15,13 @@ void AddJsonFlag(CLI::App* command, bool* isAsked) {
 
 // The library leaves characters above C0 as they are; what Printable makes of them is an escape of
 // JSON too. Bytes that are no UTF-8 stand in paths of the host at most.
-void PrintJson(const CommandRun& run, const Json& object) {
+std::string JsonText(const Json& object) {
   const std::string text = object.dump(2, ' ', false, Json::error_handler_t::replace);
-  run.out << terminal::PrintableLines(text) << '\n';
+  return terminal::PrintableLines(text) + '\n';
+}
+
+void PrintJson(const CommandRun& run, const Json& object) {
+  run.out << JsonText(object);
 }
 
 }  // namespace image

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <nlohmann/json_fwd.hpp>
+#include <string>
 
 namespace CLI {
 class App;
@@ -16,6 +17,7 @@ using Json = nlohmann::ordered_json;  // keys stay in the order in which they ar
 void AddJsonFlag(CLI::App* command, bool* isAsked);
 
 // In UTF-8, over several lines. All that a terminal could take for more than text is escaped.
+std::string JsonText(const Json& object);
 void PrintJson(const CommandRun& run, const Json& object);
 
 }  // namespace image
