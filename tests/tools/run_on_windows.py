@@ -68,6 +68,7 @@ extract 'naïf 日本 Ж.exe' 'naïf €.exe' -o some
 extract reference.exe Ж -o none
 removal reference.exe -o removal.exe --language german
 list removal.exe
+removal reference.exe -o nowhere/removal.exe
 diff reference.exe 'naïf 日本 Ж.exe'
 diff reference.exe reference.exe --json
 explain 4293967294
