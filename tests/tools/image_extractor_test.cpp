@@ -113,8 +113,7 @@ TEST_F(ImageExtractor, PutsOldFilesBackWhenItFailsHalfWay) {
   for (const char* name : {"one", "two"}) Write(name, name);
   std::vector<std::unique_ptr<image::OutputFile>> files;
   for (const char* name : {"one", "new", "two"}) {
-    files.push_back(
-        std::make_unique<image::OutputFile>(Host(name), image::FileKind::kData));
+    files.push_back(std::make_unique<image::OutputFile>(Host(name), image::FileKind::kData));
   }
   std::filesystem::remove(files.back()->Temporary());
   EXPECT_THROW(image::CommitTogether(files), image::BadInput);
