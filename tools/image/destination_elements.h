@@ -20,7 +20,8 @@ struct DestinationElement {
   bool IsInInstallDirectory() const {
     return !isFullPath && (macro == MacroNone || macro == MacroBaseDir);
   }
-  // The macros whose directories it leads to: three for that of all browsers, MacroBaseDir for none.
+  // The macros whose directories it leads to: three for that of all browsers, MacroBaseDir for
+  // none.
   std::vector<MacroCode> Macros() const;
 };
 
