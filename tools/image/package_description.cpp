@@ -131,7 +131,7 @@ class DescriptionReader {
       values_.Fault(table, "no \"source\" in this table; name a file");
       return std::nullopt;
     }
-    const std::optional<DescribedText> source = values_.ReadText(*node, "source");
+    std::optional<DescribedText> source = values_.ReadText(*node, "source");
     if (!source) return std::nullopt;
     if (source->text.empty()) {
       values_.Fault(*node, "\"source\" is empty; name a file");
