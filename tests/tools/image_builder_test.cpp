@@ -255,7 +255,7 @@ TEST_F(ImagePacking, RefusesStubsAndSourcesThatWillNotDo) {
 TEST_F(ImagePacking, TellsAllFaultsAtOnce) {
   const std::string file = "[[file]]\nsource = 'missing'\ndestination = '..'\nversion = '1'\n";
   ToolRun run = Pack("[package]\nremoval = 5\n" + Repeated(file, 12), "@a.exe");
-  ExpectRefused(run, " (and 18 more faults)\n");
+  ExpectRefused(run, " (and 18 more)\n");
   const std::string where = "moriv-image: " + Host("text.toml").string() + ':';
   std::istringstream lines(run.err);
   std::string told;

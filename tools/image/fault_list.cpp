@@ -5,7 +5,7 @@
 namespace image {
 namespace {
 
-constexpr size_t kMostFaults = 20;
+constexpr size_t kMostTold = 20;
 
 }  // namespace
 
@@ -18,24 +18,23 @@ void FaultList::Warn(int line, const std::string& what) {
 }
 
 void FaultList::ThrowIfAny() const {
-  if (faults_.empty()) return;
-  std::vector<std::string> lines = InOrder(faults_);
-  if (lines.size() > kMostFaults) {
-    const std::string more = std::to_string(lines.size() - kMostFaults);
-    lines.resize(kMostFaults);
-    lines.back() += " (and " + more + " more faults)";
-  }
-  throw BadInputs(std::move(lines));
+  if (!IsEmpty()) throw BadInputs(Told(faults_));
 }
 
 std::vector<std::string> FaultList::Warnings() const {
-  return InOrder(warnings_);
+  return Told(warnings_);
 }
 
-std::vector<std::string> FaultList::InOrder(std::vector<Remark> remarks) {
+std::vector<std::string> FaultList::Told(std::vector<Remark> remarks) {
   std::ranges::stable_sort(remarks, {}, &Remark::line);
   std::vector<std::string> texts;
-  for (Remark& remark : remarks) texts.push_back(std::move(remark.text));
+  for (Remark& remark : remarks) {
+    texts.push_back(std::move(remark.text));
+    if (texts.size() < kMostTold) continue;
+    if (const size_t more = remarks.size() - kMostTold; more > 0)
+      texts.back() += " (and " + std::to_string(more) + " more)";
+    break;
+  }
   return texts;
 }
 

@@ -22,10 +22,9 @@ class FaultList {
   // What is told and taken all the same.
   void Warn(int line, const std::string& what);
 
-  // Throws BadInputs, in the order of the lines, when there is a fault: the first twenty, the last
-  // of which says how many more there are.
+  bool IsEmpty() const { return faults_.empty(); }
+  // Throws BadInputs when there is a fault.
   void ThrowIfAny() const;
-  // In the order of the lines.
   std::vector<std::string> Warnings() const;
 
  private:
@@ -36,7 +35,8 @@ class FaultList {
     std::string text;
   };
 
-  static std::vector<std::string> InOrder(std::vector<Remark> remarks);
+  // In the order of their lines the first twenty, the last of which says how many more there are.
+  static std::vector<std::string> Told(std::vector<Remark> remarks);
 
   std::filesystem::path description_;
   std::vector<Remark> faults_;

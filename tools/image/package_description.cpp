@@ -1,16 +1,13 @@
 #include "tools/image/package_description.h"
 
-#include <toml++/toml.h>
-
 #include <algorithm>
-#include <initializer_list>
 #include <string_view>
 
 #include "tools/image/bad_input.h"
+#include "tools/image/description_values.h"
 #include "tools/image/destination_elements.h"
 #include "tools/image/host_text.h"
 #include "tools/image/input_file.h"
-#include "tools/image/record_text.h"
 #include "tools/image/source_finder.h"
 #include "tools/image/toml_nesting.h"
 
@@ -19,31 +16,23 @@ namespace {
 
 constexpr uint64_t kLargestDescription = 16u << 20;
 
-int LineOf(const toml::node& node) {
-  return static_cast<int>(node.source().begin.line);
-}
-
-std::string Quoted(std::string_view key) {
-  return '"' + std::string(key) + '"';
-}
-
 class DescriptionReader {
  public:
   DescriptionReader(const std::filesystem::path& file, const std::filesystem::path& sourceFolder,
                     FaultList* faults)
-      : faults_(*faults) {
+      : faults_(*faults), values_(faults) {
     description_.file = file;
     description_.sourceFolder = sourceFolder.empty() ? file.parent_path() : sourceFolder;
   }
 
   PackageDescription Read() {
     const toml::table root = Parse();
-    NameUnknownKeys(root, {"package", "file", "tree"});
+    values_.NameUnknownKeys(root, {"package", "file", "tree"});
     if (const toml::node* package = root.get("package")) {
       if (package->is_table()) {
         ReadPackage(*package->as_table());
       } else {
-        Fault(*package, "\"package\" is to be a table: [package]");
+        values_.Fault(*package, "\"package\" is to be a table: [package]");
       }
     }
     ReadFiles(root);
@@ -51,8 +40,6 @@ class DescriptionReader {
   }
 
  private:
-  void Fault(const toml::node& node, const std::string& what) { faults_.Add(LineOf(node), what); }
-
   toml::table Parse() const {
     const std::vector<uint8_t> bytes = ReadWholeFile(description_.file, kLargestDescription);
     const std::string text(bytes.begin(), bytes.end());
@@ -70,62 +57,23 @@ class DescriptionReader {
     }
   }
 
-  void NameUnknownKeys(const toml::table& table, std::initializer_list<std::string_view> known) {
-    for (const auto& [key, node] : table) {
-      if (std::find(known.begin(), known.end(), key.str()) != known.end()) continue;
-      std::string keys;
-      for (const std::string_view name : known)
-        keys += (keys.empty() ? "" : ", ") + std::string(name);
-      faults_.Add(static_cast<int>(key.source().begin.line),
-                  "unknown key " + Quoted(key.str()) + "; known here: " + keys);
-    }
-  }
-
-  // UTF-8, as the file has it; nullopt, with a fault told, for what is no text.
-  std::optional<DescribedText> ReadText(const toml::node& node, std::string_view key) {
-    const auto* text = node.as_string();
-    if (text == nullptr) {
-      Fault(node, Quoted(key) + " is to be a text in quotes");
-    } else if (text->get().find('\0') != std::string::npos) {
-      Fault(node, Quoted(key) + " has a NUL in it");
-    } else {
-      return DescribedText{text->get(), LineOf(node)};
-    }
-    return std::nullopt;
-  }
-
-  std::optional<DescribedText> ToAnsi(const DescribedText& utf8, std::string_view key) {
-    DescribedText ansi{"", utf8.line};
-    if (ConvertToAnsi(utf8.text, &ansi.text)) return ansi;
-    faults_.Add(utf8.line, Quoted(key) + " " + Quoted(utf8.text) +
-                               " has a character outside of code page 1252");
-    return std::nullopt;
-  }
-
-  std::optional<DescribedText> FindAnsiText(const toml::table& table, const char* key) {
-    const toml::node* node = table.get(key);
-    if (node == nullptr) return std::nullopt;
-    const std::optional<DescribedText> text = ReadText(*node, key);
-    if (!text) return std::nullopt;
-    return ToAnsi(*text, key);
-  }
-
   void ReadPackage(const toml::table& package) {
-    NameUnknownKeys(package, {"default_directory", "default_language", "space_needed", "removal"});
-    if (const auto directory = FindAnsiText(package, "default_directory")) {
+    values_.NameUnknownKeys(package,
+                            {"default_directory", "default_language", "space_needed", "removal"});
+    if (const auto directory = values_.FindAnsiText(package, "default_directory")) {
       description_.defaultDirectory = *directory;
     }
     if (const toml::node* language = package.get("default_language")) ReadLanguage(*language);
     if (const toml::node* space = package.get("space_needed")) {
       const auto* number = space->as_integer();
       if (number == nullptr || number->get() < 0 || number->get() > int64_t{UINT32_MAX}) {
-        Fault(*space, "\"space_needed\" is to be a number of bytes from 0 to 4294967295");
+        values_.Fault(*space, "\"space_needed\" is to be a number of bytes from 0 to 4294967295");
       } else {
         description_.spaceNeeded = static_cast<uint32_t>(number->get());
       }
     }
     if (const toml::node* removal = package.get("removal")) {
-      if (!removal->is_boolean()) Fault(*removal, "\"removal\" is to be true or false");
+      if (!removal->is_boolean()) values_.Fault(*removal, "\"removal\" is to be true or false");
       description_.isRemoval = removal->value_or(false);
     }
   }
@@ -136,8 +84,8 @@ class DescriptionReader {
     if (const auto* offset = node.as_integer())
       language = FindLanguage(std::to_string(offset->get()));
     if (!language) {
-      Fault(node, std::string("\"default_language\" is to be ") + kLanguageNames +
-                      ", or a language's number");
+      values_.Fault(node, std::string("\"default_language\" is to be ") + kLanguageNames +
+                              ", or a language's number");
     }
     description_.defaultLanguage = language.value_or(kNoLanguage);
   }
@@ -149,7 +97,7 @@ class DescriptionReader {
       const toml::node* node = root.get(kind);
       if (node == nullptr) continue;
       if (!node->is_array_of_tables()) {
-        Fault(*node, Quoted(kind) + " is to be written as tables: [[" + kind + "]]");
+        values_.Fault(*node, Quoted(kind) + " is to be written as tables: [[" + kind + "]]");
         continue;
       }
       for (const toml::node& table : *node->as_array())
@@ -180,16 +128,16 @@ class DescriptionReader {
   std::optional<DescribedText> FindSource(const toml::table& table) {
     const toml::node* node = table.get("source");
     if (node == nullptr) {
-      Fault(table, "no \"source\" in this table; name a file");
+      values_.Fault(table, "no \"source\" in this table; name a file");
       return std::nullopt;
     }
-    const std::optional<DescribedText> source = ReadText(*node, "source");
+    std::optional<DescribedText> source = values_.ReadText(*node, "source");
     if (!source) return std::nullopt;
     if (source->text.empty()) {
-      Fault(*node, "\"source\" is empty; name a file");
+      values_.Fault(*node, "\"source\" is empty; name a file");
     } else if (source->text.find('\\') != std::string::npos) {
-      Fault(*node,
-            "\"source\" " + Quoted(source->text) + " has a backslash; write / between folders");
+      values_.Fault(*node, "\"source\" " + Quoted(source->text) +
+                               " has a backslash; write / between folders");
     } else {
       return source;
     }
@@ -200,19 +148,20 @@ class DescriptionReader {
   std::optional<DescribedText> FindDestination(const toml::table& table) {
     const toml::node* node = table.get("destination");
     if (node == nullptr) {
-      Fault(table, "no \"destination\" in this table; say where it goes");
+      values_.Fault(table, "no \"destination\" in this table; say where it goes");
       return std::nullopt;
     }
-    if (!node->is_array()) return FindAnsiText(table, "destination");
+    if (!node->is_array()) return values_.FindAnsiText(table, "destination");
     const toml::array& list = *node->as_array();
-    if (list.empty()) Fault(*node, "\"destination\" is an empty list; say where it goes");
+    if (list.empty()) values_.Fault(*node, "\"destination\" is an empty list; say where it goes");
     DescribedText joined{"", LineOf(*node)};
     bool isGood = !list.empty();
     for (const toml::node& item : list) {
-      const std::optional<DescribedText> utf8 = ReadText(item, "destination");
-      const auto element = utf8 ? ToAnsi(*utf8, "destination") : std::nullopt;
+      const std::optional<DescribedText> utf8 = values_.ReadText(item, "destination");
+      const auto element = utf8 ? values_.ToAnsi(*utf8, "destination") : std::nullopt;
       if (element && element->text.find(';') != std::string::npos) {
-        Fault(item, "\"destination\" has a ; within an element of its list; write two elements");
+        values_.Fault(item,
+                      "\"destination\" has a ; within an element of its list; write two elements");
       }
       isGood = isGood && element && element->text.find(';') == std::string::npos;
       if (!isGood) continue;
@@ -225,13 +174,13 @@ class DescriptionReader {
   }
 
   void ReadFile(const toml::table& table) {
-    NameUnknownKeys(table, {"source", "destination", "name", "version", "language"});
+    values_.NameUnknownKeys(table, {"source", "destination", "name", "version", "language"});
     const auto source = FindSource(table);
     const auto destination = FindDestination(table);
-    const auto name = FindAnsiText(table, "name");
+    const auto name = values_.FindAnsiText(table, "name");
     FileDescription file;
-    file.version = FindAnsiText(table, "version");
-    file.language = FindAnsiText(table, "language");
+    file.version = values_.FindAnsiText(table, "version");
+    file.language = values_.FindAnsiText(table, "language");
     if (!source || !destination) return;
     file.sourceLine = source->line;
     file.destination = *destination;
@@ -241,7 +190,8 @@ class DescriptionReader {
       return;
     }
     if (table.contains("name")) {
-      Fault(*table.get("name"), "\"name\" can't go with a pattern as the source; leave it out");
+      values_.Fault(*table.get("name"),
+                    "\"name\" can't go with a pattern as the source; leave it out");
       return;
     }
     for (const std::string& found : Find(FindMatches, *source, "matches no file"))
@@ -249,7 +199,7 @@ class DescriptionReader {
   }
 
   void ReadTree(const toml::table& table) {
-    NameUnknownKeys(table, {"source", "destination"});
+    values_.NameUnknownKeys(table, {"source", "destination"});
     auto source = FindSource(table);
     const auto destination = FindDestination(table);
     if (!source || !destination) return;
@@ -281,7 +231,7 @@ class DescriptionReader {
   // Lets each element of the destination go on with a folder; false, with a fault told, for one
   // that can't stand there.
   bool GoOn(const std::string& folder, int line, FileDescription* file) {
-    std::optional<DescribedText> subpath = ToAnsi({folder, line}, "source");
+    std::optional<DescribedText> subpath = values_.ToAnsi({folder, line}, "source");
     if (!subpath) return false;
     if (subpath->text.find_first_of(";\\") != std::string::npos) {
       faults_.Add(line, "\"source\" has the folder " + Quoted(folder) +
@@ -302,7 +252,7 @@ class DescriptionReader {
   void AddFile(FileDescription file, const std::string& source) {
     file.source = PathOf(source);
     if (file.name.line == 0) {
-      const auto name = ToAnsi({TextOf(file.source.filename()), file.sourceLine}, "source");
+      const auto name = values_.ToAnsi({TextOf(file.source.filename()), file.sourceLine}, "source");
       if (!name) return;
       file.name = *name;
     }
@@ -311,6 +261,7 @@ class DescriptionReader {
 
   PackageDescription description_;
   FaultList& faults_;
+  const DescriptionValues values_;
 };
 
 }  // namespace

@@ -24,7 +24,7 @@ class RecordMaker {
     }
     for (const FileDescription& file : description_.files) AddRecord(file);
     CheckSums();
-    WarnOfPlaces();
+    if (faults_.IsEmpty()) WarnOfPlaces();
     return std::move(made_);
   }
 
