@@ -15,6 +15,7 @@ struct CommandRun {
   int status = 0;
 };
 
+inline constexpr int kWouldFail = 1;       // plan: the run would end with another code than 1
 inline constexpr int kFoundDifferent = 1;  // verify found something wrong, diff found a difference
 inline constexpr int kBadInput = 2;
 
@@ -27,5 +28,6 @@ void AddVerifyCommand(CLI::App* tool, CommandRun* run);
 void AddExtractCommand(CLI::App* tool, CommandRun* run);
 void AddRemovalCommand(CLI::App* tool, CommandRun* run);
 void AddExplainCommand(CLI::App* tool, CommandRun* run);
+void AddPlanCommand(CLI::App* tool, CommandRun* run);
 
 }  // namespace image

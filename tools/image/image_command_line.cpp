@@ -12,7 +12,8 @@ namespace image {
 namespace {
 
 constexpr auto kCommands = {AddPackCommand,    AddListCommand,    AddVerifyCommand,
-                            AddExtractCommand, AddRemovalCommand, AddExplainCommand};
+                            AddExtractCommand, AddRemovalCommand, AddExplainCommand,
+                            AddPlanCommand};
 
 // One line, whatever names the text quotes.
 void Tell(std::ostream& err, std::string text) {

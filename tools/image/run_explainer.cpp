@@ -140,6 +140,11 @@ std::string DescribeEnd(const LoggedRun& run) {
   return text;
 }
 
+std::optional<LoggedRun> ReadLastRunOf(const std::filesystem::path& log) {
+  const std::vector<uint8_t> bytes = ReadWholeFile(log, kLogLimit);
+  return ReadLastRun({reinterpret_cast<const char*>(bytes.data()), bytes.size()});
+}
+
 }  // namespace
 
 std::string ExplainExitCode(StatusCode code) {
@@ -151,13 +156,32 @@ std::string ExplainExitCode(StatusCode code) {
 }
 
 std::string ExplainLog(const std::filesystem::path& log) {
-  const std::vector<uint8_t> bytes = ReadWholeFile(log, kLogLimit);
-  const std::optional<LoggedRun> run =
-      ReadLastRun({reinterpret_cast<const char*>(bytes.data()), bytes.size()});
+  const std::optional<LoggedRun> run = ReadLastRunOf(log);
   if (!run)
     throw BadInput(
         log, "no log of the setup program: no line begins with \"" + std::string(kHeading) + "\"");
   return Line("run", run->time) + DescribeEnd(*run);
+}
+
+std::vector<std::string> ReadEventLines(const std::filesystem::path& log) {
+  std::vector<std::string> lines;
+  if (const std::optional<LoggedRun> run = ReadLastRunOf(log)) {
+    for (const LoggedEvent& event : run->events) lines.push_back(event.line);
+  }
+  return lines;
+}
+
+std::string DecidingEvent(const std::filesystem::path& log, StatusCode code) {
+  const std::optional<LoggedRun> run = ReadLastRunOf(log);
+  if (!run) return {};
+  for (const LoggedEvent& event : run->events) {
+    if (event.isFatal) return event.line;
+  }
+  for (const ClosingEvent& closing : kClosingEvents) {
+    const LoggedEvent* const event = run->Find(closing.event);
+    if (closing.code == code && event != nullptr) return event->line;
+  }
+  return {};
 }
 
 }  // namespace image

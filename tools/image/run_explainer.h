@@ -3,6 +3,7 @@
 
 #include <filesystem>
 #include <string>
+#include <vector>
 
 #include "core/status.h"
 
@@ -15,5 +16,12 @@ std::string ExplainExitCode(StatusCode code);
 // code that a silent run gives then, what it means and what to do. Throws BadInput for a file that
 // can't be read or has no run in it.
 std::string ExplainLog(const std::filesystem::path& log);
+
+// The lines of the events of its last run, without blanks at their ends.
+std::vector<std::string> ReadEventLines(const std::filesystem::path& log);
+
+// The line of the event that decided how the last run of a log ended, which it did with `code`; ""
+// when none tells it.
+std::string DecidingEvent(const std::filesystem::path& log, StatusCode code);
 
 }  // namespace image
