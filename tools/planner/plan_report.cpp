@@ -179,7 +179,7 @@ std::string ShowPlan(const RunPlan& plan) {
   std::string log, stays, deleted;
   for (const std::string& line : plan.log) log += "  " + Printable(line) + '\n';
   for (const StayingPath& stay : plan.stays) stays += Entry("", stay.reason, Quoted(stay.path));
-  for (const std::string& path : plan.deletedAtNextStart) deleted += Entry("", "", Quoted(path));
+  for (const std::string& path : plan.deletedAtNextStart) deleted += "  " + Quoted(path) + '\n';
   return ShowSettings(plan) + ShowEnd(plan) + Section("files of the package", ShowPlaces(plan)) +
          Section("drives, in bytes", ShowDrives(plan)) +
          Section("directories", ShowFiles(plan, true)) +
