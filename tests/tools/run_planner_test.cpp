@@ -23,6 +23,8 @@ struct RunPlanner : SampleBench {
     Write("pc/drive_c/Moriv/letter.txt", "mine");
     Write("full/machine.ini", "[disk C]\nfree = 10\n");
     Write("stopped/machine.ini", "[faults]\nstop = CreateDirectoryA 2\n");
+    Write("short/machine.ini", "[disk C]\nwritable = 100\n");
+    Write("short/drive_c/Program Files/Moriv/a.exe", VersionedProgram("4.1.8"));
     // Drive D: is a link out of the machine, E: one that stays in it.
     fs::create_directory(Host("outside"));
     fs::create_directories(Host("linked/drive_c/e"));
@@ -68,6 +70,9 @@ TEST_F(RunPlanner, SaysWhatARunWouldDoAndLeavesTheMachineAlone) {
       {"@image.exe --machine @full",
        1,
        {"-1000020", "Have not enough disk space", "10 free", "45056  nothing", "(left alone)"}},
+      {"@image.exe --machine @short",
+       1,
+       {"found there", "newer 4.1.8, ", "a.exe\" (deleted, and not written anew)\n"}},
       {"@image.exe --machine @stopped --json", 1, {"\"exitCode\": null,", "\"event\": \"\""}},
       {"@stub.exe", 1, {"-1000012", "Invalide or abscent install data", "Z:\\stub.exe"}},
       {"@image.exe --machine @linked --dir D:\\a", 1, {"-1000006"}},

@@ -1,8 +1,6 @@
 #include "tools/planner/plan_report.h"
 
-#include <algorithm>
 #include <cstdio>
-#include <initializer_list>
 
 #include "machine/code_page.h"
 #include "platform/text.h"
@@ -85,17 +83,21 @@ std::string ReplacedText(const PlannedPlace& place) {
   return text == "nothing" ? text : text + ", " + std::to_string(place.replacedSize);
 }
 
+// "" for what the section's heading says.
+const char* RemarkOn(const PlannedPlace& place, bool isRemoval) {
+  const bool isThere = place.replaces != "nothing";
+  if (!place.isChanged) return isRemoval && !isThere ? " (not there)" : " (left alone)";
+  return isRemoval || place.stands ? "" : " (deleted, and not written anew)";
+}
+
 std::string ShowPlaces(const RunPlan& plan) {
-  std::string text;
+  if (plan.places.empty()) return {};
+  std::string text = Entry("size", plan.isRemoval ? "deletes" : "replaces", "place");
   for (const PlannedPlace& place : plan.places) {
-    const bool isThere = place.replaces != "nothing";
-    const std::string fate = place.isChanged              ? ""
-                             : !plan.isRemoval || isThere ? " (left alone)"
-                                                          : " (not there)";
-    text += Entry(std::to_string(place.size), ReplacedText(place), Quoted(place.path) + fate);
+    text += Entry(std::to_string(place.size), ReplacedText(place),
+                  Quoted(place.path) + RemarkOn(place, plan.isRemoval));
   }
-  return text.empty() ? text
-                      : Entry("size", plan.isRemoval ? "deletes" : "replaces", "place") + text;
+  return text;
 }
 
 std::string ShowDrives(const RunPlan& plan) {

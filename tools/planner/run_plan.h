@@ -74,7 +74,7 @@ struct RunPlan {
   size_t longestLength = 0;      // in the machine's characters
 
   std::vector<DriveUse> drives = {};
-  std::vector<FileChange> files = {};  // all, also those of `places`, by their paths
+  std::vector<FileChange> files = {};  // all, also those of `places`, sorted by path
   std::vector<RegistryChange> registry = {};
 
   // Of a removal

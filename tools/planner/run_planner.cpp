@@ -159,8 +159,8 @@ class RunPlanner {
   }
 
   FileChange* FindChange(const std::string& path) {
-    const auto found = std::ranges::find(plan_.files, path, &FileChange::path);
-    return found == plan_.files.end() ? nullptr : &*found;
+    const auto found = std::ranges::lower_bound(plan_.files, path, {}, &FileChange::path);
+    return found == plan_.files.end() || found->path != path ? nullptr : &*found;
   }
 
   void FollowPlaces() {
