@@ -19,6 +19,7 @@ struct CommandRun {
   std::vector<std::string> warnings;  // lines for standard error, told when nothing is thrown
 };
 
+inline constexpr int kWouldFail = 1;       // plan: the run would end with another code than 1
 inline constexpr int kFoundDifferent = 1;  // verify found something wrong, diff found a difference
 inline constexpr int kBadInput = 2;
 

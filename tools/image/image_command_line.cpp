@@ -13,8 +13,8 @@
 namespace image {
 namespace {
 
-constexpr auto kCommands = {AddPackCommand,    AddListCommand, AddVerifyCommand, AddExtractCommand,
-                            AddRemovalCommand, AddDiffCommand, AddExplainCommand};
+constexpr auto kCommands = {AddPackCommand,    AddListCommand, AddVerifyCommand,  AddExtractCommand,
+                            AddRemovalCommand, AddDiffCommand, AddExplainCommand, AddPlanCommand};
 
 // One line, whatever names the text quotes.
 void Tell(std::ostream& err, const std::string& text) {

@@ -166,6 +166,10 @@ void ExplainEnd(const LoggedRun& run, RunExplanation* explanation) {
   }
 }
 
+std::string_view TextOf(std::span<const uint8_t> bytes) {
+  return {reinterpret_cast<const char*>(bytes.data()), bytes.size()};
+}
+
 }  // namespace
 
 RunExplanation ExplainExitCode(StatusCode code) {
@@ -178,7 +182,7 @@ RunExplanation ExplainExitCode(StatusCode code) {
 }
 
 RunExplanation ExplainLog(std::span<const uint8_t> bytes) {
-  const std::string_view text(reinterpret_cast<const char*>(bytes.data()), bytes.size());
+  const std::string_view text = TextOf(bytes);
   const std::string fault = FindLogFault(text);
   if (!fault.empty()) throw std::runtime_error(fault);
   const std::optional<LoggedRun> run = ReadLastRun(text);
@@ -224,6 +228,27 @@ Json AsJson(const RunExplanation& explanation) {
                                   {"remedy", outcome.remedy}});
   }
   return object;
+}
+
+std::vector<std::string> ReadEventLines(std::span<const uint8_t> log) {
+  std::vector<std::string> lines;
+  if (const std::optional<LoggedRun> run = ReadLastRun(TextOf(log))) {
+    for (const LoggedEvent& event : run->events) lines.push_back(event.line);
+  }
+  return lines;
+}
+
+std::string DecidingEvent(std::span<const uint8_t> log, StatusCode code) {
+  const std::optional<LoggedRun> run = ReadLastRun(TextOf(log));
+  if (!run) return {};
+  for (const LoggedEvent& event : run->events) {
+    if (event.isFatal) return event.line;
+  }
+  for (const ClosingEvent& closing : kClosingEvents) {
+    const LoggedEvent* const event = run->Find(closing.event);
+    if (closing.code == code && event != nullptr) return event->line;
+  }
+  return {};
 }
 
 }  // namespace image

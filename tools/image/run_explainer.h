@@ -33,4 +33,11 @@ RunExplanation ExplainLog(std::span<const uint8_t> bytes);
 std::string Describe(const RunExplanation& explanation);
 Json AsJson(const RunExplanation& explanation);
 
+// The lines of the events of its last run, without blanks at their ends.
+std::vector<std::string> ReadEventLines(std::span<const uint8_t> log);
+
+// The line of the event that decided how the last run of a log ended, which it did with `code`; ""
+// when none tells it.
+std::string DecidingEvent(std::span<const uint8_t> log, StatusCode code);
+
 }  // namespace image
