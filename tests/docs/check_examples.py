@@ -60,6 +60,10 @@ def prepare(package):
     at = image.index(b'PKZ', int.from_bytes(image[-528:-524], 'little'))
     image[at + 20000:at + 20002] = b'\xff\xff'
     Path('damaged').write_bytes(image)
+    subprocess.run(['build/demo/MorivSetup', '/s /r'], env=os.environ | {'MORIV_MACHINE': 'pc'},
+                   stdout=subprocess.DEVNULL)
+    Path('pc/drive_c/Program Files/Moriv/notes.txt').write_text('a foreign file')
+    Path('pc/drive_c/Program Files/Moriv/zebnet.dll').chmod(0o444)
     logs = [block for block in blocks('docs/log.md') if 'Fatal Error' in block]
     Path('MorivLog.txt').write_text('\n\n' + logs[-1], newline='\r\n')
     for name, text in {'Setup-4.1.7.exe': package, 'Setup-4.1.8.exe': newer(package)}.items():
@@ -87,7 +91,7 @@ def check_keys():
     page = (ROOT / 'docs/image-tool.md').read_text('utf-8')
     documented = set(re.findall('`(\\w+)`', page[page.index('\n## JSON'):]))
     for command in ('list damaged', 'verify damaged', 'diff Setup-4.1.7.exe Setup-4.1.8.exe',
-                    'explain MorivLog.txt'):
+                    'explain MorivLog.txt', 'plan damaged'):
         unknown = keys(json.loads(run(f'moriv-image {command} --json'))) - documented
         assert not unknown, f'{command}: {unknown}'
 
