@@ -112,8 +112,9 @@ std::string DosPathOf(const fs::path& host) {
   return path;
 }
 
-std::vector<FileChange> CompareFiles(const MachineContents& before, const MachineContents& after) {
-  std::vector<FileChange> changes;
+std::vector<FileSystemChange> CompareFiles(const MachineContents& before,
+                                           const MachineContents& after) {
+  std::vector<FileSystemChange> changes;
   ForEachDifference(before.files, after.files,
                     [&](const std::string& path, Change change, const FileFacts& facts) {
                       if (change == Change::kChanged && before.files.at(path) == facts) return;

@@ -34,7 +34,8 @@ void AgeMachineFiles();
 // The full path of a file or folder of the machine that runs, by its path on the host.
 std::string DosPathOf(const std::filesystem::path& host);
 
-std::vector<FileChange> CompareFiles(const MachineContents& before, const MachineContents& after);
+std::vector<FileSystemChange> CompareFiles(const MachineContents& before,
+                                           const MachineContents& after);
 std::vector<RegistryChange> CompareRegistry(const MachineContents& before,
                                             const MachineContents& after);
 

@@ -106,7 +106,7 @@ std::string ShowDrives(const RunPlan& plan) {
 
 std::string ShowFiles(const RunPlan& plan, bool folders) {
   std::string text;
-  for (const FileChange& change : plan.files) {
+  for (const FileSystemChange& change : plan.files) {
     if (change.path.ends_with('\\') != folders || change.role == kPackageFile) continue;
     const std::string size =
         folders || change.change == Change::kRemoved ? "" : std::to_string(change.size);
@@ -204,7 +204,7 @@ Json PlanAsJson(const RunPlan& plan) {
       {"places", ListAsJson(plan.places, PlaceAsJson)},
       {"drives", ListAsJson(plan.drives, DriveAsJson)},
       {"files", ListAsJson(plan.files,
-                           [](const FileChange& change) {
+                           [](const FileSystemChange& change) {
                              return Json{{"change", WordOf(change.change)},
                                          {"path", change.path},
                                          {"size", change.size},

@@ -26,7 +26,7 @@ struct PlannedPlace {
 
 enum class Change { kAdded, kChanged, kRemoved };
 
-struct FileChange {
+struct FileSystemChange {
   Change change = Change::kAdded;
   std::string path = {};  // a folder's ends in a backslash
   uint64_t size = 0;      // after the run
@@ -74,7 +74,7 @@ struct RunPlan {
   size_t longestLength = 0;      // in the machine's characters
 
   std::vector<DriveUse> drives = {};
-  std::vector<FileChange> files = {};  // all, also those of `places`, sorted by path
+  std::vector<FileSystemChange> files = {};  // all, also those of `places`, sorted by path
   std::vector<RegistryChange> registry = {};
 
   // Of a removal

@@ -159,8 +159,8 @@ class RunPlanner {
     return location ? location->drive : '\0';
   }
 
-  FileChange* FindChange(const std::string& path) {
-    const auto found = std::ranges::lower_bound(plan_.files, path, {}, &FileChange::path);
+  FileSystemChange* FindChange(const std::string& path) {
+    const auto found = std::ranges::lower_bound(plan_.files, path, {}, &FileSystemChange::path);
     return found == plan_.files.end() || found->path != path ? nullptr : &*found;
   }
 
@@ -168,7 +168,7 @@ class RunPlanner {
     for (size_t i = 0; i < plan_.places.size(); ++i) {
       PlannedPlace& place = plan_.places[i];
       const std::string path = Spelled(survey_.placePaths[i]);
-      FileChange* const change = FindChange(path);
+      FileSystemChange* const change = FindChange(path);
       place.isChanged = change != nullptr;
       place.stands = machine::LocateFile(survey_.placePaths[i]).has_value();
       if (change != nullptr) change->role = "file of the package";
@@ -176,10 +176,10 @@ class RunPlanner {
   }
 
   void NameFiles() {
-    if (FileChange* const program = FindChange(Spelled(survey_.removalProgram)))
+    if (FileSystemChange* const program = FindChange(Spelled(survey_.removalProgram)))
       program->role = "removal program";
     const std::string log = Spelled(survey_.log);
-    FileChange* const change = FindChange(log);
+    FileSystemChange* const change = FindChange(log);
     if (change == nullptr) return;
     change->role = "log";
     const auto file = machine::LocateFile(survey_.log);
@@ -199,7 +199,7 @@ class RunPlanner {
       bytes[installDrive] += 0;
     }
     bytes.erase(0);
-    for (const FileChange& change : plan_.files)
+    for (const FileSystemChange& change : plan_.files)
       if (change.role != "file of the package" && change.change != Change::kRemoved)
         bytes[change.path.front()] += change.size;
     for (const auto& [drive, sum] : bytes) {
@@ -212,7 +212,7 @@ class RunPlanner {
 
   void FindDeletedAtNextStart(const MachineContents& after) {
     (void)machine::Restart();
-    for (const FileChange& change : CompareFiles(after, ReadMachineContents()))
+    for (const FileSystemChange& change : CompareFiles(after, ReadMachineContents()))
       if (change.change == Change::kRemoved) plan_.deletedAtNextStart.push_back(change.path);
   }
 
