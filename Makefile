@@ -8,7 +8,7 @@ BENCH_PRESETS := bench bench-win32 bench-win64
 all: ## the setup program for Windows (32 and 64 bits) and for Linux, and the tools
 	@tools/bootstrap build
 	@tools/build win32 MorivSetup samples
-	@tools/build win64 MorivSetup
+	@tools/build win64 MorivSetup moriv-image
 	@tools/build native MorivSetup $(TOOLS)
 	@echo 'make help says what else there is.'
 

@@ -8,7 +8,7 @@ from pathlib import Path
 
 from goals import GOALS, verdict
 
-COMPILERS = ('g++', 'i686-w64-mingw32-g++-win32', 'x86_64-w64-mingw32-g++-win32')
+COMPILERS = ('g++', 'i686-w64-mingw32-g++-win32', 'x86_64-w64-mingw32-g++-posix')
 PEERS = ('libarchive13', 'libarchive-tools', 'zlib1g', 'ncompress', 'gzip', 'nsis', 'valgrind',
          'wine')
 HEADS = ['What', 'Measured', 'Half of the rounds', 'Floor', 'Goal', '']

@@ -2,6 +2,10 @@
 # as a COFF object, the native build embeds the very same bytes in the section ".moriv_res".
 #
 #   add_program_resources(TARGET FILE.rc DEPENDENCY...)
+#
+# A native program that has them without being the setup program sets MORIV_RESOURCE_SECTION to
+# another name, so that its file is not taken for one.
+set(MORIV_RESOURCE_SECTION .moriv_res)
 find_program(MORIV_WINDRES x86_64-w64-mingw32-windres REQUIRED)
 
 function(add_program_resources target source)
@@ -34,7 +38,7 @@ function(add_program_resources target source)
     set(embed ${CMAKE_CURRENT_BINARY_DIR}/${name}_res.S)
     # Written only when it differs, since all that is linked with it would be linked again.
     file(CONFIGURE OUTPUT ${embed} CONTENT
-"    .section .moriv_res,\"a\",@progbits
+"    .section ${MORIV_RESOURCE_SECTION},\"a\",@progbits
     .balign 4
     .globl moriv_resources_begin
 moriv_resources_begin:

@@ -1,14 +1,10 @@
 #include "machine/code_page.h"
 
-#include <iconv.h>
-#include <locale.h>
-#include <wctype.h>
-
 #include <array>
 #include <map>
 #include <unordered_map>
 
-#include "machine/machine.h"
+#include "machine/host_characters.h"
 
 namespace machine {
 namespace {
@@ -23,47 +19,25 @@ struct CodePage {
   std::array<unsigned char, 256> upper;
 };
 
-// The character of one byte, or the byte's own value where the code page gives it none.
-char16_t CharacterOf(iconv_t converter, unsigned char byte) {
-  if (converter == reinterpret_cast<iconv_t>(-1)) return byte;
-  iconv(converter, nullptr, nullptr, nullptr, nullptr);
-  char in = static_cast<char>(byte);
-  char* inAt = &in;
-  size_t inLeft = 1;
-  char16_t out[2] = {};
-  char* outAt = reinterpret_cast<char*>(out);
-  size_t outLeft = sizeof(out);
-  const size_t result = iconv(converter, &inAt, &inLeft, &outAt, &outLeft);
-  const bool oneUnit = result == 0 && inLeft == 0 && outLeft == sizeof(out) - sizeof(char16_t);
-  return oneUnit ? out[0] : byte;
-}
-
 CodePage MakeCodePage(int number) {
   CodePage page;
-  const iconv_t converter = iconv_open("UTF-16LE", ("CP" + std::to_string(number)).c_str());
+  page.unicode = CharactersOf(number);
   for (unsigned byte = 0; byte < 256; ++byte) {
-    const auto index = static_cast<unsigned char>(byte);
-    page.unicode[byte] = byte < 0x80 ? index : CharacterOf(converter, index);
-    page.bytes.emplace(page.unicode[byte], index);
+    page.bytes.emplace(page.unicode[byte], static_cast<unsigned char>(byte));
   }
-  if (converter != reinterpret_cast<iconv_t>(-1)) iconv_close(converter);
-
-  const locale_t locale = newlocale(LC_CTYPE_MASK, "C.UTF-8", nullptr);
   for (unsigned byte = 0; byte < 256; ++byte) {
-    const wint_t character = page.unicode[byte];
-    const wint_t upper = locale != nullptr ? towupper_l(character, locale) : towupper(character);
-    const auto found = page.bytes.find(static_cast<char32_t>(upper));
+    const auto found = page.bytes.find(ToUpperCharacter(page.unicode[byte]));
     page.upper[byte] = found != page.bytes.end() ? found->second : static_cast<unsigned char>(byte);
   }
-  if (locale != nullptr) freelocale(locale);
   return page;
 }
 
+int currentNumber = kUsualCodePage;
+
 const CodePage& CurrentCodePage() {
   static std::map<int, CodePage> pages;
-  const int number = CurrentSettings().codePage;
-  auto found = pages.find(number);
-  if (found == pages.end()) found = pages.emplace(number, MakeCodePage(number)).first;
+  auto found = pages.find(currentNumber);
+  if (found == pages.end()) found = pages.emplace(currentNumber, MakeCodePage(currentNumber)).first;
   return found->second;
 }
 
@@ -118,13 +92,17 @@ char LetterOf(const CodePage& page, char16_t character) {
   constexpr int kLastEuropeanPage = 1254;
   const bool hasLetter = character >= kFirst && character - kFirst < 0x40;
   const bool isMissing = !page.bytes.contains(character);
-  if (isMissing && hasLetter && CurrentSettings().codePage <= kLastEuropeanPage) {
+  if (isMissing && hasLetter && currentNumber <= kLastEuropeanPage) {
     return kLetters[character - kFirst];
   }
   return ByteOf(page, character);
 }
 
 }  // namespace
+
+void UseCodePage(int number) {
+  currentNumber = number;
+}
 
 std::string ToUtf8(std::string_view ansi) {
   const CodePage& page = CurrentCodePage();

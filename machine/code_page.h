@@ -1,4 +1,4 @@
-// Conversions between the machine's ANSI code page, UTF-8 (host file names, terminal) and UTF-16
+// Conversions between the ANSI code page, UTF-8 (host file names, terminal) and UTF-16
 // (resources). A byte without a meaning in the code page becomes the C1 control of its value and
 // comes back as the same byte, as on Windows; a character that the code page lacks becomes '?'.
 #pragma once
@@ -7,6 +7,11 @@
 #include <string_view>
 
 namespace machine {
+
+inline constexpr int kUsualCodePage = 1252;
+
+// All of the functions below go by this code page from now on; until then by the usual one.
+void UseCodePage(int number);
 
 std::string ToUtf8(std::string_view ansi);
 std::string FromUtf8(std::string_view utf8);

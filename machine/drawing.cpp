@@ -6,9 +6,9 @@
 #include <optional>
 #include <utility>
 
-#include "machine/executable_resources.h"
 #include "machine/faults.h"
 #include "machine/open_objects.h"
+#include "machine/own_resource.h"
 #include "machine/scripted_user.h"
 
 using machine::CallFails;

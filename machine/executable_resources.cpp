@@ -5,15 +5,9 @@
 #include <string_view>
 
 #include "machine/bounded_bytes.h"
-#include "machine/host_file.h"
+#include "machine/mapped_file.h"
 #include "machine/resource_file.h"
 #include "machine/version_block.h"
-
-// The .res bytes that the native program embeds. Weak: a program without resources links too.
-extern "C" {
-extern const uint8_t moriv_resources_begin[] __attribute__((weak));
-extern const uint8_t moriv_resources_end[] __attribute__((weak));
-}
 
 namespace machine {
 namespace {
@@ -27,7 +21,8 @@ constexpr int kVersionId = 1;
 
 constexpr uint64_t kCoffHeaderSize = 20;  // behind the 4 bytes "PE\0\0"
 constexpr uint64_t kSectionHeaderSize = 40;
-constexpr uint64_t kResourceDirectory = 2;  // index among the data directories
+constexpr uint64_t kResourceDirectory = 2;  // indices among the data directories
+constexpr uint64_t kCertificateDirectory = 4;
 constexpr uint64_t kDirectoryHeaderSize = 16;
 constexpr uint32_t kHighBit = 0x80000000;  // of an entry: named, or a directory below
 constexpr uint16_t kMagic32 = 0x10B;
@@ -39,9 +34,10 @@ class PortableExecutable {
 
   // The resource tree has three levels: type, id, language.
   std::optional<Bytes> FindResource(int type, int id) {
-    const std::optional<uint64_t> root = ResourceRoot();
-    if (!root) return std::nullopt;
-    const std::optional<Bytes> section = FromAddress(*root);
+    if (!ReadHeaders()) return std::nullopt;
+    const uint64_t root = DirectoryStart(kResourceDirectory);
+    if (!file_.good() || root == 0) return std::nullopt;
+    const std::optional<Bytes> section = FromAddress(root);
     if (!section) return std::nullopt;
     BoundedBytes tree(*section);
 
@@ -59,25 +55,42 @@ class PortableExecutable {
     return data->first(size);
   }
 
+  std::optional<ProgramExtent> FindExtent() {
+    if (!ReadHeaders()) return std::nullopt;
+    ProgramExtent extent{0, DirectoryStart(kCertificateDirectory) != 0};
+    for (uint64_t index = 0; index < sectionCount_; ++index) {
+      const uint64_t section = sections_ + index * kSectionHeaderSize;
+      extent.end = std::max<uint64_t>(extent.end,
+                                      uint64_t{file_.U32(section + 20)} + file_.U32(section + 16));
+    }
+    if (!file_.good()) return std::nullopt;
+    return extent;
+  }
+
  private:
-  // Address of the resource tree; finds the section headers on the way.
-  std::optional<uint64_t> ResourceRoot() {
-    if (file_.U16(0) != 0x5A4D) return std::nullopt;  // "MZ"
+  // Finds the section headers and the data directories; false for a file that is no program.
+  bool ReadHeaders() {
+    if (file_.U16(0) != 0x5A4D) return false;  // "MZ"
     const uint64_t header = file_.U32(0x3C);
-    if (file_.U32(header) != 0x4550) return std::nullopt;  // "PE\0\0"
+    if (file_.U32(header) != 0x4550) return false;  // "PE\0\0"
     sectionCount_ = file_.U16(header + 4 + 2);
     const uint64_t optionalSize = file_.U16(header + 4 + 16);
     const uint64_t optional = header + 4 + kCoffHeaderSize;
     sections_ = optional + optionalSize;
 
     const uint16_t magic = file_.U16(optional);
-    if (magic != kMagic32 && magic != kMagic64) return std::nullopt;
-    const uint64_t directories = magic == kMagic32 ? 96 : 112;  // behind a u32 with their count
-    if (optionalSize < directories + (kResourceDirectory + 1) * 8) return std::nullopt;
-    if (file_.U32(optional + directories - 4) <= kResourceDirectory) return std::nullopt;
-    const uint64_t address = file_.U32(optional + directories + kResourceDirectory * 8);
-    if (!file_.good() || address == 0) return std::nullopt;
-    return address;
+    if (magic != kMagic32 && magic != kMagic64) return false;
+    const uint64_t fixed = magic == kMagic32 ? 96 : 112;  // with the directories' count at its end
+    directories_ = optional + fixed;
+    directoryCount_ = optionalSize < fixed ? 0
+                                           : std::min<uint64_t>(file_.U32(directories_ - 4),
+                                                                (optionalSize - fixed) / 8);
+    return file_.good();
+  }
+
+  // Where the data of a directory is, by address or, of certificates, in the file; 0 for none.
+  uint64_t DirectoryStart(uint64_t index) {
+    return index < directoryCount_ ? file_.U32(directories_ + index * 8) : 0;
   }
 
   // The file's bytes from this address to the end of its section.
@@ -122,8 +135,10 @@ class PortableExecutable {
   }
 
   BoundedBytes file_;
-  uint64_t sections_ = 0;
+  uint64_t sections_ = 0;  // offset of their headers
   uint64_t sectionCount_ = 0;
+  uint64_t directories_ = 0;
+  uint64_t directoryCount_ = 0;
 };
 
 // ---- ELF, 64 bits, little-endian
@@ -156,25 +171,29 @@ std::optional<Bytes> FindElfSection(Bytes bytes, std::string_view name) {
   return std::nullopt;
 }
 
-std::optional<Bytes> FindResource(Bytes file, int type, int id) {
-  if (const std::optional<Bytes> section = FindElfSection(file, kNativeResourceSection)) {
-    return FindInResourceFile(*section, type, id);
-  }
-  return PortableExecutable(file).FindResource(type, id);
-}
-
 std::vector<uint8_t> Copy(Bytes bytes) {
   return {bytes.begin(), bytes.end()};
 }
 
 }  // namespace
 
+std::optional<Bytes> FindProgramResource(Bytes file, int type, int id) {
+  if (const std::optional<Bytes> section = FindElfSection(file, kNativeResourceSection)) {
+    return FindInResourceFile(*section, type, id);
+  }
+  return PortableExecutable(file).FindResource(type, id);
+}
+
+std::optional<ProgramExtent> FindProgramExtent(Bytes file) {
+  return PortableExecutable(file).FindExtent();
+}
+
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& path) {
-  return FindVersionResource(MappedHostFile(path).bytes());
+  return FindVersionResource(MappedFile(path).bytes());
 }
 
 std::optional<std::vector<uint8_t>> FindVersionResource(Bytes file) {
-  const std::optional<Bytes> resource = FindResource(file, kVersionType, kVersionId);
+  const std::optional<Bytes> resource = FindProgramResource(file, kVersionType, kVersionId);
   if (!resource || !IsVersionBlock(*resource)) return std::nullopt;
   return Copy(*resource);
 }
@@ -186,16 +205,6 @@ std::optional<std::vector<uint8_t>> QueryVersion(const std::vector<uint8_t>& res
   if (!value->isText) return Copy(Bytes(resource).subspan(value->offset, value->size));
   const std::string text = VersionText(resource, *value);
   return std::vector<uint8_t>(text.begin(), text.end());
-}
-
-std::optional<std::vector<uint8_t>> OwnResource(int type, int id) {
-  const uint8_t* begin = moriv_resources_begin;
-  const uint8_t* end = moriv_resources_end;
-  if (begin == nullptr || end == nullptr) return std::nullopt;
-  const std::optional<Bytes> data =
-      FindInResourceFile(Bytes(begin, static_cast<size_t>(end - begin)), type, id);
-  if (!data) return std::nullopt;
-  return Copy(*data);
 }
 
 }  // namespace machine

@@ -13,6 +13,20 @@ namespace machine {
 
 inline constexpr char kNativeResourceSection[] = ".moriv_res";
 
+// A resource of a file's bytes, whichever kind of executable it is, by numbers: type (5 dialog, 6
+// strings, 16 version ...), id. It lies in `file`. nullopt for a file that is none or has none.
+std::optional<std::span<const uint8_t>> FindProgramResource(std::span<const uint8_t> file, int type,
+                                                            int id);
+
+// What a Windows program has besides its sections.
+struct ProgramExtent {
+  uint64_t end = 0;  // of its last section, in the file; bytes may follow
+  bool isSigned = false;
+};
+
+// nullopt for a file that is no Windows program.
+std::optional<ProgramExtent> FindProgramExtent(std::span<const uint8_t> file);
+
 // Bytes of the file's version resource (RT_VERSION), whichever kind of executable it is. nullopt
 // for a file that is none, has none, or is damaged: every offset is checked before it is followed.
 std::optional<std::vector<uint8_t>> ReadVersionResource(const std::filesystem::path& file);
@@ -25,9 +39,5 @@ std::optional<std::vector<uint8_t>> FindVersionResource(std::span<const uint8_t>
 // "\\" (VS_FIXEDFILEINFO). Names compare without regard to case.
 std::optional<std::vector<uint8_t>> QueryVersion(const std::vector<uint8_t>& resource,
                                                  const std::string& path);
-
-// A resource by numbers in the .res bytes that this program carries: type (6 strings, 14 icon
-// group, 16 version ...), id. Language-neutral entries first. nullopt when there is none.
-std::optional<std::vector<uint8_t>> OwnResource(int type, int id);
 
 }  // namespace machine

@@ -6,7 +6,6 @@
 #include <cstdint>
 #include <filesystem>
 #include <optional>
-#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -29,21 +28,5 @@ bool ReplaceHostFile(const std::filesystem::path& file, std::string_view bytes);
 
 // Writes all of the bytes to a host's descriptor. False when the host took only part of them.
 bool WriteAt(int descriptor, std::string_view bytes, off_t position);
-
-// A regular file mapped into memory, for a reader of a few places in a large one: only the pages
-// that are looked at are read.
-class MappedHostFile {
- public:
-  explicit MappedHostFile(const std::filesystem::path& file);
-  ~MappedHostFile();
-  MappedHostFile(const MappedHostFile&) = delete;
-  MappedHostFile& operator=(const MappedHostFile&) = delete;
-
-  // Empty for an empty file and for one that is none or can't be read.
-  std::span<const uint8_t> bytes() const { return bytes_; }
-
- private:
-  std::span<const uint8_t> bytes_;
-};
 
 }  // namespace machine

@@ -28,6 +28,7 @@ void Close() {
   SetFaults({});
   ForgetOpenObjects();
   settings = Settings{};
+  UseCodePage(settings.codePage);
   machineFolder.clear();
 }
 
@@ -54,6 +55,7 @@ bool Open(const fs::path& folder, const fs::path& image, std::string* error) {
     return false;
   }
   // The file is UTF-8, and only now is it known what code page the program has.
+  UseCodePage(settings.codePage);
   settings.windowsDirectory = FromUtf8(settings.windowsDirectory);
   settings.systemDirectory = FromUtf8(settings.systemDirectory);
 

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "machine/code_page.h"
 #include "platform/win32.h"
 
 namespace machine {
@@ -34,7 +35,7 @@ struct DiskSettings {
 struct Settings {
   bool ntFamily = true;  // else the 9x family
   LANGID language = 0x0409;
-  int codePage = 1252;
+  int codePage = kUsualCodePage;
   std::string windowsDirectory = "C:\\windows";
   std::string systemDirectory = "C:\\windows\\system32";
   std::optional<SYSTEMTIME> now;  // else the real local time

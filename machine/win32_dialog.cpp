@@ -3,8 +3,8 @@
 #include <string>
 #include <utility>
 
-#include "machine/executable_resources.h"
 #include "machine/faults.h"
+#include "machine/own_resource.h"
 #include "machine/owner_drawing.h"
 #include "machine/scripted_user.h"
 #include "machine/windows.h"

@@ -9,8 +9,8 @@
 
 #include "machine/bounded_bytes.h"
 #include "machine/code_page.h"
-#include "machine/executable_resources.h"
 #include "machine/faults.h"
+#include "machine/own_resource.h"
 #include "platform/win32.h"
 
 namespace {

@@ -9,6 +9,9 @@
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static const SampleBench bench;
   const std::string text(data, data + size);
+  const bool searches = text.find_first_of("*?") != text.npos || text.find("tree") != text.npos;
+  // One that searches elsewhere could go through the whole host.
+  if (searches && (text.find('/') != text.npos || text.find("..") != text.npos)) return 0;
   bench.Write("fuzz.toml", text);
   const std::vector<std::string> before = bench.NamesIn("");
   if (bench.Pack("@fuzz.toml").status == 0) {

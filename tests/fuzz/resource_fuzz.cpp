@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "machine/dialog_template.h"
-#include "machine/executable_resources.h"
+#include "machine/own_resource.h"
 #include "machine/resource_file.h"
 #include "platform/win32.h"
 #include "tests/fuzz/fuzz_target.h"

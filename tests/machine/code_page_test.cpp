@@ -3,8 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include "machine/machine.h"
-
 namespace {
 
 using machine::EqualNoCase;
@@ -21,7 +19,7 @@ TEST(CodePage, EveryByteComesBack) {
                                                {99999, "\xC3\xA9"},
                                                {1252, "\xC3\xA9"}};
   for (const auto& [number, text] : pages) {
-    machine::CurrentSettings().codePage = number;
+    machine::UseCodePage(number);
     EXPECT_EQ(FromUtf8(ToUtf8(bytes)), bytes) << number;
     EXPECT_EQ(machine::FromUtf16(machine::ToUtf16(bytes)), bytes) << number;
     EXPECT_EQ(ToUtf8("\xE9"), text) << number;

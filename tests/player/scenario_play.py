@@ -10,6 +10,7 @@ from datetime import datetime
 import file_tree
 import log_text
 import named_pages
+import planned_runs
 import registry_text
 from good_runs import LANGUAGES, Before, checks_of
 from package_image import Image, PackedImage, damage, file_content, quoted_bytes
@@ -112,7 +113,11 @@ class _Player:
         """What does not hold, line by line; or, to accept, the checks that do."""
         files, registry = self.machine.files.snapshot(), self.machine.registry()
         dialog = self.machine.user is not None
+        plan = None
         if section.keyword == 'run':
+            program, arguments, _ = _command(section.argument)
+            if arguments and not dialog and self.machine.tells_requests:
+                plan = planned_runs.ask(self.tools.image_tool, self.machine, program, arguments)
             outcome = self._run(section)
         else:
             self.machine.restart()
@@ -124,6 +129,8 @@ class _Player:
         report = [outcome.trouble] if outcome.trouble else []
         report += [line for what in said | done for line in
                    _difference(what, said.get(what, []), done.get(what, []))]
+        if plan:
+            report += planned_runs.disagreements(plan, self.machine, outcome, files, registry)
         if section.keyword == 'run' and 'log' in done and not dialog:
             log = self.machine.files.host(LOG)
             report += log_text.misunderstood(self.tools.image_tool, log, outcome.exit_code)

@@ -73,30 +73,39 @@ inline std::string VersionResource(const std::vector<std::pair<std::string, std:
   return VersionBlock("VS_VERSION_INFO", false, fixed.size(), fixed, children);
 }
 
-// A Windows program of headers and one section, which holds the resources of one type and id in
-// the languages given, each with its own data.
+// The resources of one type and id, in languages that each have their own data.
+struct ResourceSource {
+  uint16_t type, id;
+  std::vector<std::pair<uint16_t, std::string>> languages;
+};
+
+// A Windows program of headers and one section, which holds resources of ascending types.
 //
 //   0    "MZ", at 60 the position of the PE header
 //   64   PE header, section header
-//   512  section: the three directories, the leaves, each with its data
-inline std::string PortableExecutable(
-    bool is64, uint16_t type, uint16_t id,
-    const std::vector<std::pair<uint16_t, std::string>>& languages) {
+//   512  section: the directory of types, then for each its two directories and the leaves, each
+//        with its data
+inline std::string PortableExecutable(bool is64, const std::vector<ResourceSource>& resources) {
   constexpr uint32_t kAddress = 0x1000;
   constexpr uint32_t kPosition = 512;
   constexpr uint32_t kDirectory = 0x80000000;
 
-  ByteBuilder section;
-  section.PadTo(12).U16(0).U16(1).U32(type).U32(kDirectory | 24);
-  section.PadTo(24 + 12).U16(0).U16(1).U32(id).U32(kDirectory | 48);
-  section.PadTo(48 + 12).U16(0).U16(languages.size());
-  ByteBuilder leaves;
-  for (const auto& [language, bytes] : languages) {
-    const size_t leaf = 48 + 16 + 8 * languages.size() + leaves.bytes().size();
-    section.U32(language).U32(leaf);
-    leaves.U32(kAddress + leaf + 16).U32(bytes.size()).U32(0).U32(0).Append(bytes).Align();
+  ByteBuilder types, rest;
+  types.PadTo(12).U16(0).U16(resources.size());
+  for (const auto& [type, id, languages] : resources) {
+    const size_t begin = 16 + 8 * resources.size() + rest.bytes().size();
+    types.U32(type).U32(kDirectory | begin);
+    ByteBuilder ids, leaves;
+    ids.PadTo(12).U16(0).U16(1).U32(id).U32(kDirectory | (begin + 24));
+    ids.PadTo(24 + 12).U16(0).U16(languages.size());
+    for (const auto& [language, bytes] : languages) {
+      const size_t leaf = begin + 24 + 16 + 8 * languages.size() + leaves.bytes().size();
+      ids.U32(language).U32(leaf);
+      leaves.U32(kAddress + leaf + 16).U32(bytes.size()).U32(0).U32(0).Append(bytes).Align();
+    }
+    rest.Append(ids.Append(leaves.bytes()).bytes());
   }
-  const size_t size = section.Append(leaves.bytes()).bytes().size();
+  const size_t size = types.Append(rest.bytes()).bytes().size();
 
   const size_t optional = 64 + 24;
   const size_t directories = optional + (is64 ? 112 : 96);
@@ -107,5 +116,10 @@ inline std::string PortableExecutable(
   file.U16(end - optional).U16(0).U16(is64 ? 0x20B : 0x10B).PadTo(directories - 4).U32(16);
   file.PadTo(directories + 2 * 8).U32(kAddress).U32(size);
   file.PadTo(end).Append(".rsrc").PadTo(end + 8).U32(size).U32(kAddress).U32(size).U32(kPosition);
-  return file.PadTo(kPosition).Append(section.bytes()).bytes();
+  return file.PadTo(kPosition).Append(types.bytes()).bytes();
+}
+inline std::string PortableExecutable(
+    bool is64, uint16_t type, uint16_t id,
+    const std::vector<std::pair<uint16_t, std::string>>& languages) {
+  return PortableExecutable(is64, {{type, id, languages}});
 }

@@ -44,6 +44,16 @@ inline std::string VersionedProgram(const std::string& version) {
                          : ProgramWithStrings({{"FileVersion", version}});
 }
 
+// A program that a package can go behind: with the dialog, and the log's name as text 137.
+inline std::string SetupStub(const std::string& logName = "MorivLog.txt") {
+  const std::string version = VersionResource({{"FileVersion", "1.0.0"}});
+  ByteBuilder texts;
+  texts.PadTo(137 % 16 * 2).U16(logName.size()).Wide(logName);
+  return PortableExecutable(false, {{5, 116, {{0, "dialog"}}},
+                                    {6, 137 / 16 + 1, {{0, texts.bytes()}}},
+                                    {16, 1, {{0x40C, version}}}});
+}
+
 // A text that fills a record's field has no NUL.
 template <size_t N>
 void SetField(char (&field)[N], std::string_view text) {

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "tests/tools/tool_bench.h"
+#include "tools/image/language_names.h"
 
 namespace {
 
@@ -38,7 +39,7 @@ TEST_F(ImageVerifier, FindsEachChange) {
   };
   const std::pair<std::function<void(Parts)>, const char*> rows[] = {
       {[](Parts p) { p.header.removalImageFlag = 2; }, "removalImageFlag is 2"},
-      {[](Parts p) { p.header.spaceNeeded++; }, "spaceNeeded is 48057"},
+      {[](Parts p) { p.header.spaceNeeded--; }, "spaceNeeded is 48055"},
       {[](Parts p) { p.header.packageLength--; }, "packageLength"},
       {[](Parts p) { p.header.defaultDirectory[259] = 'x'; }, "defaultDirectory"},
       {[](Parts p) { SetField(p.header.defaultDirectory, "C:\\..\\x"); }, "\"..\""},
@@ -62,7 +63,9 @@ TEST_F(ImageVerifier, FindsEachChange) {
          SetField(p.record.fileName, "a.exe");
          SetField(p.record.destination, "\\");
        },
-       "filled already"},
+       "record 1 fills already"},
+      {[](Parts p) { SetField(p.record.destination, std::string(259, ';')); },
+       "goes to one place twice"},
       {withSize(2999), "expands to more than"},
       {withSize(3001), "expands to 3000 bytes"},
       {withSize(0x80000000), "2 GiB or more"},
@@ -105,4 +108,66 @@ TEST_F(ImageVerifier, KnowsTheRulesOfRemovalPrograms) {
     piece.record.storedSize = 0;
   }
   EXPECT_TRUE(Read("removal.exe") == sample.RawBytes());
+}
+
+TEST_F(ImageVerifier, TellsWhatIsAskedForOfSeveralImages) {
+  const std::string good = Host("image.exe").string(), bad = Host("bad.exe").string();
+  sample.header().defaultLanguage = 5;
+  Write("bad.exe", sample.RawBytes());
+  const std::string wrong =
+      "wrong  header: defaultLanguage 5 is none of " + std::string(image::kLanguageNames);
+  EXPECT_EQ(Run("verify --quiet @image.exe").out, "6 parts, none wrong\n");
+  EXPECT_EQ(Run("verify --quiet @bad.exe").out, wrong + "\n6 parts, 1 wrong\n");
+  const ToolRun both = Run("verify --quiet @image.exe @bad.exe");
+  EXPECT_EQ(both.status, 1);
+  EXPECT_EQ(both.out, wrong + "  in " + bad + "\n2 images, 12 parts, 1 wrong\n");
+  ExpectRefused(Run("verify @image.exe @missing.exe"), "can't be opened");
+
+  // More than the sizes may be asked for; less than the certain places need is noted.
+  ASSERT_EQ(Pack("[package]\nspace_needed = 50000\n[[file]]\nsource = 'a.exe'\n"
+                 "destination = 'a;b'\n")
+                .status,
+            0);
+  const std::string note =
+      "note   regions: spaceNeeded is 50000, the files in all their certain "
+      "places need 90112\nok     regions\n";
+  const ToolRun run = Run("verify @new.exe");
+  EXPECT_EQ(run.status, 0);
+  EXPECT_NE(run.out.find(note), std::string::npos) << run.out;
+  EXPECT_EQ(Run("verify --quiet @new.exe").out, "4 parts, none wrong\n");
+}
+
+TEST_F(ImageVerifier, ComparesWithTheSources) {
+  const std::string against = "verify --quiet @image.exe --against @setup.toml";
+  EXPECT_EQ(Run(against).out, "6 parts, none wrong\n");
+  const std::string description = kDescription;
+  const auto with = [&description](const std::string& from, const std::string& to) {
+    return std::string(description).replace(description.find(from), from.size(), to);
+  };
+  std::string changed = Read("b.dll");
+  changed[2999] ^= 1;
+  Write("changed/b.dll", changed);
+  Write("longer/b.dll", Read("b.dll") + "x");
+  const std::pair<std::string, const char*> rows[] = {
+      {with("Moriv", "Zeb"), "header: defaultDirectory is \"C:\\Program Files\\Moriv\", the "},
+      {with("french", "german"), "header: defaultLanguage is french (10000), the"},
+      {with("\"french\"", "\"french\"\nspace_needed = 9"), "header: spaceNeeded is 48056, the"},
+      {with("\"french\"", "\"french\"\nremoval = true"), "header: it is no removal program"},
+      {with("readme.txt", "r.txt"), "record 3 \"readme.txt\": fileName is"},
+      {with("\\docs", "\\doc"), "record 3 \"readme.txt\": destination is"},
+      {with("1.2.3", "1.2.4"),
+       "record 2 \"b.dll\": the version is 1.2.3, the sources make it 1.2.4"},
+      {with("040904b0", "040704b0"), "record 2 \"b.dll\": versionLanguage is"},
+      {with("b.dll", "changed/b.dll"), "b.dll at byte 2999"},
+      {with("b.dll", "longer/b.dll"), "longer/b.dll has 3001"},
+  };
+  for (const auto& [text, said] : rows) {
+    Write("other.toml", text);
+    const ToolRun run = Run("verify --quiet @image.exe --against @other.toml");
+    EXPECT_EQ(run.status, 1) << run.err;
+    EXPECT_NE(run.out.find(said), std::string::npos) << said << ": " << run.out;
+  }
+  std::filesystem::create_directory(Host("empty"));
+  ExpectRefused(Run(against + " --source-dir @empty"), "can't be opened");
+  ExpectRefused(Run(against + " @image.exe"), "goes with one image");
 }

@@ -4,6 +4,8 @@
 
 #include "tools/image/run_explainer.h"
 
+#include <iostream>
+#include <nlohmann/json.hpp>
 #include <regex>
 
 #include "tests/support/documented_codes.h"
@@ -73,8 +75,42 @@ TEST_F(RunExplainer, JudgesTheLastRunOfALog) {
                       "exit code   -1000021 "),
             std::string::npos)
       << told;
-  Write("text", "1- Fatal Error : Cannot allocate memory . \r\n");
-  ExpectRefused(Run("explain @text"), "no log of the setup program");
+  std::string wide;
+  for (const char c : failed) wide += {c, '\0'};
+  const std::pair<std::string, const char*> rows[] = {
+      {"1- Fatal Error : Cannot allocate memory . \r\n", "no log of the setup program"},
+      {"\xFF\xFE" + wide, "UTF-16"},
+      {wide, "UTF-16"},
+      {VersionedProgram("1.0") + failed, "is a program"},
+      {"\x7F"
+       "ELF" +
+           failed,
+       "is a program"},
+  };
+  for (const auto& [text, said] : rows) {
+    Write("text", text);
+    ExpectRefused(Run("explain @text"), said);
+  }
+  // A whole one says nothing of it; a cut one, wherever it is cut.
+  EXPECT_EQ(told.find("cut short"), std::string::npos);
+  for (const size_t left : {3u, 26u, 29u, 60u, 90u}) {
+    Write("cut", removed + failed.substr(0, failed.size() - left));
+    EXPECT_NE(Run("explain @cut").out.find("log         cut short"), std::string::npos) << left;
+  }
+  std::istringstream log(failed);
+  std::streambuf* const usual = std::cin.rdbuf(log.rdbuf());
+  EXPECT_EQ(Run("explain -").out, told);
+  std::cin.rdbuf(usual);
+}
+
+TEST_F(RunExplainer, TellsWhatIsNotTheSetupPrograms) {
+  for (const char* code : {"5", "259", "740", "1223", "1602", "1618", "3010"}) {
+    const std::string told = Run(std::string("explain ") + code).out;
+    EXPECT_NE(told.find(", not the setup program's\nmeaning     "), std::string::npos) << told;
+    const auto json = nlohmann::json::parse(Run(std::string("explain --json ") + code).out);
+    EXPECT_EQ(json.at("outcomes").at(0).at("exitCode"), std::stoi(code));
+    EXPECT_EQ(json.at("outcomes").at(0).at("isForeign"), true);
+  }
 }
 
 }  // namespace

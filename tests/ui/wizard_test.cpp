@@ -4,7 +4,7 @@
 #include <cstdio>
 
 #include "machine/dialog_template.h"
-#include "machine/executable_resources.h"
+#include "machine/own_resource.h"
 #include "machine/scripted_user.h"
 #include "tests/support/product_test.h"
 #include "ui/catalog.h"

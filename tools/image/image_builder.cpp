@@ -1,166 +1,101 @@
 #include "tools/image/image_builder.h"
 
-#include <algorithm>
 #include <cstring>
-#include <map>
 
 #include "tools/image/bad_input.h"
 #include "tools/image/executable_part.h"
+#include "tools/image/host_text.h"
 #include "tools/image/image_contents.h"
+#include "tools/image/make_rule.h"
 #include "tools/image/output_file.h"
 #include "tools/image/package_description.h"
 #include "tools/image/parallel_packer.h"
 #include "tools/image/progress_bar.h"
+#include "tools/image/record_maker.h"
 #include "tools/image/record_text.h"
 #include "tools/image/stream_format.h"
 #include "tools/image/stream_packer.h"
-#include "tools/image/target_rules.h"
-#include "tools/image/version_data.h"
 
 namespace image {
 namespace {
 
-constexpr size_t kMostRecords = 0xFFFF;
-
 class ImageBuilder {
  public:
   explicit ImageBuilder(const PackOrder& order)
-      : order_(order), description_(ReadDescription(order.description)) {}
+      : order_(order),
+        faults_(order.description),
+        description_(ReadDescription(order.description, order.sourceFolder, &faults_)) {}
 
-  void Build() {
-    CheckDirectory();
-    for (const FileDescription& file : description_.files) AddRecord(file);
+  PackReport Build() {
+    made_ = MakeRecords(description_, order_.allowUnknownMacros, &faults_);
+    CheckStub();
+    CheckOutputs();
+    faults_.ThrowIfAny();
     FillHeader();
 
     const InputFile stub(order_.stub);
-    CheckStub(stub);
-    OutputFile output(order_.output, OutputFile::Kind::kProgram);
+    OutputFile output(order_.output, FileKind::kProgram);
     CopyExecutable(stub, stub.Size(), &output);
     position_ = stub.Size();
     WriteRecords(&output);
     header_.dataOffset = static_cast<uint32_t>(stub.Size());
     header_.packageLength =
-        static_cast<uint32_t>(description_.isRemoval ? records_.size() * sizeof(FileRecord)
+        static_cast<uint32_t>(description_.isRemoval ? made_.records.size() * sizeof(FileRecord)
                                                      : position_ + sizeof header_ - stub.Size());
     Advance(sizeof header_);
     output.Write(BytesOf(header_));
+    if (!order_.makeRule.empty()) WriteMakeRule();
     output.Commit();
+    return Report();
   }
 
  private:
-  [[noreturn]] void Fail(int line, const std::string& what) const {
-    throw BadInput(description_.file, line, what);
-  }
-
-  void CheckStub(const InputFile& stub) const {
-    RequireOtherFile(order_.stub, order_.output);
-    if (FindHeader(stub)) {
-      throw BadInput(order_.stub,
-                     "has a package behind it already; use the setup program as it was built");
-    }
-    if (stub.Size() > kLargestSize)
-      throw BadInput(order_.stub, "has 2 GiB or more; use a smaller file");
-    RequireVersion(order_.stub);
-  }
-
-  void CheckDirectory() const {
-    const DescribedText& directory = description_.defaultDirectory;
-    if (const auto fault = FindDirectoryFault(directory.text)) {
-      Fail(directory.line, "\"default_directory\" " + Shown(directory.text) + " " + *fault);
+  void CheckStub() {
+    try {
+      RequireSetupProgram(order_.stub);
+    } catch (const BadInput& fault) {
+      faults_.Add(fault);
     }
   }
 
-  std::filesystem::path SourceOf(const FileDescription& file) const {
-    const std::filesystem::path folder =
-        order_.sourceFolder.empty() ? order_.description.parent_path() : order_.sourceFolder;
-    return folder / file.source;
-  }
-
-  void AddRecord(const FileDescription& file) {
-    if (records_.size() == kMostRecords)
-      Fail(file.sourceLine, "more than 65535 files; leave some out");
-    CheckTexts(file);
-    FileRecord record = {};
-    record.recordSize = sizeof record;
-    if (!SetFieldText(record.fileName, file.name.text) ||
-        !SetFieldText(record.destination, file.destination.text)) {
-      Fail(file.sourceLine, "a text does not fit its field");
+  // Nothing that is written takes the place of anything that is read.
+  void CheckOutputs() {
+    for (const auto& [output, what] : {std::pair(order_.output, "the output"),
+                                       std::pair(order_.makeRule, "the file of --depfile")}) {
+      if (output.empty()) continue;
+      for (const auto& input : {order_.description, order_.stub}) {
+        if (IsSameFile(input, output))
+          faults_.Add(BadInput(output, "is the input itself; name another output"));
+      }
+      for (const FileDescription& file : description_.files) {
+        std::error_code error;  // one that isn't there can't be written over
+        if (!std::filesystem::equivalent(description_.SourceOf(file), output, error)) continue;
+        faults_.Add(file.sourceLine, "\"source\" \"" + TextOf(file.source) + "\" is " + what +
+                                         " itself; name another output");
+      }
     }
-    SetVersion(file, &record);
-    record.fileSize = static_cast<uint32_t>(SizeOfSource(file));
-    sizes_ += record.fileSize;
-    records_.push_back(record);
-  }
-
-  void CheckTexts(const FileDescription& file) {
-    const DescribedText& name = file.name;
-    const DescribedText& destination = file.destination;
-    if (const auto fault = FindNameFault(name.text)) {
-      Fail(name.line, "\"name\" " + Shown(name.text) + " " + *fault);
+    if (!order_.makeRule.empty() && IsSameFile(order_.output, order_.makeRule)) {
+      faults_.Add(BadInput(order_.makeRule, "is to be the image already; name another --depfile"));
     }
-    if (const auto fault =
-            FindDestinationFault(destination.text, name.text, description_.defaultDirectory.text,
-                                 order_.allowUnknownMacros)) {
-      Fail(destination.line, "\"destination\" " + Shown(destination.text) + " " + *fault);
-    }
-    for (const std::string& key : TargetKeys(destination.text, name.text)) {
-      const auto [other, isNew] = targets_.emplace(key, destination.line);
-      if (isNew) continue;
-      Fail(destination.line, "\"destination\" sends " + Shown(name.text) +
-                                 " to a place that line " + std::to_string(other->second) +
-                                 " fills; leave one out");
-    }
-  }
-
-  uint64_t SizeOfSource(const FileDescription& file) const {
-    const InputFile source(SourceOf(file));
-    if (source.Size() > kLargestSize)
-      throw BadInput(source.Path(), "has 2 GiB or more; use a smaller file");
-    return source.Size();
-  }
-
-  void SetVersion(const FileDescription& file, FileRecord* record) const {
-    VersionData version = ReadVersionData(SourceOf(file));
-    if (file.version) {
-      if (file.version->text.empty())
-        Fail(file.version->line, "\"version\" is empty; leave it out");
-      ParseVersion(file.version->text, version.fields);
-    }
-    if (file.language) version.language = ReadLanguage(*file.language);
-    record->versionFirst = version.fields[0];
-    record->versionSecond = version.fields[1];
-    record->versionThird = version.fields[2];
-    (void)SetFieldText(record->versionLanguage, version.language);  // 8 digits at most
-  }
-
-  std::string ReadLanguage(const DescribedText& language) const {
-    const bool isHexadecimal =
-        language.text.find_first_not_of("0123456789abcdef") == std::string::npos;
-    if (language.text.size() != 8 || !isHexadecimal) {
-      Fail(language.line, "\"language\" is to be 8 lower-case hexadecimal digits, as 040c04b0");
-    }
-    return language.text;
   }
 
   void FillHeader() {
-    if (sizes_ > kLargestSize) {
-      throw BadInput(description_.file, "the files have 2 GiB or more together; leave some out");
-    }
     header_.headerSize = sizeof header_;
     std::memcpy(header_.magic, kPackageMagic, sizeof kPackageMagic);
-    header_.recordCount = static_cast<uint16_t>(records_.size());
+    header_.recordCount = static_cast<uint16_t>(made_.records.size());
     header_.removalImageFlag = description_.isRemoval ? 1 : 0;
-    header_.spaceNeeded = description_.spaceNeeded.value_or(static_cast<uint32_t>(sizes_));
+    header_.spaceNeeded =
+        description_.spaceNeeded.value_or(static_cast<uint32_t>(made_.spaceNeeded));
     (void)SetFieldText(header_.defaultDirectory, description_.defaultDirectory.text);  // checked
     header_.defaultLanguage = description_.defaultLanguage;
   }
 
   void WriteRecords(OutputFile* output) {
-    ProgressBar progress("packing", sizes_);
-    ParallelPacker packer(description_.isRemoval ? 0 : records_.size(),
+    ProgressBar progress("packing", made_.sizes);
+    ParallelPacker packer(description_.isRemoval ? 0 : made_.records.size(),
                           [&](size_t i) { return PackSource(i, &progress); });
-    for (size_t i = 0; i < records_.size(); ++i) {
-      FileRecord& record = records_[i];
+    for (size_t i = 0; i < made_.records.size(); ++i) {
+      FileRecord& record = made_.records[i];
       std::vector<uint8_t> stream;
       if (!description_.isRemoval) stream = packer.Take(i);
       Advance(sizeof record + stream.size());
@@ -172,9 +107,9 @@ class ImageBuilder {
 
   // Called from several threads at a time, when the records are complete but for their storedSize.
   std::vector<uint8_t> PackSource(size_t i, ProgressBar* progress) const {
-    const std::filesystem::path source = SourceOf(description_.files[i]);
+    const std::filesystem::path source = description_.SourceOf(description_.files[i]);
     const std::vector<uint8_t> bytes = ReadWholeFile(source, kLargestSize);
-    if (bytes.size() != records_[i].fileSize)
+    if (bytes.size() != made_.records[i].fileSize)
       throw BadInput(source, "changed meanwhile; try again");
     return PackStream(bytes, order_.best ? kPackBest : kPackFast,
                       [progress](size_t count) { progress->Advance(count); });
@@ -187,19 +122,39 @@ class ImageBuilder {
     }
   }
 
+  void WriteMakeRule() const {
+    std::vector<std::filesystem::path> inputs = {order_.description, order_.stub};
+    for (const FileDescription& file : description_.files)
+      inputs.push_back(description_.SourceOf(file));
+    const std::string rule = MakeRule(order_.output, inputs);
+    OutputFile output(order_.makeRule, FileKind::kData);
+    output.Write({reinterpret_cast<const uint8_t*>(rule.data()), rule.size()});
+    output.Commit();
+  }
+
+  PackReport Report() const {
+    PackReport report;
+    for (const FileRecord& record : made_.records) {
+      report.files.push_back({FieldText(record.fileName), FieldText(record.destination),
+                              record.fileSize, record.storedSize});
+    }
+    report.imageSize = position_;
+    report.warnings = faults_.Warnings();
+    return report;
+  }
+
   const PackOrder& order_;
+  FaultList faults_;
   PackageDescription description_;
   PackageHeader header_ = {};
-  std::vector<FileRecord> records_;
-  std::map<std::string, int> targets_;  // key of a place to the line that fills it
-  uint64_t sizes_ = 0;                  // of all files
-  uint64_t position_ = 0;               // in the output
+  PackageRecords made_;
+  uint64_t position_ = 0;  // in the output
 };
 
 }  // namespace
 
-void PackImage(const PackOrder& order) {
-  ImageBuilder(order).Build();
+PackReport PackImage(const PackOrder& order) {
+  return ImageBuilder(order).Build();
 }
 
 }  // namespace image

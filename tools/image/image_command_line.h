@@ -6,7 +6,8 @@
 namespace image {
 
 // Does what the command line says and returns the exit status: 0, 1 when `verify` found something
-// wrong, 2 for input that can't be used, with one line on `err` that says what is wrong.
+// wrong or `diff` a difference, 2 for input that can't be used, with lines on `err` that say what
+// is wrong, one for each fault. Warnings go there too.
 int RunImageTool(int argc, const char* const* argv, std::ostream& out, std::ostream& err);
 
 }  // namespace image

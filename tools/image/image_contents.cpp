@@ -4,7 +4,6 @@
 #include <cstring>
 
 #include "tools/image/bad_input.h"
-#include "tools/image/stream_reader.h"
 
 namespace image {
 namespace {
@@ -82,16 +81,20 @@ ImageContents ReadWholeContents(const InputFile& file) {
   return contents;
 }
 
-std::string ExpandFile(const InputFile& file, const PackagedFile& packaged,
-                       const std::function<void(std::span<const uint8_t>)>& take) {
-  const uint64_t expected = packaged.record.fileSize;
-  StreamReader reader([&file, offset = packaged.StreamOffset(),
+StreamReader OpenStream(const InputFile& file, const PackagedFile& packaged) {
+  return StreamReader([&file, offset = packaged.StreamOffset(),
                        end = packaged.End()](std::span<uint8_t> bytes) mutable {
     const auto count = static_cast<size_t>(std::min<uint64_t>(bytes.size(), end - offset));
     file.Read(offset, bytes.first(count));
     offset += count;
     return count;
   });
+}
+
+std::string ExpandFile(const InputFile& file, const PackagedFile& packaged,
+                       const std::function<void(std::span<const uint8_t>)>& take) {
+  const uint64_t expected = packaged.record.fileSize;
+  StreamReader reader = OpenStream(file, packaged);
   uint64_t size = 0;
   for (auto piece = reader.Next(); !piece.empty(); piece = reader.Next()) {
     size += piece.size();

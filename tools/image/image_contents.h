@@ -11,6 +11,7 @@
 
 #include "package/package_format.h"
 #include "tools/image/input_file.h"
+#include "tools/image/stream_reader.h"
 
 namespace image {
 
@@ -44,6 +45,9 @@ ImageContents ReadContents(const InputFile& file);
 
 // The same for a use that needs them all: throws BadInput for a damaged walk too.
 ImageContents ReadWholeContents(const InputFile& file);
+
+// The stream of one record, to be expanded; `file` outlives it.
+StreamReader OpenStream(const InputFile& file, const PackagedFile& packaged);
 
 // Expands the stream of one record and hands the bytes over piece by piece, never more than the
 // record's fileSize, since some kilobytes can expand to gigabytes. Returns what is wrong with the

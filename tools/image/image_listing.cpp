@@ -2,33 +2,27 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdio>
+#include <nlohmann/json.hpp>
 #include <vector>
 
+#include "tools/image/host_text.h"
 #include "tools/image/image_contents.h"
 #include "tools/image/language_names.h"
 #include "tools/image/record_text.h"
+#include "tools/image/record_version.h"
 
 namespace image {
 namespace {
 
-constexpr size_t kColumns = 7;
+constexpr size_t kColumns = 8;
 using Row = std::array<std::string, kColumns>;
-constexpr std::array<bool, kColumns> kIsNumber = {true, true, true, true, false, false, false};
+constexpr std::array<bool, kColumns> kIsNumber = {true, true,  true,  true,
+                                                  true, false, false, false};
 
-std::string DescribeVersion(const FileRecord& record) {
-  const int16_t fields[] = {record.versionFirst, record.versionSecond, record.versionThird};
-  std::string text;
-  for (const int16_t field : fields) {
-    if (!text.empty()) text += '.';
-    text += field == kVersionNotSet ? "-" : std::to_string(field);
-  }
-  return text;
-}
-
-Row DescribeRecord(const PackagedFile& file) {
+Row DescribeRecord(size_t number, const PackagedFile& file) {
   const FileRecord& record = file.record;
-  return {std::to_string(file.offset),
+  return {std::to_string(number),
+          std::to_string(file.offset),
           std::to_string(record.fileSize),
           std::to_string(record.storedSize),
           DescribeVersion(record),
@@ -64,15 +58,29 @@ std::string Line(const std::string& label, const std::string& value) {
   return label + std::string(20 - label.size(), ' ') + value + '\n';
 }
 
+const char* KindOf(const PackageHeader& header) {
+  return header.removalImageFlag == 1 ? "removal program" : "setup image";
+}
+
 std::string DescribeHeader(const PackageHeader& header, uint64_t headerOffset) {
-  return Line("kind", header.removalImageFlag == 1 ? "removal program" : "setup image") +
-         Line("records", std::to_string(header.recordCount)) +
+  return Line("kind", KindOf(header)) + Line("records", std::to_string(header.recordCount)) +
          Line("space needed", std::to_string(header.spaceNeeded)) +
          Line("package length", std::to_string(header.packageLength)) +
          Line("executable", std::to_string(header.dataOffset)) +
          Line("header at", std::to_string(headerOffset)) +
          Line("default directory", Shown(FieldText(header.defaultDirectory))) +
          Line("default language", DescribeLanguage(header.defaultLanguage));
+}
+
+Json RecordAsJson(const PackagedFile& file) {
+  const FileRecord& record = file.record;
+  return {{"offset", file.offset},
+          {"size", record.fileSize},
+          {"stored", record.storedSize},
+          {"version", DescribeVersion(record)},
+          {"language", Utf8Text(record.versionLanguage)},
+          {"name", Utf8Text(record.fileName)},
+          {"destination", Utf8Text(record.destination)}};
 }
 
 }  // namespace
@@ -83,9 +91,28 @@ std::string ListImage(const std::filesystem::path& image) {
   std::string text = DescribeHeader(contents.header, contents.headerOffset);
   if (contents.files.empty()) return text;
   std::vector<Row> rows = {
-      {"offset", "size", "stored", "version", "language", "name", "destination"}};
-  for (const PackagedFile& packaged : contents.files) rows.push_back(DescribeRecord(packaged));
+      {"#", "offset", "size", "stored", "version", "language", "name", "destination"}};
+  for (const PackagedFile& packaged : contents.files) {
+    rows.push_back(DescribeRecord(rows.size(), packaged));
+  }
   return text + '\n' + LayOut(rows);
+}
+
+Json ListImageAsJson(const std::filesystem::path& image) {
+  const InputFile file(image);
+  const ImageContents contents = ReadWholeContents(file);
+  const PackageHeader& header = contents.header;
+  Json records = Json::array();
+  for (const PackagedFile& packaged : contents.files) records.push_back(RecordAsJson(packaged));
+  return {{"image", TextOf(image)},
+          {"kind", KindOf(header)},
+          {"spaceNeeded", header.spaceNeeded},
+          {"packageLength", header.packageLength},
+          {"executable", header.dataOffset},
+          {"headerAt", contents.headerOffset},
+          {"defaultDirectory", Utf8Text(header.defaultDirectory)},
+          {"defaultLanguage", header.defaultLanguage},
+          {"records", records}};
 }
 
 }  // namespace image

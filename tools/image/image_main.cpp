@@ -4,6 +4,6 @@
 #include "tools/image/temporary_files.h"
 
 int main(int argc, char** argv) {
-  image::DeleteTemporaryFilesOnSignal();
+  image::DeleteTemporaryFilesWhenStopped();
   return image::RunImageTool(argc, argv, std::cout, std::cerr);
 }

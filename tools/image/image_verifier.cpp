@@ -1,13 +1,15 @@
 #include "tools/image/image_verifier.h"
 
 #include <algorithm>
-#include <set>
+#include <optional>
 #include <span>
+#include <unordered_map>
 
 #include "tools/image/image_contents.h"
 #include "tools/image/language_names.h"
 #include "tools/image/progress_bar.h"
 #include "tools/image/record_text.h"
+#include "tools/image/source_comparison.h"
 #include "tools/image/stream_format.h"
 #include "tools/image/target_rules.h"
 #include "tools/image/version_data.h"
@@ -25,38 +27,51 @@ bool IsZero(std::span<const uint8_t> bytes) {
 
 class Verifier {
  public:
-  explicit Verifier(const std::filesystem::path& image) : file_(image) {}
+  Verifier(const VerifyOrder& order, const std::function<void(const Finding&)>& tell)
+      : file_(order.image), tell_(tell) {
+    if (!order.description.empty()) sources_.emplace(order.description, order.sourceFolder);
+  }
 
-  std::vector<Finding> Verify() {
+  PartCount Verify() {
     if (!FindHeader(file_)) {
-      Wrong("no package header in the last 568 bytes");
-      return std::move(findings_);
+      CheckPart("header", "", [this] { Wrong("no package header in the last 568 bytes"); });
+      return count_;
     }
     contents_ = ReadContents(file_);
     isRemoval_ = contents_.header.removalImageFlag == 1;
-    CheckPart("header", [this] { CheckHeader(); });
-    CheckPart("executable", [this] { CheckExecutable(); });
-    CheckPart("regions", [this] { CheckRegions(); });
+    CheckPart("header", "", [this] { CheckHeader(); });
+    CheckPart("executable", "", [this] { CheckExecutable(); });
+    CheckPart("regions", "", [this] { CheckRegions(); });
     ProgressBar progress("verifying", contents_.headerOffset - Position(0));
     for (size_t i = 0; i < contents_.files.size(); ++i) {
       const FileRecord& record = contents_.files[i].record;
-      subject_ = "record " + Number(i + 1) + " " + Shown(FieldText(record.fileName)) + ": ";
-      CheckPart(Number(record.storedSize) + " bytes for " + Number(record.fileSize),
-                [&] { CheckRecord(contents_.files[i]); });
+      CheckPart("record " + Number(i + 1) + " " + Shown(FieldText(record.fileName)),
+                Number(record.storedSize) + " bytes for " + Number(record.fileSize),
+                [this, i] { CheckRecord(i); });
       progress.Advance(sizeof record + record.storedSize);
     }
-    return std::move(findings_);
+    return count_;
   }
 
  private:
-  void Wrong(const std::string& text) { findings_.push_back({false, subject_ + text}); }
+  void Wrong(const std::string& text) {
+    isGood_ = false;
+    tell_({Finding::Kind::kWrong, part_, text});
+  }
+  void Note(const std::string& text) { tell_({Finding::Kind::kNote, part_, text}); }
 
   // Runs a check; one that finds nothing wrong gives a good finding.
   template <class Check>
-  void CheckPart(const std::string& name, const Check& check) {
-    const size_t before = findings_.size();
+  void CheckPart(const std::string& part, const std::string& goodText, const Check& check) {
+    part_ = part;
+    isGood_ = true;
     check();
-    if (findings_.size() == before) findings_.push_back({true, subject_ + name});
+    ++count_.parts;
+    if (isGood_) {
+      tell_({Finding::Kind::kGood, part_, goodText});
+    } else {
+      ++count_.wrong;
+    }
   }
 
   void CheckField(std::span<const char> field, const std::string& name) {
@@ -83,7 +98,8 @@ class Verifier {
       Wrong("defaultLanguage " + std::to_string(header.defaultLanguage) + " is none of " +
             kLanguageNames);
     }
-    if (!IsZero(header.reserved)) Wrong("the header's reserved bytes are not zero");
+    if (!IsZero(header.reserved)) Wrong("the reserved bytes are not zero");
+    if (sources_) sources_->CompareHeader(header, [this](const std::string& text) { Wrong(text); });
   }
 
   void CheckExecutable() {
@@ -111,40 +127,61 @@ class Verifier {
     if (header.packageLength != length) {
       Wrong("packageLength is " + Number(header.packageLength) + " instead of " + Number(length));
     }
+    CheckSpace();
+  }
+
+  // An author may ask for more than the files need, not for less.
+  void CheckSpace() {
     uint64_t sizes = 0;
-    for (const PackagedFile& packaged : contents_.files) sizes += packaged.record.fileSize;
-    if (header.spaceNeeded != sizes) {
-      Wrong("spaceNeeded is " + Number(header.spaceNeeded) + ", the files' sizes make " +
-            Number(sizes));
+    uint64_t certain = 0;
+    for (const PackagedFile& packaged : contents_.files) {
+      sizes += packaged.record.fileSize;
+      certain += packaged.record.fileSize *
+                 uint64_t{CountCertainPlaces(FieldText(packaged.record.destination))};
+    }
+    const uint64_t space = contents_.header.spaceNeeded;
+    if (space < sizes) {
+      Wrong("spaceNeeded is " + Number(space) + ", the files' sizes make " + Number(sizes));
+    } else if (space < certain && !isRemoval_) {
+      Note("spaceNeeded is " + Number(space) + ", the files in all their certain places need " +
+           Number(certain));
     }
   }
 
-  void CheckRecord(const PackagedFile& packaged) {
+  void CheckRecord(size_t index) {
+    const PackagedFile& packaged = contents_.files[index];
     const FileRecord& record = packaged.record;
     CheckField(record.fileName, "fileName");
     CheckField(record.destination, "destination");
     CheckField(record.versionLanguage, "versionLanguage");
     if (!IsZero(record.reserved)) Wrong("the reserved bytes are not zero");
-    CheckTargets(FieldText(record.fileName), FieldText(record.destination));
+    CheckTargets(index + 1, FieldText(record.fileName), FieldText(record.destination));
     CheckVersion(record);
+    const bool hasSource =
+        sources_ &&
+        sources_->CompareRecord(index, record, [this](const std::string& text) { Wrong(text); });
     if (record.fileSize > kLargestSize) {
       Wrong("fileSize " + Number(record.fileSize) + " is 2 GiB or more");
     } else {
-      CheckStream(packaged);
+      CheckStream(packaged, hasSource ? sources_->OpenSource(index) : nullptr);
     }
   }
 
-  void CheckTargets(const std::string& name, const std::string& destination) {
+  void CheckTargets(size_t number, const std::string& name, const std::string& destination) {
     if (const auto fault = FindNameFault(name)) Wrong("fileName " + Shown(name) + " " + *fault);
     // Words that are no macro are legal names; who packs is asked about them.
     if (const auto fault = FindDestinationFault(
             destination, name, FieldText(contents_.header.defaultDirectory), true)) {
       Wrong("destination " + Shown(destination) + " " + *fault);
     }
+    std::optional<size_t> filler;
     for (const std::string& key : TargetKeys(destination, name)) {
-      if (targets_.insert(key).second) continue;
-      Wrong("goes to a place that is filled already");
+      const auto [place, isNew] = fillers_.emplace(std::hash<std::string>()(key), number);
+      if (!isNew && !filler) filler = place->second;
     }
+    if (!filler) return;
+    Wrong(*filler == number ? "goes to one place twice"
+                            : "goes to a place that record " + Number(*filler) + " fills already");
   }
 
   void CheckVersion(const FileRecord& record) {
@@ -155,7 +192,7 @@ class Verifier {
     }
   }
 
-  void CheckStream(const PackagedFile& packaged) {
+  void CheckStream(const PackagedFile& packaged, const std::unique_ptr<SourceBytes>& source) {
     const FileRecord& record = packaged.record;
     if (isRemoval_) {
       if (record.storedSize != 0) {
@@ -163,22 +200,34 @@ class Verifier {
       }
       return;
     }
-    const std::string fault = ExpandFile(file_, packaged, [](std::span<const uint8_t>) {});
-    if (!fault.empty()) Wrong(fault);
+    const std::string fault =
+        ExpandFile(file_, packaged, [&source](std::span<const uint8_t> piece) {
+          if (source) source->Take(piece);
+        });
+    if (!fault.empty()) {
+      Wrong(fault);
+    } else if (source && !source->Fault().empty()) {
+      Wrong(source->Fault());
+    }
   }
 
   InputFile file_;
   ImageContents contents_;
   bool isRemoval_ = false;
-  std::string subject_;            // in front of each finding's text
-  std::set<std::string> targets_;  // keys of the places that are filled
-  std::vector<Finding> findings_;
+  std::string part_;
+  bool isGood_ = true;  // the part, as far as it has been looked at
+  PartCount count_;
+  // Digest of a place's key to the number of the record that fills it: a package of some megabytes
+  // can name millions of places.
+  std::unordered_map<size_t, size_t> fillers_;
+  std::optional<SourceComparison> sources_;
+  const std::function<void(const Finding&)>& tell_;
 };
 
 }  // namespace
 
-std::vector<Finding> VerifyImage(const std::filesystem::path& image) {
-  return Verifier(image).Verify();
+PartCount VerifyImage(const VerifyOrder& order, const std::function<void(const Finding&)>& tell) {
+  return Verifier(order, tell).Verify();
 }
 
 }  // namespace image

@@ -6,16 +6,17 @@
 #include <cstdio>
 #include <filesystem>
 #include <span>
+#include <system_error>
+
+#include "tools/image/host_files.h"
 
 namespace image {
 
 class OutputFile {
  public:
-  enum class Kind { kData, kProgram };  // a program may be executed
-
   // Throws BadInput when nothing can be written there, or when something stands under that name
   // that is no plain file.
-  OutputFile(const std::filesystem::path& target, Kind kind);
+  OutputFile(const std::filesystem::path& target, FileKind kind);
   // Without a Commit the temporary file goes.
   ~OutputFile();
   OutputFile(const OutputFile&) = delete;
@@ -32,7 +33,7 @@ class OutputFile {
   void Commit();
 
  private:
-  [[noreturn]] void Fail(int error) const;
+  [[noreturn]] void Fail(const std::error_code& error) const;
 
   std::filesystem::path target_;
   std::filesystem::path temporary_;

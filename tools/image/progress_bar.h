@@ -25,13 +25,14 @@ class ProgressBar {
   using Clock = std::chrono::steady_clock;
 
   void Draw(Clock::time_point now);
+  void Show(const std::string& line);
 
   std::mutex mutex_;  // guards what changes
   std::string task_;
   uint64_t total_;
   uint64_t done_ = 0;
   bool onTerminal_;
-  bool shown_ = false;
+  size_t shownWidth_ = 0;  // characters of the line on the terminal
   const Clock::time_point start_ = Clock::now();
   Clock::time_point nextDraw_ = start_ + std::chrono::seconds(1);
 };

@@ -1,24 +1,18 @@
 #include "tools/image/record_text.h"
 
-#include <cstdio>
-
 #include "machine/code_page.h"
+#include "tools/terminal/printable_text.h"
 
 namespace image {
 
 std::string Shown(std::string_view ansi) {
   std::string shown = "\"";
-  for (const char c : ansi) {
-    const auto byte = static_cast<unsigned char>(c);
-    if (byte < 0x20 || byte == 0x7F) {
-      char escaped[8];
-      std::snprintf(escaped, sizeof escaped, "\\x%02x", byte);
-      shown += escaped;
-    } else {
-      shown += machine::ToUtf8(std::string_view(&c, 1));
-    }
-  }
-  return shown + '"';
+  shown += terminal::Printable(machine::ToUtf8(ansi));
+  return shown += '"';
+}
+
+std::string Utf8Text(std::span<const char> field) {
+  return machine::ToUtf8(FieldText(field));
 }
 
 std::string ToUpper(std::string_view ansi) {

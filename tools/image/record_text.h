@@ -29,8 +29,11 @@ inline bool SetFieldText(std::span<char> field, std::string_view text) {
   return true;
 }
 
-// A text of the package for people: quoted, in UTF-8, each control character as \xNN.
+// A text of the package for people: quoted, in UTF-8, printable.
 std::string Shown(std::string_view ansi);
+
+// The same as it stands, in UTF-8: for JSON, which escapes for itself.
+std::string Utf8Text(std::span<const char> field);
 
 // For comparisons without regard to case.
 std::string ToUpper(std::string_view ansi);

@@ -18,7 +18,7 @@ void WriteRemovalImage(const std::filesystem::path& image, const std::filesystem
   }
   RequireVersion(image);
 
-  OutputFile removal(output, OutputFile::Kind::kProgram);
+  OutputFile removal(output, FileKind::kProgram);
   CopyExecutable(file, header.dataOffset, &removal);
   for (const PackagedFile& packaged : contents.files) {
     FileRecord record = packaged.record;

@@ -97,6 +97,34 @@ constexpr RunOutcome kOutcomes[] = {
      kNothing},
 };
 
+constexpr char kStart[] = "Start it elevated, from a local disk, by an account that may run it.";
+constexpr RunOutcome kForeignOutcomes[] = {
+    {5, "ERROR_ACCESS_DENIED",
+     "Windows refused to start the program: its file may not be run there, or a policy forbids it. "
+     "Nothing was touched.",
+     kStart, true},
+    {259, "STILL_ACTIVE",
+     "The program was still running when its exit code was asked for: it is a Windows program, and "
+     "shells don't wait for those by themselves.",
+     "Wait for its end, as the recipes in docs/deployment.md do, and ask then.", true},
+    {740, "ERROR_ELEVATION_REQUIRED",
+     "Windows refused to start the program without an administrator's rights. Nothing was touched.",
+     kStart, true},
+    {1223, "ERROR_CANCELLED",
+     "The question for an administrator's rights was answered with No. Nothing was touched.",
+     "Run it again and say Yes, or start it elevated.", true},
+    {1602, "ERROR_INSTALL_USEREXIT",
+     "A fleet tool says that the user cancelled, or put the installation off. The setup program "
+     "itself would give -1000010.",
+     "Look into the fleet tool's own log, and offer the installation again.", true},
+    {1618, "ERROR_INSTALL_ALREADY_RUNNING",
+     "A fleet tool says that another installation is running. The setup program waits for none.",
+     "Try again when the other installation is done.", true},
+    {3010, "ERROR_SUCCESS_REBOOT_REQUIRED",
+     "A fleet tool says that the machine is to be restarted. The setup program never asks for it.",
+     "Look into the fleet tool's own log for what asked for it.", true},
+};
+
 struct FatalEvent {
   uint32_t event;
   std::span<const StatusCode> codes;
@@ -138,6 +166,11 @@ std::span<const RunOutcome> RunOutcomes() {
 const RunOutcome* FindRunOutcome(StatusCode code) {
   const RunOutcome* found = std::ranges::find(kOutcomes, code, &RunOutcome::code);
   return found != std::ranges::end(kOutcomes) ? found : nullptr;
+}
+
+const RunOutcome* FindForeignOutcome(StatusCode code) {
+  const RunOutcome* found = std::ranges::find(kForeignOutcomes, code, &RunOutcome::code);
+  return found != std::ranges::end(kForeignOutcomes) ? found : nullptr;
 }
 
 std::optional<StatusCode> ParseExitCode(std::string_view text) {

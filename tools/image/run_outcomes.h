@@ -12,9 +12,10 @@ namespace image {
 
 struct RunOutcome {
   StatusCode code;
-  const char* name;     // as in core/status.h; empty for 0, which is no status
-  const char* meaning;  // sentences, as all texts here
-  const char* remedy;   // what to do
+  const char* name;        // as in core/status.h; empty for 0, which is no status
+  const char* meaning;     // sentences, as all texts here
+  const char* remedy;      // what to do
+  bool isForeign = false;  // it is another program's or Windows' own, in the setup program's place
 };
 
 // All of them, success first.
@@ -22,6 +23,10 @@ std::span<const RunOutcome> RunOutcomes();
 
 // Null for a number that no run ends with.
 const RunOutcome* FindRunOutcome(StatusCode code);
+
+// What Windows or a fleet tool gives for an exit code when the program didn't run, or isn't done.
+// Null for any other number.
+const RunOutcome* FindForeignOutcome(StatusCode code);
 
 // An exit code as tools show it: decimal, signed or as the same 32 bits unsigned, or with 0x in
 // front in hexadecimal. nullopt for a text that is no such number.

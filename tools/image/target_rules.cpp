@@ -1,11 +1,8 @@
-// A destination is a list of elements between semicolons. An element with a colon is a directory as
-// it stands; every other one is a macro, or nothing for the installation directory, and a subpath.
-
 #include "tools/image/target_rules.h"
 
 #include <algorithm>
 
-#include "engine/resolver.h"
+#include "tools/image/destination_elements.h"
 #include "tools/image/record_text.h"
 
 namespace image {
@@ -15,32 +12,14 @@ constexpr size_t kLongestPath = 259;
 constexpr size_t kLongestName = 31;
 constexpr size_t kShortestDirectory = 3;  // "C:\"
 
-struct Element {
-  MacroCode macro = MacroNone;
-  bool isFullPath = false;  // the subpath is a directory as it stands
-  std::string subpath;      // without the backslash behind the macro
-};
-
-// Every text up to a semicolon, and what is left behind the last one unless that is nothing.
-std::vector<std::string> SplitElements(std::string_view destination) {
-  std::vector<std::string> elements;
-  while (!destination.empty()) {
-    const size_t end = std::min(destination.find(';'), destination.size());
-    elements.emplace_back(destination.substr(0, end));
-    destination.remove_prefix(std::min(end + 1, destination.size()));
-  }
-  return elements;
-}
-
-Element ParseElement(const std::string& text) {
-  size_t macroLength = 0;
-  const MacroCode macro = ClassifyMacro(text.c_str(), &macroLength);
-  if (macro != MacroAllBrowsers && !IsRelativeElement(text.c_str())) {
-    return {MacroNone, true, text};
-  }
-  const bool hasBackslash = text.substr(macroLength).starts_with('\\');
-  return {macro, false, text.substr(macroLength + (hasBackslash ? 1 : 0))};
-}
+// What the setup program itself keeps in the Windows directory.
+constexpr struct {
+  std::string_view name, what;
+} kOwnFiles[] = {{"MORIVRMV.EXE", "removal program"},
+                 {"MORIVLOG.TXT", "log"},
+                 {"MORIV.INF", "list of what Windows deletes after a removal"}};
+// Where that directory is on nearly every PC.
+constexpr std::string_view kUsualWindowsDirectories[] = {"C:\\WINDOWS", "C:\\WINNT"};
 
 // Windows takes these for devices in every folder, whatever stands behind a point.
 bool IsDeviceName(std::string_view name) {
@@ -60,7 +39,7 @@ std::optional<std::string> FindPartFault(std::string_view part) {
   if (part.empty()) return "has an empty folder name; write each backslash once";
   if (part == "." || part == "..") return "has a folder " + Shown(part) + ", which leads elsewhere";
   for (const char c : part) {
-    if (static_cast<unsigned char>(c) < 0x20) return "has a control character";
+    if (static_cast<unsigned char>(c) < 0x20 || c == 0x7F) return "has a control character";
     if (std::string_view("<>\"|?*:/").find(c) != std::string_view::npos) {
       return std::string("has a ") + c + ", which no name on Windows can have";
     }
@@ -92,18 +71,17 @@ std::optional<std::string> FindFullPathFault(std::string_view path) {
   return FindPartsFault(path.substr(3));
 }
 
-// Text between two percent signs of one name, where no macro can stand.
-std::optional<std::string> FindUnknownMacro(std::string_view subpath) {
+// A percent sign where no macro can stand: alone, or with another one behind it in the same name.
+std::optional<std::string> FindPercentFault(std::string_view subpath) {
   const size_t begin = subpath.find('%');
   if (begin == std::string_view::npos) return std::nullopt;
   const size_t end = subpath.find_first_of("%\\", begin + 1);
-  if (end == std::string_view::npos) return std::nullopt;
-  if (subpath[end] == '\\') return FindUnknownMacro(subpath.substr(end));
-  return std::string(subpath.substr(begin, end - begin + 1));
-}
-
-bool IsInInstallDirectory(const Element& element) {
-  return !element.isFullPath && (element.macro == MacroNone || element.macro == MacroBaseDir);
+  const std::string mend = "; mend it, or allow unknown macros";
+  if (end == std::string_view::npos || subpath[end] == '\\') {
+    return "has a lone % in " + Shown(subpath) + ", as of a macro that was cut short" + mend;
+  }
+  return "has the word " + Shown(subpath.substr(begin, end - begin + 1)) +
+         ", which is no macro there" + mend;
 }
 
 // Length of `path` once a backslash stands behind it.
@@ -112,17 +90,38 @@ size_t LengthAsFolder(std::string_view path) {
 }
 
 // Of the path that the element makes, or of the shortest that it can make.
-size_t PathLength(const Element& element, std::string_view name,
+size_t PathLength(const DestinationElement& element, std::string_view name,
                   std::string_view defaultDirectory) {
   size_t length = LengthAsFolder(element.subpath) + name.size();
   if (!element.isFullPath) {
-    const bool hasDefault = IsInInstallDirectory(element) && !defaultDirectory.empty();
+    const bool hasDefault = element.IsInInstallDirectory() && !defaultDirectory.empty();
     length += hasDefault ? LengthAsFolder(defaultDirectory) : kShortestDirectory;
   }
   return length;
 }
 
-std::optional<std::string> FindElementFault(const Element& element) {
+std::string_view WithoutEndingBackslash(std::string_view path) {
+  return path.ends_with('\\') ? path.substr(0, path.size() - 1) : path;
+}
+
+// A file that the setup program or Windows would write over, or take for its own and delete.
+std::optional<std::string> FindOwnFileFault(const DestinationElement& element,
+                                            std::string_view name) {
+  const std::string folder = ToUpper(WithoutEndingBackslash(element.subpath));
+  const bool isInWindows = element.isFullPath
+                               ? std::ranges::find(kUsualWindowsDirectories, folder) !=
+                                     std::end(kUsualWindowsDirectories)
+                               : element.macro == MacroWindowsDir && folder.empty();
+  if (!isInWindows) return std::nullopt;
+  for (const auto& [own, what] : kOwnFiles) {
+    if (ToUpper(name) != own) continue;
+    return "sends " + Shown(name) + " to the place of the setup program's own " +
+           std::string(what) + "; name another";
+  }
+  return std::nullopt;
+}
+
+std::optional<std::string> FindElementFault(const DestinationElement& element) {
   return element.isFullPath ? FindFullPathFault(element.subpath) : FindPartsFault(element.subpath);
 }
 
@@ -153,12 +152,12 @@ std::optional<std::string> FindDestinationFault(std::string_view destination, st
     return "has " + std::to_string(destination.size()) + " characters; at most 259 fit";
   }
   for (const std::string& text : SplitElements(destination)) {
-    const Element element = ParseElement(text);
-    if (const auto word = FindUnknownMacro(element.subpath); word && !allowUnknownMacros) {
-      return "has the word " + Shown(*word) +
-             ", which is no macro there; mend it, or allow unknown macros";
+    const DestinationElement element = ParseElement(text);
+    if (!allowUnknownMacros) {
+      if (auto fault = FindPercentFault(element.subpath)) return fault;
     }
     if (auto fault = FindElementFault(element)) return fault;
+    if (auto fault = FindOwnFileFault(element, name)) return fault;
     if (PathLength(element, name, defaultDirectory) > kLongestPath) {
       return "makes a path of more than 259 characters of " + Shown(text);
     }
@@ -169,12 +168,9 @@ std::optional<std::string> FindDestinationFault(std::string_view destination, st
 std::vector<std::string> TargetKeys(std::string_view destination, std::string_view name) {
   std::vector<std::string> keys;
   for (const std::string& text : SplitElements(destination)) {
-    const Element element = ParseElement(text);
-    std::string folder = ToUpper(element.subpath);
-    if (folder.ends_with('\\')) folder.pop_back();
-    std::vector<MacroCode> macros{IsInInstallDirectory(element) ? MacroBaseDir : element.macro};
-    if (element.macro == MacroAllBrowsers) macros = {MacroNetscape, MacroExplorer, MacroOpera};
-    for (const MacroCode macro : macros) {
+    const DestinationElement element = ParseElement(text);
+    const std::string folder = ToUpper(WithoutEndingBackslash(element.subpath));
+    for (const MacroCode macro : element.Macros()) {
       keys.push_back(std::to_string(macro) + '\\' + folder + '\\' + ToUpper(name));
     }
   }

@@ -21,7 +21,8 @@ std::optional<std::string> FindDirectoryFault(std::string_view directory);
 // The same for a destination text.
 //   name                the record's file name
 //   defaultDirectory    what a path within the installation directory is taken to begin with
-//   allowUnknownMacros  lets %...% words pass that are no macro where they stand
+//   allowUnknownMacros  lets %...% words pass that are no macro where they stand, and lone % signs
+// A file in a place of the setup program's own (removal program, log, INF file) is a fault too.
 std::optional<std::string> FindDestinationFault(std::string_view destination, std::string_view name,
                                                 std::string_view defaultDirectory,
                                                 bool allowUnknownMacros);

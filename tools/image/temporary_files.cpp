@@ -1,71 +1,62 @@
 #include "tools/image/temporary_files.h"
 
-#include <unistd.h>
-
-#include <csignal>
-#include <cstdlib>
+#include <cerrno>
 #include <mutex>
+#include <random>
 #include <set>
-#include <thread>
+#include <string>
 
 namespace image {
 namespace {
 
 struct Registry {
   std::mutex mutex;
-  std::set<std::string> names;
+  std::set<std::filesystem::path> paths;
 };
 
-// Never destroyed: the thread that waits for a signal may still be there at the end of the process.
+// Never destroyed: the thread that cleans up may still be there at the end of the process.
 Registry& TheRegistry() {
   static Registry& registry = *new Registry;
   return registry;
 }
 
-[[noreturn]] void DieOf(int signal) {
-  sigset_t only;
-  sigemptyset(&only);
-  sigaddset(&only, signal);
-  std::signal(signal, SIG_DFL);
-  raise(signal);
-  pthread_sigmask(SIG_UNBLOCK, &only, nullptr);
-  std::abort();  // not reached
+std::string RandomName() {
+  constexpr char kLetters[] = "abcdefghijklmnopqrstuvwxyz0123456789";
+  std::random_device random;
+  std::uniform_int_distribution<size_t> choice(0, sizeof kLetters - 2);
+  std::string name = ".moriv-";
+  for (int i = 0; i < 6; ++i) name += kLetters[choice(random)];
+  return name;
 }
 
 }  // namespace
 
-int MakeTemporaryFile(std::string* name) {
+std::FILE* MakeTemporaryFile(const std::filesystem::path& folder, FileKind kind,
+                             std::filesystem::path* path) {
   Registry& registry = TheRegistry();
   const std::lock_guard lock(registry.mutex);
-  const int descriptor = mkstemp(name->data());
-  if (descriptor >= 0) registry.names.insert(*name);
-  return descriptor;
+  std::FILE* file = nullptr;
+  do {
+    *path = folder / RandomName();
+    file = CreateNewFile(*path, kind);
+  } while (file == nullptr && errno == EEXIST);
+  if (file != nullptr) registry.paths.insert(*path);
+  return file;
 }
 
-void ForgetTemporaryFile(const std::string& name) {
+void ForgetTemporaryFile(const std::filesystem::path& path) {
   Registry& registry = TheRegistry();
   const std::lock_guard lock(registry.mutex);
-  registry.names.erase(name);
+  registry.paths.erase(path);
 }
 
-// A thread that waits for the signal may do what a signal handler must not.
-void DeleteTemporaryFilesOnSignal() {
-  sigset_t signals;
-  sigemptyset(&signals);
-  for (const int signal : {SIGINT, SIGTERM, SIGHUP}) {
-    struct sigaction present {};
-    if (sigaction(signal, nullptr, &present) == 0 && present.sa_handler != SIG_IGN)
-      sigaddset(&signals, signal);
-  }
-  pthread_sigmask(SIG_BLOCK, &signals, nullptr);
-  std::thread([signals] {
-    int signal = 0;
-    if (sigwait(&signals, &signal) != 0) return;
+void DeleteTemporaryFilesWhenStopped() {
+  CleanUpWhenStopped([] {
     Registry& registry = TheRegistry();
-    const std::lock_guard lock(registry.mutex);  // kept to the end: no new file after this
-    for (const std::string& name : registry.names) unlink(name.c_str());
-    DieOf(signal);
-  }).detach();
+    registry.mutex.lock();  // for good: no new file after this
+    std::error_code ignored;
+    for (const std::filesystem::path& path : registry.paths) std::filesystem::remove(path, ignored);
+  });
 }
 
 }  // namespace image

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "machine/code_page.h"
+#include "tools/terminal/printable_text.h"
 
 namespace machine_tool {
 namespace {
@@ -43,7 +44,7 @@ std::string DescribeEntry(const fs::directory_entry& entry, const std::string& d
   char columns[32];
   std::snprintf(columns, sizeof columns, "%c%c %12s  ", isFile ? 'A' : ' ', isReadOnly ? 'R' : ' ',
                 DescribeSize(entry).c_str());
-  return columns + dosPath + '\n';
+  return columns + terminal::Printable(dosPath) + '\n';
 }
 
 void ShowFolder(const fs::path& folder, const std::string& dosPath, std::string* text) {

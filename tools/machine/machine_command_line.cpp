@@ -16,6 +16,7 @@
 #include "machine/host_file.h"
 #include "machine/machine.h"
 #include "tools/machine/drive_tree.h"
+#include "tools/terminal/printable_text.h"
 
 namespace machine_tool {
 namespace {
@@ -46,11 +47,11 @@ void RequireMachine(const fs::path& folder) {
   throw std::runtime_error(folder.string() + ": is no machine; make one with moriv-machine new");
 }
 
-// Code page bytes with CR LF, in UTF-8 with LF.
+// Code page bytes with CR LF, for the terminal.
 std::string ToHostText(const std::string& ansi) {
   std::string text = machine::ToUtf8(ansi);
   text.erase(std::remove(text.begin(), text.end(), '\r'), text.end());
-  return text;
+  return terminal::PrintableLines(text);
 }
 
 std::string ReadText(const fs::path& path) {
@@ -127,14 +128,18 @@ class MachineTool {
     } catch (const CLI::CallForAllHelp& help) {
       return app_.exit(help, out_, err);
     } catch (const CLI::ParseError& error) {
-      err << "moriv-machine: " << error.what() << "; see moriv-machine --help\n";
+      Tell(err, std::string(error.what()) + "; see moriv-machine --help");
     } catch (const std::exception& error) {
-      err << "moriv-machine: " << error.what() << '\n';
+      Tell(err, error.what());
     }
     return kBadInput;
   }
 
  private:
+  static void Tell(std::ostream& err, const std::string& text) {
+    err << "moriv-machine: " << terminal::Printable(text) << '\n';
+  }
+
   CLI::App* AddCommand(const char* name, const char* text) {
     CLI::App* command = app_.add_subcommand(name, text);
     command->add_option("DIR", folder_, "Folder of the machine")->required();
