@@ -20,6 +20,11 @@ struct DestinationElement {
   bool IsInInstallDirectory() const {
     return !isFullPath && (macro == MacroNone || macro == MacroBaseDir);
   }
+  // Whether every machine has the place: it may have no browser for plug-ins.
+  bool IsCertain() const {
+    return macro != MacroNetscape && macro != MacroExplorer && macro != MacroOpera &&
+           macro != MacroAllBrowsers;
+  }
   // The macros whose directories it leads to: three for that of all browsers, MacroBaseDir for
   // none.
   std::vector<MacroCode> Macros() const;

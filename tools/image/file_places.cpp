@@ -15,18 +15,15 @@ namespace {
 constexpr struct {
   MacroCode macro;
   const char* name;
-  bool isCertain;
-} kDirectories[] = {
-    {MacroBaseDir, "INSTALL_DIR", true},         {MacroWindowsDir, "REMOVE_DIR", true},
-    {MacroSystemDir, "SYS_DIR", true},           {MacroNetscape, "PLUGIN_NS_DIR", false},
-    {MacroExplorer, "PLUGIN_IE_DIR", false},     {MacroOpera, "PLUGIN_OPERA_DIR", false},
-    {MacroAllBrowsers, "PLUGIN_ALL_DIR", false},
-};
+} kDirectories[] = {{MacroBaseDir, "INSTALL_DIR"},       {MacroWindowsDir, "REMOVE_DIR"},
+                    {MacroSystemDir, "SYS_DIR"},         {MacroNetscape, "PLUGIN_NS_DIR"},
+                    {MacroExplorer, "PLUGIN_IE_DIR"},    {MacroOpera, "PLUGIN_OPERA_DIR"},
+                    {MacroAllBrowsers, "PLUGIN_ALL_DIR"}};
 
-const auto& DirectoryOf(MacroCode macro) {
+const char* DirectoryOf(MacroCode macro) {
   if (macro == MacroNone) macro = MacroBaseDir;
-  return *std::find_if(std::begin(kDirectories), std::end(kDirectories),
-                       [macro](const auto& directory) { return directory.macro == macro; });
+  return std::ranges::find(kDirectories, macro, [](const auto& entry) { return entry.macro; })
+      ->name;
 }
 
 std::string Joined(std::string folder, const std::string& name) {
@@ -36,7 +33,7 @@ std::string Joined(std::string folder, const std::string& name) {
 
 // Without a ':' no host takes it for a root.
 std::string TreeFolder(const DestinationElement& element) {
-  if (!element.isFullPath) return Joined(DirectoryOf(element.macro).name, element.subpath);
+  if (!element.isFullPath) return Joined(DirectoryOf(element.macro), element.subpath);
   std::string folder = element.subpath;
   std::erase(folder, ':');
   return ToUpper(folder.substr(0, 1)) + folder.substr(1);
@@ -53,10 +50,10 @@ std::vector<FilePlace> PlacesOf(const FileRecord& record) {
     const DestinationElement element = ParseElement(text);
     const std::string below = Joined(element.subpath, name);
     for (const MacroCode macro : element.Macros()) {
-      const auto& directory = DirectoryOf(macro);
-      const std::string root = element.isFullPath ? "" : std::string("%") + directory.name + "%\\";
-      places.push_back({keys.at(places.size()), machine::ToUtf8(root + below),
-                        element.isFullPath || directory.isCertain});
+      const std::string root =
+          element.isFullPath ? "" : std::string("%") + DirectoryOf(macro) + "%\\";
+      places.push_back(
+          {keys.at(places.size()), machine::ToUtf8(root + below), element.IsCertain()});
     }
   }
   return places;

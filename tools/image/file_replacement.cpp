@@ -54,7 +54,7 @@ class Replacement {
 
   fs::path FreeName(const fs::path& folder) {
     for (;;) {
-      const fs::path name = folder / (".moriv-old-" + std::to_string(++number_));
+      fs::path name = folder / (".moriv-old-" + std::to_string(++number_));
       if (!fs::exists(fs::symlink_status(name))) return name;
     }
   }

@@ -179,12 +179,8 @@ std::vector<std::string> TargetKeys(std::string_view destination, std::string_vi
 
 size_t CountCertainPlaces(std::string_view destination) {
   const std::vector<std::string> elements = SplitElements(destination);
-  return static_cast<size_t>(
-      std::count_if(elements.begin(), elements.end(), [](const std::string& text) {
-        const MacroCode macro = ParseElement(text).macro;
-        return macro != MacroNetscape && macro != MacroExplorer && macro != MacroOpera &&
-               macro != MacroAllBrowsers;
-      }));
+  return static_cast<size_t>(std::ranges::count_if(
+      elements, [](const std::string& text) { return ParseElement(text).IsCertain(); }));
 }
 
 }  // namespace image
