@@ -32,7 +32,8 @@ LARGEST_LIBRARY = 3_000_000
 TEXT_FILE = 1_000_000
 PEER_PACKERS = {'.Z': ('compress', '-b16', '-f', '-c'), '.gz': ('gzip', '-9', '-n', '-c')}
 
-# Package: endings. None of them gets new versions while a Debian release lasts.
+# Package: endings. Each comes with a package of tools/bootstrap, and hardly gets a new version while
+# a Debian release lasts.
 LIBRARY_PACKAGES = ('libwine', 'binutils-mingw-w64-x86-64')
 SOURCES = {'googletest': ('.cc', '.h'), 'libcli11-dev': ('.hpp',),
            'libtomlplusplus-dev': ('.h', '.inl'), 'libstdc++-12-dev': ('.h', '.tcc')}

@@ -70,7 +70,8 @@ GOALS = [
              1.5, 1),
     _at_most('time-per-file', 'Time per file of 1000 small files against `cp`', 'times', 4, None),
     _at_most('growth', 'Time per MB at {large} MB against 4 MB', 'times', 1.2, 1.05),
-    _at_most('verify-memory', 'Peak memory of `verify` for {large} MB over that for 1 MB', 'MB', 4, 1),
+    _at_most('verify-memory', 'Peak memory of `verify` for {large} MB over that for 1 MB', 'MB',
+             4, 1),
     _at_most('region', 'Executable region with all resources', 'bytes', 172_032, 155_000),
     _at_most('code', 'Executable region without resources', 'bytes', 81_000, 65_000),
 ]
@@ -89,7 +90,8 @@ class Figure:
 
 def ratio_figure(over, under, section, **more):
     """Of the rounds of two programs."""
-    return Figure(median_ratio(over, under), section, spread=middle_half(ratios(over, under)), **more)
+    return Figure(median_ratio(over, under), section, spread=middle_half(ratios(over, under)),
+                  **more)
 
 
 def middle_half(values):

@@ -10,7 +10,7 @@ from timed_runs import BenchError, Run, medians, pinned, run_once, time_in_turn
 FILES = 1000
 SIZE = 8000  # bytes of each
 CHECK, REMOVAL = 'dialog, until its page stands', 'silent removal'
-NSIS_REMOVAL = 'its removal'
+NSIS_REMOVAL = 'NSIS, removal'
 KEYS = {'install-wine-many': (OWN, NSIS), 'removal-wine-many': (REMOVAL, NSIS_REMOVAL),
         'check-wine-many': (CHECK, OWN)}
 
@@ -23,8 +23,7 @@ def measure_many_files(corpus, rounds, wine, results):
     library = (wine.build / 'versioned_library.dll').read_bytes()
     files = make_slices(WORK / 'many', corpus.content()[:FILES * (SIZE - len(library))], FILES,
                         head=library)
-    install = wine_install(files, wine, 'MorivSetup.exe')
-    runs = {OWN: install,
+    runs = {OWN: wine_install(files, wine, 'MorivSetup.exe'),
             CHECK: wine.until_page(WORK / 'MorivSetup.exe'),
             REMOVAL: Run(wine.command(r'C:\windows\MorivRmv.exe', '/s'), success=1)}
     if not wine.why_no_peer:
@@ -33,13 +32,12 @@ def measure_many_files(corpus, rounds, wine, results):
     with pinned():
         _require_work(files, runs)
         seconds = time_in_turn(runs, rounds)
-    times = medians(seconds)
     table = Table(f'{FILES} small files under Wine', f'{SIZE:,} bytes each: a library with nothing '
                   f'but a version, {len(library):,} bytes, and text behind it. In each round the '
                   f'dialog finds none of them older. Medians of {rounds} rounds.',
                   ['Program', 'Seconds', 'ms a file'],
                   [[name, f'{time:.3f}', f'{time / FILES * 1e3:.2f}']
-                   for name, time in times.items()],
+                   for name, time in medians(seconds).items()],
                   [run.text() for run in runs.values()])
     for key, (over, under) in KEYS.items():
         results.figures[key] = (

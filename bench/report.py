@@ -69,8 +69,9 @@ def document(results, corpora, quick):
              '## Corpora\n\n' + '\n'.join(map(_corpus_line, corpora)) + CORPORA_NOTE]
     for table in results.tables:
         parts.append(f'## {table.title}\n\n{table.text}\n\n'
-                     + _markdown_table(table.heads, table.rows) + '\n'
-                     + ''.join(f'    {command}\n' for command in table.commands))
+                     + _markdown_table(table.heads, table.rows))
+        if table.commands:
+            parts.append(''.join(f'    {command}\n' for command in table.commands))
         parts += [f'![{table.title}]({plot})\n' for plot in table.plots]
     return '\n'.join([*parts, AGAIN])
 

@@ -13,7 +13,8 @@ from timed_runs import Run, output_of, pinned, run_with_peak
 
 COMMANDS = ('pack', 'verify', 'diff', 'plan')
 BYTES_A_FILE = 1000
-ROUNDS, MANY_FILES, MANY_BYTES = 3, 1000, 100_000_000  # one round for a package of more
+ROUNDS = 3
+MANY_FILES, MANY_BYTES = 1000, 100_000_000  # one round for a package of more
 COST = ('Seconds, and MB of memory at the peak; on one CPU, so in one thread. The copy of a machine '
         'that `plan` works on lies in memory.')
 # Disks differ by a hundred times in what it costs to make and delete a file.
