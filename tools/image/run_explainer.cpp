@@ -121,12 +121,16 @@ std::string Hexadecimal(StatusCode code) {
   return text;
 }
 
+bool IsForeign(const RunOutcome& outcome) {
+  return FindRunOutcome(outcome.code) == nullptr;
+}
+
 std::string DescribeOutcome(const RunOutcome& outcome) {
   std::string numbers = std::to_string(outcome.code);
   if (outcome.code < 0) numbers += " = " + std::to_string(static_cast<uint32_t>(outcome.code));
   numbers += " = " + Hexadecimal(outcome.code);
   if (*outcome.name != '\0') numbers += std::string(", ") + outcome.name;
-  return Line("exit code", numbers + (outcome.isForeign ? ", not the setup program's" : "")) +
+  return Line("exit code", numbers + (IsForeign(outcome) ? ", not the setup program's" : "")) +
          Line("meaning", outcome.meaning) + Line("to do", outcome.remedy);
 }
 
@@ -223,7 +227,7 @@ Json AsJson(const RunExplanation& explanation) {
     object["outcomes"].push_back({{"exitCode", outcome.code},
                                   {"hexadecimal", Hexadecimal(outcome.code)},
                                   {"name", outcome.name},
-                                  {"isForeign", outcome.isForeign},
+                                  {"isForeign", IsForeign(outcome)},
                                   {"meaning", outcome.meaning},
                                   {"remedy", outcome.remedy}});
   }

@@ -102,27 +102,27 @@ constexpr RunOutcome kForeignOutcomes[] = {
     {5, "ERROR_ACCESS_DENIED",
      "Windows refused to start the program: its file may not be run there, or a policy forbids it. "
      "Nothing was touched.",
-     kStart, true},
+     kStart},
     {259, "STILL_ACTIVE",
      "The program was still running when its exit code was asked for: it is a Windows program, and "
      "shells don't wait for those by themselves.",
-     "Wait for its end, as the recipes in docs/deployment.md do, and ask then.", true},
+     "Wait for its end, as the recipes in docs/deployment.md do, and ask then."},
     {740, "ERROR_ELEVATION_REQUIRED",
      "Windows refused to start the program without an administrator's rights. Nothing was touched.",
-     kStart, true},
+     kStart},
     {1223, "ERROR_CANCELLED",
      "The question for an administrator's rights was answered with No. Nothing was touched.",
-     "Run it again and say Yes, or start it elevated.", true},
+     "Run it again and say Yes, or start it elevated."},
     {1602, "ERROR_INSTALL_USEREXIT",
      "A fleet tool says that the user cancelled, or put the installation off. The setup program "
      "itself would give -1000010.",
-     "Look into the fleet tool's own log, and offer the installation again.", true},
+     "Look into the fleet tool's own log, and offer the installation again."},
     {1618, "ERROR_INSTALL_ALREADY_RUNNING",
      "A fleet tool says that another installation is running. The setup program waits for none.",
-     "Try again when the other installation is done.", true},
+     "Try again when the other installation is done."},
     {3010, "ERROR_SUCCESS_REBOOT_REQUIRED",
      "A fleet tool says that the machine is to be restarted. The setup program never asks for it.",
-     "Look into the fleet tool's own log for what asked for it.", true},
+     "Look into the fleet tool's own log for what asked for it."},
 };
 
 struct FatalEvent {

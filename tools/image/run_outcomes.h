@@ -12,10 +12,9 @@ namespace image {
 
 struct RunOutcome {
   StatusCode code;
-  const char* name;        // as in core/status.h; empty for 0, which is no status
-  const char* meaning;     // sentences, as all texts here
-  const char* remedy;      // what to do
-  bool isForeign = false;  // it is another program's or Windows' own, in the setup program's place
+  const char* name;     // as in core/status.h; empty for 0, which is no status
+  const char* meaning;  // sentences, as all texts here
+  const char* remedy;   // what to do
 };
 
 // All of them, success first.
