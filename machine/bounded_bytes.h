@@ -9,6 +9,11 @@
 
 namespace machine {
 
+// The next multiple of 4, where the parts of a resource begin.
+constexpr uint64_t AlignUp(uint64_t offset) {
+  return (offset + 3) & ~uint64_t{3};
+}
+
 class BoundedBytes {
  public:
   explicit BoundedBytes(std::span<const uint8_t> bytes) : bytes_(bytes) {}

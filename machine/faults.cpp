@@ -12,7 +12,7 @@ namespace {
 
 constexpr int kStopStatus = 4;
 
-std::vector<Fault> faults;
+std::vector<Fault> currentFaults;
 std::function<void(const Fault&)> strikeObserver;
 std::map<std::string, int, std::less<>> callCounts;
 bool endsAtNextCall = false;
@@ -26,7 +26,7 @@ bool Strikes(const Fault& fault, std::string_view function, int call) {
 const Fault* CountCall(const char* function) {
   if (endsAtNextCall) _exit(kStopStatus);
   const int call = ++callCounts[function];
-  for (const Fault& fault : faults) {
+  for (const Fault& fault : currentFaults) {
     if (!Strikes(fault, function, call)) continue;
     if (strikeObserver) strikeObserver(fault);
     if (fault.stop && !fault.isShort) _exit(kStopStatus);
@@ -39,7 +39,7 @@ const Fault* CountCall(const char* function) {
 }  // namespace
 
 void SetFaults(const std::vector<Fault>& newFaults, std::function<void(const Fault&)> observer) {
-  faults = newFaults;
+  currentFaults = newFaults;
   strikeObserver = std::move(observer);
   callCounts.clear();
   endsAtNextCall = false;

@@ -17,8 +17,8 @@ constexpr char kSettingsFile[] = "machine.ini";
 constexpr char kRegistryFile[] = "registry.reg";
 constexpr char kSystemDrive[] = "drive_c";
 
-Settings settings;
-fs::path machineFolder;  // absolute; empty when no machine runs
+Settings currentSettings;
+fs::path currentFolder;  // absolute; empty when no machine runs
 
 void Close() {
   ForgetUser();
@@ -27,9 +27,9 @@ void Close() {
   CloseDrives();
   SetFaults({});
   ForgetOpenObjects();
-  settings = Settings{};
-  UseCodePage(settings.codePage);
-  machineFolder.clear();
+  currentSettings = Settings{};
+  UseCodePage(currentSettings.codePage);
+  currentFolder.clear();
 }
 
 bool MakeHostDirectory(const fs::path& directory, std::string* error) {
@@ -44,26 +44,26 @@ bool MakeHostDirectory(const fs::path& directory, std::string* error) {
 // Opens what the folder holds; a part that is missing has its defaults.
 bool Open(const fs::path& folder, const fs::path& image, std::string* error) {
   std::error_code failure;
-  machineFolder = fs::canonical(folder, failure);
+  currentFolder = fs::canonical(folder, failure);
   if (failure) {
     *error = folder.string() + ": " + failure.message();
     return false;
   }
 
-  if (!ReadSettings(machineFolder / kSettingsFile, &settings, error)) {
-    *error = (machineFolder / *error).string();
+  if (!ReadSettings(currentFolder / kSettingsFile, &currentSettings, error)) {
+    *error = (currentFolder / *error).string();
     return false;
   }
   // The file is UTF-8, and only now is it known what code page the program has.
-  UseCodePage(settings.codePage);
-  settings.windowsDirectory = FromUtf8(settings.windowsDirectory);
-  settings.systemDirectory = FromUtf8(settings.systemDirectory);
+  UseCodePage(currentSettings.codePage);
+  currentSettings.windowsDirectory = FromUtf8(currentSettings.windowsDirectory);
+  currentSettings.systemDirectory = FromUtf8(currentSettings.systemDirectory);
 
-  if (!LoadRegistry(machineFolder / kRegistryFile, error)) {
-    *error = (machineFolder / *error).string();
+  if (!LoadRegistry(currentFolder / kRegistryFile, error)) {
+    *error = (currentFolder / *error).string();
     return false;
   }
-  OpenDrives(machineFolder, image);
+  OpenDrives(currentFolder, image);
   return true;
 }
 
@@ -81,17 +81,17 @@ void MakeDirectories(const std::string& dosPath) {
 
 bool IsFresh() {
   std::error_code failure;
-  return !fs::exists(machineFolder / kRegistryFile, failure) ||
-         !fs::exists(machineFolder / kSystemDrive, failure);
+  return !fs::exists(currentFolder / kRegistryFile, failure) ||
+         !fs::exists(currentFolder / kSystemDrive, failure);
 }
 
 bool Furnish(std::string* error) {
-  if (!MakeHostDirectory(machineFolder / kSystemDrive, error)) return false;
-  MakeDirectories(settings.windowsDirectory);
-  MakeDirectories(settings.systemDirectory);
+  if (!MakeHostDirectory(currentFolder / kSystemDrive, error)) return false;
+  MakeDirectories(currentSettings.windowsDirectory);
+  MakeDirectories(currentSettings.systemDirectory);
   MakeDirectories("C:\\Program Files");
   std::error_code failure;
-  if (!fs::exists(machineFolder / kRegistryFile, failure)) SaveRegistry();
+  if (!fs::exists(currentFolder / kRegistryFile, failure)) SaveRegistry();
   return true;
 }
 
@@ -103,7 +103,7 @@ bool Start(const fs::path& folder, const fs::path& image, std::string* error) {
     Close();
     return false;
   }
-  SetFaults(settings.faults);
+  SetFaults(currentSettings.faults);
   return true;
 }
 
@@ -120,11 +120,11 @@ std::string Stop() {
 }
 
 Settings& CurrentSettings() {
-  return settings;
+  return currentSettings;
 }
 
 const fs::path& Folder() {
-  return machineFolder;
+  return currentFolder;
 }
 
 bool MakeFresh(const fs::path& folder, std::string* error) {

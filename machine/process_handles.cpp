@@ -8,12 +8,12 @@ namespace machine {
 namespace {
 
 std::set<HANDLE> openHandles;
-uintptr_t lastHandle = 0x30000;  // above the numbers of open files
+uintptr_t lastProcessHandle = 0x30000;  // above the numbers of open files
 
 }  // namespace
 
 HANDLE OpenProcessHandle() {
-  const HANDLE handle = reinterpret_cast<HANDLE>(lastHandle += 4);
+  const HANDLE handle = reinterpret_cast<HANDLE>(lastProcessHandle += 4);
   openHandles.insert(handle);
   ObjectOpened(ObjectKind::kProcess);
   return handle;

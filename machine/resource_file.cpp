@@ -15,10 +15,6 @@ constexpr uint64_t kHeaderStart = 8;
 constexpr uint64_t kLanguageOffset = 6;
 constexpr uint16_t kNumberMark = 0xFFFF;
 
-uint64_t AlignUp(uint64_t offset) {
-  return (offset + 3) & ~uint64_t{3};
-}
-
 // Reads a type or name and moves `offset` behind it. -1 for one that is a text.
 int TakeNumber(BoundedBytes& file, uint64_t* offset) {
   const uint16_t first = file.U16(*offset);

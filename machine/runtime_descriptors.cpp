@@ -29,7 +29,7 @@ OpenFile* FileOf(int descriptor) {
 int OpenDescriptor(const char* name, const OpenMode& mode, bool text) {
   if (name == nullptr) return -1;
   const int descriptor = machine::OpenProgramFile(ObjectKind::kDescriptor, name, mode);
-  if (descriptor >= 0) FileOf(descriptor)->text = text;
+  if (OpenFile* const file = FileOf(descriptor)) file->text = text;
   return descriptor;
 }
 

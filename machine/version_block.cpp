@@ -20,10 +20,6 @@ struct Block {
   size_t firstChild = 0;
 };
 
-size_t AlignUp(size_t offset) {
-  return (offset + 3) & ~size_t{3};
-}
-
 // The UTF-16 text that ends at a NUL or at `end`, whichever comes first.
 std::u16string TextAt(Bytes bytes, size_t offset, size_t end) {
   BoundedBytes resource(bytes);

@@ -45,7 +45,7 @@ OpenFile* FileOf(HANDLE handle) {
   return machine::FindOpenFile(NumberOf(handle), ObjectKind::kFile);
 }
 
-std::string_view TextOf(LPCSTR text) {
+std::string_view PathOf(LPCSTR text) {
   return text == nullptr ? "" : text;
 }
 
@@ -100,7 +100,7 @@ HANDLE CreateFileA(LPCSTR name, DWORD access, DWORD share, LPSECURITY_ATTRIBUTES
   mode.share = share & kShareAll;
   mode.create = disposition == CREATE_ALWAYS;
   mode.readOnly = mode.create && (flags & FILE_ATTRIBUTE_READONLY) != 0;
-  const int number = machine::OpenProgramFile(ObjectKind::kFile, TextOf(name), mode);
+  const int number = machine::OpenProgramFile(ObjectKind::kFile, PathOf(name), mode);
   return number < 0 ? INVALID_HANDLE_VALUE : HandleOf(number);
 }
 
@@ -162,7 +162,7 @@ BOOL CloseHandle(HANDLE handle) {
 
 BOOL DeleteFileA(LPCSTR name) {
   if (CallFails("DeleteFileA")) return FALSE;
-  const auto location = Locate(TextOf(name));
+  const auto location = Locate(PathOf(name));
   if (!location || !location->exists || location->isDirectory) return FALSE;
   if (IsReadOnlyDrive(location->drive) || location->isReadOnly) return FALSE;
   if (machine::IsHeldOpen(*location)) return FALSE;
@@ -171,16 +171,16 @@ BOOL DeleteFileA(LPCSTR name) {
 
 BOOL CopyFileA(LPCSTR from, LPCSTR to, BOOL failIfExists) {
   if (CallFails("CopyFileA")) return FALSE;
-  const auto fromLocation = Locate(TextOf(from));
-  const auto toLocation = Locate(TextOf(to));
+  const auto fromLocation = Locate(PathOf(from));
+  const auto toLocation = Locate(PathOf(to));
   if (!fromLocation || !toLocation || (failIfExists && toLocation->exists)) return FALSE;
 
   const int source = machine::OpenProgramFile(
-      ObjectKind::kFile, TextOf(from),
+      ObjectKind::kFile, PathOf(from),
       {.access = machine::kRead, .share = machine::kRead | machine::kWrite});
   if (source < 0) return FALSE;
   // A file copied onto itself is refused here: the target is opened for this copy alone.
-  const int target = machine::OpenProgramFile(ObjectKind::kFile, TextOf(to),
+  const int target = machine::OpenProgramFile(ObjectKind::kFile, PathOf(to),
                                               {.access = machine::kWrite, .create = true});
   const bool copied = target >= 0 && FillTarget(source, target, *fromLocation, *toLocation);
   if (target >= 0) machine::CloseOpenFile(target, ObjectKind::kFile);
@@ -190,7 +190,7 @@ BOOL CopyFileA(LPCSTR from, LPCSTR to, BOOL failIfExists) {
 
 BOOL CreateDirectoryA(LPCSTR name, LPSECURITY_ATTRIBUTES) {
   if (CallFails("CreateDirectoryA")) return FALSE;
-  const auto location = Locate(TextOf(name));
+  const auto location = Locate(PathOf(name));
   if (!location || location->exists || !location->parentExists) return FALSE;
   if (location->dosLength >= kDirectoryPathLimit || IsReadOnlyDrive(location->drive)) return FALSE;
   std::error_code error;
@@ -199,7 +199,7 @@ BOOL CreateDirectoryA(LPCSTR name, LPSECURITY_ATTRIBUTES) {
 
 BOOL RemoveDirectoryA(LPCSTR name) {
   if (CallFails("RemoveDirectoryA")) return FALSE;
-  const auto location = Locate(TextOf(name));
+  const auto location = Locate(PathOf(name));
   if (!location || location->isRoot || !location->isDirectory) return FALSE;
   if (IsReadOnlyDrive(location->drive) || location->isReadOnly) return FALSE;
   // The host refuses a directory with anything in it.
@@ -209,8 +209,8 @@ BOOL RemoveDirectoryA(LPCSTR name) {
 
 DWORD GetFileAttributesA(LPCSTR name) {
   if (CallFails("GetFileAttributesA")) return INVALID_FILE_ATTRIBUTES;
-  if (machine::IsDevicePath(TextOf(name))) return FILE_ATTRIBUTE_ARCHIVE;
-  const auto location = Locate(TextOf(name));
+  if (machine::IsDevicePath(PathOf(name))) return FILE_ATTRIBUTE_ARCHIVE;
+  const auto location = Locate(PathOf(name));
   if (!location || !location->exists) return INVALID_FILE_ATTRIBUTES;
   if (location->isRoot) return FILE_ATTRIBUTE_DIRECTORY;
   const DWORD kind = location->isDirectory ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_ARCHIVE;

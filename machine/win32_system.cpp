@@ -112,9 +112,9 @@ HGLOBAL GlobalAlloc(UINT flags, SIZE_T size) {
     if (block.bytes == nullptr) return nullptr;
     std::memset(block.bytes.get(), (flags & kZeroed) != 0 ? 0 : kUnsetByte, size);
   }
-  static uintptr_t lastHandle = 0;
+  static uintptr_t lastMemoryHandle = 0;
   const HGLOBAL handle =
-      block.isMovable ? reinterpret_cast<HGLOBAL>(lastHandle += 4) : block.bytes.get();
+      block.isMovable ? reinterpret_cast<HGLOBAL>(lastMemoryHandle += 4) : block.bytes.get();
   memoryBlocks[handle] = std::move(block);
   ObjectOpened(machine::ObjectKind::kMemoryBlock);
   return handle;

@@ -27,10 +27,10 @@ constexpr UINT kClickMessage = 0x201;  // WM_LBUTTONDOWN
 
 std::unique_ptr<Dialog> openDialog;
 std::deque<MSG> queue;
-uintptr_t lastHandle = 0x10000;
+uintptr_t lastWindowHandle = 0x10000;
 
 HWND NewHandle() {
-  return reinterpret_cast<HWND>(lastHandle += 2);
+  return reinterpret_cast<HWND>(lastWindowHandle += 2);
 }
 
 std::optional<WindowKind> KindOfClass(const std::string& className) {

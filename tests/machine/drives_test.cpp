@@ -16,10 +16,6 @@ HANDLE Open(const char* name, DWORD access = GENERIC_READ, DWORD share = 0) {
   return CreateFileA(name, access, share, nullptr, OPEN_EXISTING, 0, nullptr);
 }
 
-HANDLE Create(const char* name) {
-  return CreateFileA(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
-}
-
 // Whether the open works; what it opened is closed again.
 bool Opens(HANDLE handle) {
   return handle != INVALID_HANDLE_VALUE && CloseHandle(handle);

@@ -11,10 +11,6 @@
 
 namespace {
 
-HANDLE Create(const char* name) {
-  return CreateFileA(name, GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
-}
-
 // The error, or "".
 std::string Start(const TemporaryFolder& folder, const char* file = "") {
   std::string error;

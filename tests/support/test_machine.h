@@ -11,6 +11,7 @@
 #include <string>
 
 #include "machine/machine.h"
+#include "platform/win32.h"
 
 // Of a file of the host; empty when there is none.
 inline std::string FileBytes(const std::filesystem::path& file) {
@@ -67,3 +68,7 @@ class TestMachine : public TemporaryFolder {
     ASSERT_TRUE(machine::Start(Host(""), image.empty() ? "" : Host(image), &error)) << error;
   }
 };
+
+inline HANDLE Create(const char* name) {
+  return CreateFileA(name, GENERIC_READ | GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, 0, nullptr);
+}

@@ -6,8 +6,6 @@
 #include "tests/tools/tool_bench.h"
 #include "tools/image/language_names.h"
 
-namespace {
-
 struct ImageVerifier : SampleBench {
   // What verify says is wrong.
   std::vector<std::string> WrongIn(const std::string& image) const {
@@ -21,8 +19,6 @@ struct ImageVerifier : SampleBench {
     return wrong;
   }
 };
-
-}  // namespace
 
 // Each row changes one thing: of the header, of the second record, of the rest.
 TEST_F(ImageVerifier, FindsEachChange) {

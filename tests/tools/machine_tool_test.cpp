@@ -3,13 +3,9 @@
 #include "tests/tools/tool_bench.h"
 #include "tools/machine/machine_command_line.h"
 
-namespace {
-
 struct MachineTool : ToolBench {
   MachineTool() { tool = machine_tool::RunMachineTool; }
 };
-
-}  // namespace
 
 TEST_F(MachineTool, MakesAMachineThatItShows) {
   ASSERT_EQ(Run("new @pc --platform 9x --language 0x040c").status, 0);

@@ -107,9 +107,9 @@ TEST_F(RunExplainer, TellsWhatIsNotTheSetupPrograms) {
   for (const char* code : {"5", "259", "740", "1223", "1602", "1618", "3010"}) {
     const std::string told = Run(std::string("explain ") + code).out;
     EXPECT_NE(told.find(", not the setup program's\nmeaning     "), std::string::npos) << told;
-    const auto json = nlohmann::json::parse(Run(std::string("explain --json ") + code).out);
-    EXPECT_EQ(json.at("outcomes").at(0).at("exitCode"), std::stoi(code));
-    EXPECT_EQ(json.at("outcomes").at(0).at("isForeign"), true);
+    const auto answer = nlohmann::json::parse(Run(std::string("explain --json ") + code).out);
+    EXPECT_EQ(answer.at("outcomes").at(0).at("exitCode"), std::stoi(code));
+    EXPECT_EQ(answer.at("outcomes").at(0).at("isForeign"), true);
   }
 }
 

@@ -13,6 +13,8 @@ constexpr char kInstalled[] = R"(REGEDIT4
 "Language"="DE"
 )";
 
+}  // namespace
+
 struct RunPlanner : SampleBench {
   RunPlanner() {
     fs::create_directories(Host("tmp"));
@@ -34,8 +36,6 @@ struct RunPlanner : SampleBench {
   }
   ~RunPlanner() override { unsetenv("TMPDIR"); }
 };
-
-}  // namespace
 
 TEST_F(RunPlanner, SaysWhatARunWouldDoAndLeavesTheMachineAlone) {
   struct Row {

@@ -3,15 +3,12 @@
 #include <algorithm>
 
 #include "tools/image/record_text.h"
+#include "tools/terminal/printable_text.h"
 
 namespace image {
 
 int LineOf(const toml::node& node) {
   return static_cast<int>(node.source().begin.line);
-}
-
-std::string Quoted(std::string_view key) {
-  return '"' + std::string(key) + '"';
 }
 
 void DescriptionValues::Fault(const toml::node& node, const std::string& what) const {
@@ -26,7 +23,7 @@ void DescriptionValues::NameUnknownKeys(const toml::table& table,
     for (const std::string_view name : known)
       keys += (keys.empty() ? "" : ", ") + std::string(name);
     faults_.Add(static_cast<int>(key.source().begin.line),
-                "unknown key " + Quoted(key.str()) + "; known here: " + keys);
+                "unknown key " + terminal::Quoted(key.str()) + "; known here: " + keys);
   }
 }
 
@@ -34,9 +31,9 @@ std::optional<DescribedText> DescriptionValues::ReadText(const toml::node& node,
                                                          std::string_view key) const {
   const auto* text = node.as_string();
   if (text == nullptr) {
-    Fault(node, Quoted(key) + " is to be a text in quotes");
+    Fault(node, terminal::Quoted(key) + " is to be a text in quotes");
   } else if (text->get().find('\0') != std::string::npos) {
-    Fault(node, Quoted(key) + " has a NUL in it");
+    Fault(node, terminal::Quoted(key) + " has a NUL in it");
   } else {
     return DescribedText{text->get(), LineOf(node)};
   }
@@ -47,8 +44,8 @@ std::optional<DescribedText> DescriptionValues::ToAnsi(const DescribedText& utf8
                                                        std::string_view key) const {
   DescribedText ansi{"", utf8.line};
   if (ConvertToAnsi(utf8.text, &ansi.text)) return ansi;
-  faults_.Add(utf8.line,
-              Quoted(key) + " " + Quoted(utf8.text) + " has a character outside of code page 1252");
+  faults_.Add(utf8.line, terminal::Quoted(key) + " " + terminal::Quoted(utf8.text) +
+                             " has a character outside of code page 1252");
   return std::nullopt;
 }
 

@@ -16,9 +16,6 @@ namespace image {
 
 int LineOf(const toml::node& node);
 
-// A key or value for a message.
-std::string Quoted(std::string_view utf8);
-
 class DescriptionValues {
  public:
   explicit DescriptionValues(FaultList* faults) : faults_(*faults) {}

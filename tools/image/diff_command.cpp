@@ -22,14 +22,8 @@ const char* VersionWord(int version) {
   return version > 0 ? "up" : version < 0 ? "down" : "equal";
 }
 
-std::string Quoted(const std::string& utf8) {
-  std::string quoted = "\"";
-  quoted += terminal::Printable(utf8);
-  return quoted += '"';
-}
-
 std::string DescribeValue(const Json& value) {
-  return value.is_string() ? Quoted(value.get<std::string>()) : value.dump();
+  return value.is_string() ? terminal::Quoted(value.get<std::string>()) : value.dump();
 }
 
 std::string DescribeFields(const std::vector<FieldChange>& fields) {
@@ -56,7 +50,7 @@ std::string DescribeRecord(const FileRecord& record) {
 }
 
 std::string DescribeOffer(const ImageDifference& difference) {
-  const std::string place = Quoted(difference.offeredFor);
+  const std::string place = terminal::Quoted(difference.offeredFor);
   switch (difference.offer) {
     case UpdateOffer::kYes:
       return "update      the dialog offers it, for " + place + '\n';
@@ -82,7 +76,8 @@ std::string DescribeDifference(const ImageDifference& difference) {
     text += "removed     " + DescribeRecord(*record);
   }
   for (const std::string& place : difference.leftBehind) {
-    text += "left        " + Quoted(place) + " stays after an update, and after a removal too\n";
+    text += "left        " + terminal::Quoted(place) +
+            " stays after an update, and after a removal too\n";
   }
   return text + DescribeOffer(difference);
 }

@@ -54,7 +54,7 @@ std::string LayOut(const std::vector<Row>& rows) {
   return text;
 }
 
-std::string Line(const std::string& label, const std::string& value) {
+std::string HeaderLine(const std::string& label, const std::string& value) {
   return label + std::string(20 - label.size(), ' ') + value + '\n';
 }
 
@@ -63,13 +63,14 @@ const char* KindOf(const PackageHeader& header) {
 }
 
 std::string DescribeHeader(const PackageHeader& header, uint64_t headerOffset) {
-  return Line("kind", KindOf(header)) + Line("records", std::to_string(header.recordCount)) +
-         Line("space needed", std::to_string(header.spaceNeeded)) +
-         Line("package length", std::to_string(header.packageLength)) +
-         Line("executable", std::to_string(header.dataOffset)) +
-         Line("header at", std::to_string(headerOffset)) +
-         Line("default directory", Shown(FieldText(header.defaultDirectory))) +
-         Line("default language", DescribeLanguage(header.defaultLanguage));
+  return HeaderLine("kind", KindOf(header)) +
+         HeaderLine("records", std::to_string(header.recordCount)) +
+         HeaderLine("space needed", std::to_string(header.spaceNeeded)) +
+         HeaderLine("package length", std::to_string(header.packageLength)) +
+         HeaderLine("executable", std::to_string(header.dataOffset)) +
+         HeaderLine("header at", std::to_string(headerOffset)) +
+         HeaderLine("default directory", Shown(FieldText(header.defaultDirectory))) +
+         HeaderLine("default language", DescribeLanguage(header.defaultLanguage));
 }
 
 Json RecordAsJson(const PackagedFile& file) {

@@ -10,6 +10,7 @@
 #include "tools/image/input_file.h"
 #include "tools/image/source_finder.h"
 #include "tools/image/toml_nesting.h"
+#include "tools/terminal/printable_text.h"
 
 namespace image {
 namespace {
@@ -97,7 +98,8 @@ class DescriptionReader {
       const toml::node* node = root.get(kind);
       if (node == nullptr) continue;
       if (!node->is_array_of_tables()) {
-        values_.Fault(*node, Quoted(kind) + " is to be written as tables: [[" + kind + "]]");
+        values_.Fault(*node,
+                      terminal::Quoted(kind) + " is to be written as tables: [[" + kind + "]]");
         continue;
       }
       for (const toml::node& table : *node->as_array())
@@ -136,7 +138,7 @@ class DescriptionReader {
     if (source->text.empty()) {
       values_.Fault(*node, "\"source\" is empty; name a file");
     } else if (source->text.find('\\') != std::string::npos) {
-      values_.Fault(*node, "\"source\" " + Quoted(source->text) +
+      values_.Fault(*node, "\"source\" " + terminal::Quoted(source->text) +
                                " has a backslash; write / between folders");
     } else {
       return source;
@@ -221,7 +223,8 @@ class DescriptionReader {
     std::vector<std::string> found;
     try {
       found = finder(description_.sourceFolder, source.text);
-      if (found.empty()) faults_.Add(source.line, "\"source\" " + Quoted(source.text) + " " + none);
+      if (found.empty())
+        faults_.Add(source.line, "\"source\" " + terminal::Quoted(source.text) + " " + none);
     } catch (const BadInput& fault) {
       faults_.Add(source.line, std::string("\"source\": ") + fault.what());
     }
@@ -234,7 +237,7 @@ class DescriptionReader {
     std::optional<DescribedText> subpath = values_.ToAnsi({folder, line}, "source");
     if (!subpath) return false;
     if (subpath->text.find_first_of(";\\") != std::string::npos) {
-      faults_.Add(line, "\"source\" has the folder " + Quoted(folder) +
+      faults_.Add(line, "\"source\" has the folder " + terminal::Quoted(folder) +
                             ", whose ; or \\ means something else in a destination");
       return false;
     }

@@ -35,10 +35,6 @@ struct LoggedRun {
   }
 };
 
-std::string Line(const std::string& label, const std::string& value) {
-  return label + std::string(12 - label.size(), ' ') + value + '\n';
-}
-
 std::string_view TrimEnd(std::string_view text) {
   const size_t last = text.find_last_not_of(" \r");
   return text.substr(0, last == std::string_view::npos ? 0 : last + 1);
@@ -130,8 +126,9 @@ std::string DescribeOutcome(const RunOutcome& outcome) {
   if (outcome.code < 0) numbers += " = " + std::to_string(static_cast<uint32_t>(outcome.code));
   numbers += " = " + Hexadecimal(outcome.code);
   if (*outcome.name != '\0') numbers += std::string(", ") + outcome.name;
-  return Line("exit code", numbers + (IsForeign(outcome) ? ", not the setup program's" : "")) +
-         Line("meaning", outcome.meaning) + Line("to do", outcome.remedy);
+  return ReportLine("exit code",
+                    numbers + (IsForeign(outcome) ? ", not the setup program's" : "")) +
+         ReportLine("meaning", outcome.meaning) + ReportLine("to do", outcome.remedy);
 }
 
 // The event that decides the end of a run without a fatal one, and the exit code of a silent run.
@@ -170,7 +167,7 @@ void ExplainEnd(const LoggedRun& run, RunExplanation* explanation) {
   }
 }
 
-std::string_view TextOf(std::span<const uint8_t> bytes) {
+std::string_view CharactersOf(std::span<const uint8_t> bytes) {
   return {reinterpret_cast<const char*>(bytes.data()), bytes.size()};
 }
 
@@ -186,7 +183,7 @@ RunExplanation ExplainExitCode(StatusCode code) {
 }
 
 RunExplanation ExplainLog(std::span<const uint8_t> bytes) {
-  const std::string_view text = TextOf(bytes);
+  const std::string_view text = CharactersOf(bytes);
   const std::string fault = FindLogFault(text);
   if (!fault.empty()) throw std::runtime_error(fault);
   const std::optional<LoggedRun> run = ReadLastRun(text);
@@ -201,15 +198,20 @@ RunExplanation ExplainLog(std::span<const uint8_t> bytes) {
   return explanation;
 }
 
+std::string ReportLine(const std::string& label, const std::string& value) {
+  return label + std::string(12 - label.size(), ' ') + value + '\n';
+}
+
 std::string Describe(const RunExplanation& explanation) {
   std::string text;
-  if (explanation.time) text += Line("run", terminal::Printable(*explanation.time));
+  if (explanation.time) text += ReportLine("run", terminal::Printable(*explanation.time));
   if (explanation.isCutShort) {
-    text += Line("log", "cut short: this is what it tells up to there");
+    text += ReportLine("log", "cut short: this is what it tells up to there");
   }
   if (explanation.event) {
-    text += Line("event", explanation.event->empty() ? "none that tells how the run ended"
-                                                     : terminal::Printable(*explanation.event));
+    text +=
+        ReportLine("event", explanation.event->empty() ? "none that tells how the run ended"
+                                                       : terminal::Printable(*explanation.event));
   }
   for (const RunOutcome& outcome : explanation.outcomes) text += DescribeOutcome(outcome);
   return text;
@@ -236,14 +238,14 @@ Json AsJson(const RunExplanation& explanation) {
 
 std::vector<std::string> ReadEventLines(std::span<const uint8_t> log) {
   std::vector<std::string> lines;
-  if (const std::optional<LoggedRun> run = ReadLastRun(TextOf(log))) {
+  if (const std::optional<LoggedRun> run = ReadLastRun(CharactersOf(log))) {
     for (const LoggedEvent& event : run->events) lines.push_back(event.line);
   }
   return lines;
 }
 
 std::string DecidingEvent(std::span<const uint8_t> log, StatusCode code) {
-  const std::optional<LoggedRun> run = ReadLastRun(TextOf(log));
+  const std::optional<LoggedRun> run = ReadLastRun(CharactersOf(log));
   if (!run) return {};
   for (const LoggedEvent& event : run->events) {
     if (event.isFatal) return event.line;

@@ -29,6 +29,9 @@ RunExplanation ExplainExitCode(StatusCode code);
 //   bytes  all of it
 RunExplanation ExplainLog(std::span<const uint8_t> bytes);
 
+// A line of a report for people: what it tells of, in 12 columns, and that.
+std::string ReportLine(const std::string& label, const std::string& value);
+
 // For people, one line for each thing.
 std::string Describe(const RunExplanation& explanation);
 Json AsJson(const RunExplanation& explanation);

@@ -45,7 +45,7 @@ bool Matches(std::string_view name, std::string_view pattern) {
   return pattern.find_first_not_of('*', in) == std::string_view::npos;
 }
 
-std::string Joined(const std::string& folder, const std::string& name) {
+std::string PathIn(const std::string& folder, const std::string& name) {
   return folder.empty() || folder.ends_with('/') ? folder + name : folder + '/' + name;
 }
 
@@ -100,14 +100,14 @@ class SourceFinder {
       const std::string name = TextOf(entry.path().filename());
       if (!Matches(name, part)) continue;
       const bool isFolder = IsFolder(entry);
-      if (isLast && !isFolder) Take(Joined(folder, name));
-      if (!isLast && isFolder) Descend(Joined(folder, name), pattern.substr(end + 1));
+      if (isLast && !isFolder) Take(PathIn(folder, name));
+      if (!isLast && isFolder) Descend(PathIn(folder, name), pattern.substr(end + 1));
     }
   }
 
   void TakeAllBelow(const std::string& folder) {
     for (const fs::directory_entry& entry : EntriesOf(folder)) {
-      const std::string path = Joined(folder, TextOf(entry.path().filename()));
+      const std::string path = PathIn(folder, TextOf(entry.path().filename()));
       if (IsFolder(entry)) {
         TakeAllBelow(path);
       } else {

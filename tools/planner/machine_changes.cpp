@@ -44,7 +44,7 @@ std::string HexOf(const std::vector<uint8_t>& bytes) {
   return digits;
 }
 
-std::string TextOf(const machine::RegistryValue& value) {
+std::string TextOfValue(const machine::RegistryValue& value) {
   std::string text(value.data.begin(), value.data.end());
   if (text.ends_with('\0')) text.pop_back();
   return machine::ToUtf8(text);
@@ -61,7 +61,7 @@ void AddKey(const machine::RegistryKey& key, const std::string& path,
                            .value = machine::ToUtf8(value.name),
                            .type = value.type,
                            .data = HexOf(value.data)};
-    if (value.type == REG_SZ) fact.text = TextOf(value);
+    if (value.type == REG_SZ) fact.text = TextOfValue(value);
     (*facts)[place + '\2' + ToUpper(value.name)] = fact;
   }
   for (const auto& subkey : key.subkeys) AddKey(*subkey, path + '\\' + subkey->name, facts);

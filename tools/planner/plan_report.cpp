@@ -13,21 +13,12 @@
 namespace image {
 namespace {
 
-constexpr int64_t kLongestPath = kPathSize - 1;
 constexpr char kPackageFile[] = "file of the package";
 
 constexpr const char* kChangeWords[] = {"added", "changed", "removed"};
 
 const char* WordOf(Change change) {
   return kChangeWords[static_cast<int>(change)];
-}
-
-std::string Quoted(const std::string& utf8) {
-  return '"' + terminal::Printable(utf8) + '"';
-}
-
-std::string Line(const std::string& label, const std::string& value) {
-  return label + std::string(12 - label.size(), ' ') + value + '\n';
 }
 
 // Under its heading, which stands behind an empty line; "" without lines.
@@ -46,26 +37,30 @@ std::string FreeText(const std::optional<uint64_t>& free) {
 }
 
 int64_t RoomBehind(const RunPlan& plan) {
-  return kLongestPath - static_cast<int64_t>(plan.longestLength);
+  return int64_t{kPathSize} - 1 - static_cast<int64_t>(plan.longestLength);
 }
 
 std::string ShowEnd(const RunPlan& plan) {
   const std::string event = plan.event.empty() ? "none that tells how the run ended" : plan.event;
-  if (!plan.exitCode) return Line("exit code", "none: a fault of the machine's stops the process");
-  return Line("event", terminal::Printable(event)) + Describe(ExplainExitCode(*plan.exitCode));
+  if (!plan.exitCode)
+    return ReportLine("exit code", "none: a fault of the machine's stops the process");
+  return ReportLine("event", terminal::Printable(event)) +
+         Describe(ExplainExitCode(*plan.exitCode));
 }
 
 std::string ShowSettings(const RunPlan& plan) {
-  std::string text = Line("machine", plan.machine.empty() ? "a fresh one" : Quoted(plan.machine));
-  text += Line("run", std::string(plan.isRemoval ? "removal" : "install") + " with " +
-                          Quoted(plan.arguments));
+  std::string text =
+      ReportLine("machine", plan.machine.empty() ? "a fresh one" : terminal::Quoted(plan.machine));
+  text += ReportLine("run", std::string(plan.isRemoval ? "removal" : "install") + " with " +
+                                terminal::Quoted(plan.arguments));
   if (!plan.directory.empty())
-    text += Line("directory", Quoted(plan.directory) + ", " + plan.directoryReason);
+    text += ReportLine("directory", terminal::Quoted(plan.directory) + ", " + plan.directoryReason);
   if (plan.language)
-    text += Line("language", DescribeLanguage(*plan.language) + ", " + plan.languageReason);
+    text += ReportLine("language", DescribeLanguage(*plan.language) + ", " + plan.languageReason);
   if (!plan.longestPath.empty()) {
-    text += Line("longest", std::to_string(plan.longestLength) + " characters, room for " +
-                                std::to_string(RoomBehind(plan)) + ": " + Quoted(plan.longestPath));
+    text += ReportLine("longest", std::to_string(plan.longestLength) + " characters, room for " +
+                                      std::to_string(RoomBehind(plan)) + ": " +
+                                      terminal::Quoted(plan.longestPath));
   }
   return text;
 }
@@ -88,7 +83,7 @@ std::string ShowPlaces(const RunPlan& plan) {
   std::string text = Entry("size", plan.isRemoval ? "deletes" : "replaces", "place");
   for (const PlannedPlace& place : plan.places) {
     text += Entry(std::to_string(place.size), ReplacedText(place),
-                  Quoted(place.path) + RemarkOn(place, plan.isRemoval));
+                  terminal::Quoted(place.path) + RemarkOn(place, plan.isRemoval));
   }
   return text;
 }
@@ -110,8 +105,9 @@ std::string ShowFiles(const RunPlan& plan, bool folders) {
     if (change.path.ends_with('\\') != folders || change.role == kPackageFile) continue;
     const std::string size =
         folders || change.change == Change::kRemoved ? "" : std::to_string(change.size);
-    text += Entry(size, WordOf(change.change),
-                  Quoted(change.path) + (change.role.empty() ? "" : ", the " + change.role));
+    text +=
+        Entry(size, WordOf(change.change),
+              terminal::Quoted(change.path) + (change.role.empty() ? "" : ", the " + change.role));
   }
   return text;
 }
@@ -121,14 +117,14 @@ std::string ShowRegistry(const RunPlan& plan) {
   for (const RegistryChange& change : plan.registry) {
     if (change.key != lastKey)
       text += "  " + std::string(change.value ? "" : std::string(WordOf(change.change)) + " ") +
-              Quoted(change.key) + '\n';
+              terminal::Quoted(change.key) + '\n';
     lastKey = change.key;
     if (!change.value) continue;
     const std::string data = change.type == REG_SZ
-                                 ? Quoted(change.text)
+                                 ? terminal::Quoted(change.text)
                                  : "type " + std::to_string(change.type) + ": " + change.data;
-    text += std::string("    ") + WordOf(change.change) + ' ' + Quoted(*change.value) + " = " +
-            data + '\n';
+    text += std::string("    ") + WordOf(change.change) + ' ' + terminal::Quoted(*change.value) +
+            " = " + data + '\n';
   }
   return text;
 }
@@ -173,8 +169,10 @@ Json ListAsJson(const List& list, const Convert& convert) {
 std::string ShowPlan(const RunPlan& plan) {
   std::string log, stays, deleted;
   for (const std::string& line : plan.log) log += "  " + terminal::Printable(line) + '\n';
-  for (const StayingPath& stay : plan.stays) stays += Entry("", stay.reason, Quoted(stay.path));
-  for (const std::string& path : plan.deletedAtNextStart) deleted += "  " + Quoted(path) + '\n';
+  for (const StayingPath& stay : plan.stays)
+    stays += Entry("", stay.reason, terminal::Quoted(stay.path));
+  for (const std::string& path : plan.deletedAtNextStart)
+    deleted += "  " + terminal::Quoted(path) + '\n';
   return ShowSettings(plan) + ShowEnd(plan) + Section("files of the package", ShowPlaces(plan)) +
          Section("drives, in bytes", ShowDrives(plan)) +
          Section("directories", ShowFiles(plan, true)) +

@@ -86,6 +86,10 @@ std::string Printable(std::string_view utf8) {
   return shown;
 }
 
+std::string Quoted(std::string_view utf8) {
+  return '"' + Printable(utf8) + '"';
+}
+
 std::string PrintableLines(std::string_view utf8) {
   std::string shown;
   for (;;) {

@@ -14,6 +14,9 @@ namespace terminal {
 // byte that is no UTF-8. A text that has been through it comes back as it is.
 std::string Printable(std::string_view utf8);
 
+// The same between quotes.
+std::string Quoted(std::string_view utf8);
+
 // The same for a text of several lines: its LFs stay.
 std::string PrintableLines(std::string_view utf8);
 

@@ -87,21 +87,21 @@ std::string DescribeLook(HWND box) {
   return icon + " " + buttons + " default " + standard;
 }
 
-void AnswerBox(const ProgramWindows& windows, ModalAnswers* script) {
+void AnswerBox(const ProgramWindows& windows, ModalAnswers* given) {
   const HWND box = windows.modal;
-  if (!script->pictures.empty()) WaitForPicture(TakeFirst(&script->pictures).rest);
+  if (!given->pictures.empty()) WaitForPicture(TakeFirst(&given->pictures).rest);
   const std::string shown = "box " + Quoted(TextOf(box)) + " " + Quoted(ReadStatic(box)) + " ";
   const auto tell = [&](const std::string& answer) {
     Print(shown + answer);
-    if (script->showsBoxes) Print("box-look " + DescribeLook(box));
+    if (given->showsBoxes) Print("box-look " + DescribeLook(box));
   };
   if (GetDlgItem(box, IDYES) == nullptr) {
     tell("ok");
     PressButton(box, GetDlgItem(box, IDOK) != nullptr ? IDOK : IDCANCEL);
     return;
   }
-  if (script->answers.empty()) Fail("no answer to " + shown);
-  const Line answer = TakeFirst(&script->answers);
+  if (given->answers.empty()) Fail("no answer to " + shown);
+  const Line answer = TakeFirst(&given->answers);
   if (answer.verb == "answer-late" && windows.dialog != nullptr) WaitForQuiet(windows.dialog);
   tell(answer.rest);
   PressButton(box, answer.rest == "yes" ? IDYES : IDNO);
@@ -119,12 +119,12 @@ bool ModalAnswers::Take(const Line& line) {
   return queue != nullptr;
 }
 
-void AnswerModal(const ProgramWindows& windows, ModalAnswers* script) {
+void AnswerModal(const ProgramWindows& windows, ModalAnswers* given) {
   bool isPicker = false;
   EnumChildWindows(windows.modal, FindTree, reinterpret_cast<LPARAM>(&isPicker));
   if (isPicker) {
-    AnswerPicker(windows.modal, &script->picks);
+    AnswerPicker(windows.modal, &given->picks);
   } else {
-    AnswerBox(windows, script);
+    AnswerBox(windows, given);
   }
 }

@@ -27,4 +27,4 @@ struct ModalAnswers {
 };
 
 // Answers the box or picker that stands, and waits until it is gone. No answer is a failure.
-void AnswerModal(const ProgramWindows& windows, ModalAnswers* script);
+void AnswerModal(const ProgramWindows& windows, ModalAnswers* given);
