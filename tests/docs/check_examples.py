@@ -2,7 +2,8 @@
 """Plays the examples of moriv-image in README.md and docs/image-tool.md: check_examples.py BUILD, the
 folder of the native build. Every "$" command there is run, and what stands below it must come out;
 numbers may be others, since they change with the compiler, and "..." stands for any lines. Every key of
-the tool's JSON is to stand on its page."""
+the tool's JSON is to stand on its page. The words below the pictures of docs/screenshots.md are those of
+the dialog."""
 
 import json
 import os
@@ -16,6 +17,15 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent.parent
 BUILD = Path(sys.argv[1]).resolve()
+# What a user does at each page of the dialog, and the image and options that show them.
+DIALOG_RUNS = [
+    ('build/demo/MorivSetup', '', 'at-poll 2 show/show/press 2/answer no/press 907/show/press 1'),
+    ('build/demo/MorivSetup', '', 'show/press 909/show/press 1'),
+    ('build/demo/MorivSetup', '', 'show/close/answer yes'),
+    ('build/demo/MorivSetup', '/u', 'show/press 908/show/press 1'),
+    ('./damaged-tail', '', 'show/press 906'),
+    ('build/demo/MorivSetup', '/h', ''),
+]
 BLOCK = re.compile(r'(?:^ {4}.*\n|^\n(?= {4}))+', re.MULTILINE)
 COMMAND = re.compile(r'^\$ ((?:build/native/)?moriv-image .*)$')
 
@@ -96,6 +106,35 @@ def check_keys():
         assert not unknown, f'{command}: {unknown}'
 
 
+def told_dialog(image, options, script):
+    """A user's run of the dialog in French, as make demo-dialog tells it."""
+    Path('user').write_text(script.replace('/', '\n') + '\n')
+    with open('shown', 'w') as shown:
+        subprocess.run([image, options + ' /FRA'], stdout=shown,
+                       env=os.environ | {'MORIV_MACHINE': 'dialog-pc', 'MORIV_USER': 'user'})
+    return subprocess.run([str(ROOT / 'tools/tell-dialog'), 'user', 'shown'], capture_output=True,
+                          text=True).stdout
+
+
+def check_dialog():
+    """But for sizes and the file that is copied, which are the package's."""
+    image = Path('build/demo/MorivSetup').read_bytes()
+    Path('damaged-tail').write_bytes(image[:-100])
+    Path('damaged-tail').chmod(0o755)
+    told = ''
+    for number, dialog_run in enumerate(DIALOG_RUNS):
+        told += told_dialog(*dialog_run)
+        if number == 1:
+            Path('dialog-pc/drive_c/Program Files/Moriv/zebnet.dll').unlink()
+
+    def words(text):
+        return re.sub(r'[\d,]+ M[bo]|\\\w+\.\w+', '', ' '.join(text.split()))
+    pages = blocks('docs/screenshots.md')
+    for page in pages:
+        assert words(page) in words(told), f'docs/screenshots.md:\n{page}\n{told}'
+    assert len(pages) == len(list((ROOT / 'docs/screenshots').glob('fra-*.png')))
+
+
 def main():
     count = 0
     with tempfile.TemporaryDirectory() as folder:
@@ -118,6 +157,7 @@ def main():
             if name == 'README.md':
                 prepare(Path('samples/reference.toml').read_text())
         check_keys()
+        check_dialog()
     print(f'{count} examples')
 
 
