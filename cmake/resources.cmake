@@ -6,7 +6,7 @@
 # A native program that has them without being the setup program sets MORIV_RESOURCE_SECTION to
 # another name, so that its file is not taken for one.
 set(MORIV_RESOURCE_SECTION .moriv_res)
-find_program(MORIV_WINDRES x86_64-w64-mingw32-windres REQUIRED)
+find_program(MORIV_WINDRES i686-w64-mingw32-windres REQUIRED)
 
 function(add_program_resources target source)
   get_filename_component(name ${source} NAME_WE)
@@ -29,7 +29,7 @@ function(add_program_resources target source)
     endif()
     add_custom_command(
       OUTPUT ${object}
-      COMMAND ${MORIV_WINDRES} -J res -O coff -F ${format} -i ${res} -o ${object}
+      COMMAND ${CMAKE_RC_COMPILER} -J res -O coff -F ${format} -i ${res} -o ${object}
       DEPENDS ${res}
       VERBATIM)
     target_sources(${target} PRIVATE ${object})
