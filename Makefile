@@ -3,7 +3,7 @@
 TOOLS := moriv-image moriv-machine
 BENCH_PRESETS := bench bench-win32 bench-win64
 
-.PHONY: all help demo demo-dialog tests-built test check bench fuzz mutate screenshots win32-emulated dist clean
+.PHONY: all help demo demo-dialog tests-built test check bench fuzz mutate screenshots win32-emulated dist try-dist clean
 
 all: ## the setup program for Windows (32 and 64 bits) and for Linux, and the tools
 	@tools/bootstrap build
@@ -53,6 +53,7 @@ fuzz: ## goes on from the corpus of the fuzz targets, or of one: make fuzz MINUT
 
 MUTATE := -n 300
 mutate: tests-built ## faults put into src/ one at a time: who notices; MUTATE='-n 50 src/engine' for its options
+	@tools/bootstrap check
 	@tools/mutate $(MUTATE)
 
 screenshots: all ## every page in five languages, from the real program under Wine, into docs/screenshots/
@@ -66,6 +67,9 @@ win32-emulated: tests-built ## the 32-bit program in scenarios, in an emulator w
 dist: all ## the release, build/dist/: programs without a package, tools, documents, SHA-256 sums
 	@tools/bootstrap dist
 	@tools/dist
+
+try-dist: dist ## uses the release as one who has nothing else: in a fresh Debian, and under Wine
+	@tools/try-dist
 
 clean: ## takes build/ away
 	rm -rf build
