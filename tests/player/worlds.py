@@ -38,6 +38,10 @@ class WorldError(Exception):
         self.status = status
 
 
+class NotOnThisHost(Exception):
+    """Why a machine can't be as a scenario asks for."""
+
+
 def make_world(name, native, work, wine=BUILD / 'wine'):
     """native: folder of the native build; work: folder for machines; wine: folder for Wine prefixes."""
     return StandIn(native, work) if name == 'stand-in' else {'wine64': Wine64, 'wow64': Wow64}[name](wine)
@@ -189,10 +193,14 @@ class Wine:
         display = ['xvfb-run', '-a', '-s', '-screen 0 1024x768x24']
         read_only = self.prefix / f'drive_{READ_ONLY_DRIVE.lower()}'
         read_only.mkdir(exist_ok=True)
+        # Root in a container can't mount, as a rule.
+        self.can_mount = subprocess.run([self.tool.with_name('read-only'), read_only, 'true'],
+                                        stderr=subprocess.DEVNULL).returncode == 0
+        environment = {'MORIV_WINE_READ_ONLY': str(read_only)} if self.can_mount else {}
         with open(f'{self.prefix}.agent-log', 'wb') as errors:
             self.agent = subprocess.Popen([*display, self.tool, 'run', self.prefix, agent],
                                           stdin=subprocess.PIPE, stdout=subprocess.PIPE, stderr=errors,
-                                          env=os.environ | {'MORIV_WINE_READ_ONLY': str(read_only)})
+                                          env=os.environ | environment)
         self.fresh_registry = Registry(terminates=True)
         for key in self.WATCHED[4:]:
             self.fresh_registry.make(key)
@@ -271,6 +279,8 @@ class WineMachine(Machine):
                 self.world.ask(f'value {kind} {name or "-"} {data.hex() or "-"}')
 
     def add_drive(self, letter):
+        if letter == READ_ONLY_DRIVE and not self.world.can_mount:
+            raise NotOnThisHost('this host lets nobody mount a read-only disk')
         drive = f'drive_{letter.lower()}'
         (self.world.prefix / drive).mkdir(exist_ok=True)
         link = self.world.prefix / 'dosdevices' / f'{letter.lower()}:'
