@@ -162,9 +162,13 @@ def main(native):
     for name in tools:
         (work / name).mkdir()
         (work / name / 'in').symlink_to('../in')
+    # While a program runs Wine's server stays, and what is started beside it starts at once.
+    waiting = subprocess.Popen([WINE, 'run', PREFIX, 'cmd', '/c', 'set /p wait='], stdin=subprocess.PIPE,
+                               stdout=subprocess.DEVNULL)
     try:
         return 1 if compare(tools, work) else 0
     finally:
+        waiting.communicate()
         subprocess.run([WINE, 'stop', PREFIX], check=True)
 
 
