@@ -162,9 +162,11 @@ def main(native):
     for name in tools:
         (work / name).mkdir()
         (work / name / 'in').symlink_to('../in')
-    # While a program runs Wine's server stays, and what is started beside it starts at once.
-    waiting = subprocess.Popen([WINE, 'run', PREFIX, 'cmd', '/c', 'set /p wait='], stdin=subprocess.PIPE,
-                               stdout=subprocess.DEVNULL)
+    # While a program runs Wine's server stays, and what is started beside it starts at once. A server of a
+    # command's own would keep the pipes of its output open.
+    waiting = subprocess.Popen([WINE, 'run', PREFIX, 'cmd', '/c', 'echo up & set /p wait='],
+                               stdin=subprocess.PIPE, stdout=subprocess.PIPE)
+    waiting.stdout.readline()
     try:
         return 1 if compare(tools, work) else 0
     finally:
