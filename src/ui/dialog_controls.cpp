@@ -15,9 +15,10 @@ bool Exists(int id) {
   return IsWindow(Control(id)) != FALSE;
 }
 
-void Post(UINT message, WPARAM wParam) {
+void Post(UINT message, WPARAM wParam, LPARAM lParam) {
   const HWND dialog = wizardState.window;
-  if (PostMessageA(dialog, message, wParam, 0) == FALSE) SendMessageA(dialog, message, wParam, 0);
+  if (PostMessageA(dialog, message, wParam, lParam) == FALSE)
+    SendMessageA(dialog, message, wParam, lParam);
 }
 
 void Show(int id) {

@@ -33,4 +33,4 @@ void RenewTexts(SetupContext* context);
 
 // Posts a message to the dialog. One that the system can't post is carried out at once: a chain of
 // steps that broke off could no longer be ended by anybody.
-void Post(UINT message, WPARAM wParam = 0);
+void Post(UINT message, WPARAM wParam = 0, LPARAM lParam = 0);

@@ -1,6 +1,7 @@
 #include "ui/held_command.h"
 
 #include "core/hooks.h"
+#include "ui/dialog_controls.h"
 
 namespace {
 
@@ -30,8 +31,7 @@ CommandHold::CommandHold() {
 CommandHold::~CommandHold() {
   held.isHolding = false;
   if (held.hasCommand && IsStillOffered()) {
-    PostMessageA(wizardState.window, WM_COMMAND, held.command,
-                 reinterpret_cast<LPARAM>(held.control));
+    Post(WM_COMMAND, held.command, reinterpret_cast<LPARAM>(held.control));
   }
 }
 

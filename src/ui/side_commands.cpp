@@ -64,8 +64,9 @@ void BrowseForDirectory(SetupContext* context) {
 void OpenWebAddress(SetupContext* context) {
   char command[kPathSize] = {};
   char address[kPathSize] = {};
-  if (ReadBrowserCommand(command, sizeof(command)) != 1 || command[0] == '\0') return;
+  if (ReadBrowserCommand(command, sizeof(command)) != 1) return;
   (void)RemoveCharacter(command, '"', '\0');
+  if (command[0] == '\0') return;
   BlankParameters(command);
   LoadCatalogText(context, CatalogOpenedAddress, address);
   if (AppendText(command, address)) StartCommand(command);
