@@ -60,7 +60,8 @@ int16_t TokenValue(const char* token) {
   return static_cast<int16_t>(value);
 }
 
-// As ParseVersionText, for a text that ends at its NUL or after `size` bytes.
+// As ParseVersionText, for a text that ends at its NUL or after `size` bytes; as much of it counts
+// as a path has room for.
 StatusCode ParseVersion(const char* text, size_t size, int16_t* fields) {
   for (int i = 0; i < 3; ++i) fields[i] = kVersionNotSet;
   if (size == 0 || *text == '\0') return StatusNoVersion;
@@ -68,7 +69,8 @@ StatusCode ParseVersion(const char* text, size_t size, int16_t* fields) {
   int16_t numbers[3] = {kVersionNotSet, kVersionNotSet, kVersionNotSet};
   char token[kTokenSize] = {};
   size_t length = 0;
-  for (const char* const end = text + size; text != end && *text != '\0'; ++text) {
+  const size_t counted = size < kPathSize - 1 ? size : kPathSize - 1;
+  for (const char* const end = text + counted; text != end && *text != '\0'; ++text) {
     if (strchr(kSeparators, *text) == nullptr) {
       if (length < kTokenSize - 1) token[length++] = *text;
       continue;

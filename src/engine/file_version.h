@@ -17,9 +17,9 @@ int32_t ReadOwnFileRecord(FileRecord* record);
 
 // Reads a text such as "4.1.7" or "4,1,7,0" into the three `fields`. Every point, comma, hyphen and
 // blank closes a number, even an empty one, which is 0; 0 also stands for one that the text lacks.
-// Of a number the first 15 characters count, and the low 16 bits of its value. Returns 1;
-// StatusNoVersion for an empty text, with kVersionNotSet in all three fields; StatusBadArgument for
-// a null argument, with the fields untouched.
+// Of the text the first 259 characters count, of a number the first 15 and the low 16 bits of its
+// value. Returns 1; StatusNoVersion for an empty text, with kVersionNotSet in all three fields;
+// StatusBadArgument for a null argument, with the fields untouched.
 StatusCode ParseVersionText(const char* text, int16_t* fields);
 
 // Compares names, byte by byte, then versions. The result tells where a differs:

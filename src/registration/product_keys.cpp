@@ -62,12 +62,15 @@ int32_t CreateService(const char* name) {
          applications.Create(service.get(), kApplicationsName);
 }
 
-// Deletes `folder`\`name` below an open key. One that an earlier deletion took is no refusal.
+// Deletes a key below an open one. One that an earlier deletion took is no refusal.
+bool DeleteIfThere(const RegistryKey& key, const char* name) {
+  const LSTATUS status = RegDeleteKeyA(key.get(), name);
+  return status == ERROR_SUCCESS || status == ERROR_FILE_NOT_FOUND;
+}
+
 bool DeleteBelow(const RegistryKey& key, const char* folder, const char* name) {
   ProductPath path;
-  if (!FormatText(path, sizeof(path), "%s\\%s", folder, name)) return false;
-  const LSTATUS status = RegDeleteKeyA(key.get(), path);
-  return status == ERROR_SUCCESS || status == ERROR_FILE_NOT_FOUND;
+  return FormatText(path, sizeof(path), "%s\\%s", folder, name) && DeleteIfThere(key, path);
 }
 
 int32_t DeleteRoot() {
@@ -78,7 +81,7 @@ int32_t DeleteRoot() {
   RegistryKey key;
   if (!key.Open(HKEY_LOCAL_MACHINE, kMakerKey, KEY_WRITE)) return 0;
   if (!DeleteBelow(key, kProductName, kServicesName)) return -1;
-  return RegDeleteKeyA(key.get(), kProductName) == ERROR_SUCCESS ? 1 : -1;
+  return DeleteIfThere(key, kProductName) ? 1 : -1;
 }
 
 // The results of deleting single entries aren't read: what stays makes the key's own deletion fail.
@@ -100,7 +103,7 @@ int32_t DeleteService(const char* service) {
       !DeleteBelow(key, service, kApplicationsName)) {
     return -1;
   }
-  return RegDeleteKeyA(key.get(), service) == ERROR_SUCCESS ? 1 : -1;
+  return DeleteIfThere(key, service) ? 1 : -1;
 }
 
 }  // namespace

@@ -82,7 +82,7 @@ int32_t ProductRootExists(const char* service);
 int32_t ProductCreateTree(const char* service);
 
 // Deletes the root, unless a service exists (-1), or one service with all below it. 0 when the
-// parent doesn't open, -1 when a deletion is refused; a key below that has gone already is no
+// parent doesn't open, -1 when a deletion is refused; a key that has gone already is no
 // refusal. SOFTWARE\Zeb itself stays.
 int32_t ProductDeleteTree(const char* service);
 

@@ -50,8 +50,9 @@ int WriteUninstallEntry(const SetupContext* context) {
   (void)CancelRunOnceCommand();
   char name[kCatalogTextSize] = {};
   char keyPath[kKeySize] = {};
+  char path[kRemovalProgramPathSize] = {};
   RegistryKey key;
-  if (!LoadEntryName(name) ||
+  if (!LoadEntryName(name) || !FindRemovalProgramPath(path) ||
       !FormatText(keyPath, sizeof(keyPath), "%s\\%s", kUninstallKey, name) ||
       !key.Create(HKEY_LOCAL_MACHINE, keyPath)) {
     return 0;
@@ -63,8 +64,7 @@ int WriteUninstallEntry(const SetupContext* context) {
 
   // The path alone, without quotes or switches: the removal program's own header tells it what to
   // do.
-  char path[kRemovalProgramPathSize] = {};
-  return FindRemovalProgramPath(path) && SetTerminatedText(key, "UninstallString", path);
+  return SetTerminatedText(key, "UninstallString", path);
 }
 
 int DeleteUninstallEntry() {

@@ -12,7 +12,7 @@ namespace {
 using Version = std::array<int16_t, 3>;
 
 TEST(VersionText, EverySeparatorClosesANumber) {
-  const std::pair<const char*, Version> rows[] = {
+  const std::pair<std::string, Version> rows[] = {
       {"4.1.7.0.3", {4, 1, 0}},
       {"4,1,7,2", {4, 1, 7}},
       {"3, 44, 6, 2", {3, 0, 0}},
@@ -23,10 +23,12 @@ TEST(VersionText, EverySeparatorClosesANumber) {
       {"\t4.+1.-7", {4, 1, 0}},
       {"65535.2.3", {2, 0, 3}},  // the first number stays open
       {"40000.1.7", {-25536, 1, 7}},
-      {"123456789012345678.1.2", {static_cast<int16_t>(123456789012345 & 0xFFFF), 1, 2}}};
+      {"123456789012345678.1.2", {static_cast<int16_t>(123456789012345 & 0xFFFF), 1, 2}},
+      {"1.2." + std::string(252, 'x') + ".3.9.", {1, 2, 3}}};  // 259 characters count
   for (const auto& [text, version] : rows) {
     Version fields = {};
-    EXPECT_EQ(ParseVersionText(text, fields.data()), *text != '\0' ? StatusOk : StatusNoVersion);
+    EXPECT_EQ(ParseVersionText(text.c_str(), fields.data()),
+              text.empty() ? StatusNoVersion : StatusOk);
     EXPECT_EQ(fields, version) << text;
   }
   Version fields = {};

@@ -173,9 +173,11 @@ TEST_F(ProductRegistry, AServiceComesAndGoesWithItsEntries) {
       (Results{ProductDeleteNetProfile("Sky", "b"), ProductDeleteNetProfile("Sky", "b"),
                ProductDeleteTree(nullptr), HasRegistryKey(kServices + "\\Sky\\NetProfiles\\a"),
                ProductDeleteTree("Sky"), HasRegistryKey(kServices + "\\Sky"),
-               ProductDeleteTree(nullptr), HasRegistryKey(kRoot), HasRegistryKey("SOFTWARE\\Zeb"),
+               ProductDeleteTree("Sky"), ProductDeleteTree(nullptr), HasRegistryKey(kRoot),
+               HasRegistryKey("SOFTWARE\\Zeb"),
+               ProductDeleteTree(nullptr),  // what has gone already is no refusal
                ProductCreateTree("Sky"), ProductDeleteTree("Sky")}),
-      (Results{1, 0, -1, 1, 1, 0, 1, 0, 1, 0, 0}));
+      (Results{1, 0, -1, 1, 1, 0, 1, 1, 0, 1, 1, 0, 0}));
 }
 
 TEST_F(ProductRegistry, LanguagesAreReadInEveryForm) {
