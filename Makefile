@@ -16,7 +16,7 @@ help: ## these lines
 	@sed -n 's/^\([a-z0-9-]*\):.*## \(.*\)/\1|\2/p' $(MAKEFILE_LIST) | \
 	  while IFS='|' read -r door words; do printf 'make %-16s %s\n' "$$door" "$$words"; done
 
-demo: ## an install and a removal of sample programs on a machine that is a folder; 2 minutes
+demo: ## an install and a removal of sample programs on a machine that is a folder; a minute
 	@tools/bootstrap demo
 	@tools/build win32 samples
 	@tools/build native MorivSetup $(TOOLS)
@@ -32,7 +32,7 @@ tests-built:
 	@tools/bootstrap test
 	@for preset in win32 win64 native; do tools/build --tests $$preset all || exit 1; done
 
-test: tests-built ## every test, natively and under Wine; 10 minutes the first time
+test: tests-built ## every test, natively and under Wine; five minutes the first time
 	@tools/test
 
 check: tests-built ## format, lint, sanitizers, imports, sizes, two builds compared
