@@ -20,9 +20,9 @@ it is compared with, as the median of the rounds' ratios. Ratios can be compared
 A figure that misses its floor fails `make bench`; one that misses only its goal is marked.
 
 Of a timed figure the page also tells between what the middle half of the rounds lies: about so far do two
-runs differ. A goal between the two is neither reached nor missed, but within the noise. Hosts of one kind differ
-by more than runs do: of three, expansion under Wine, libraries, was 3.58, 3.64 and 3.76 times as fast as the
-plain decoder, with the same two programs; against zlib, text, it was 1.99 to 2.11 times as fast.
+runs differ. A goal between the two is neither reached nor missed, but within the noise. Runs hours
+apart differ by more, and so do hosts of one kind: with the same programs, expansion under Wine, libraries, has been
+3.57 to 3.76 times as fast as the plain decoder, and on text 1.99 to 2.11 times as fast as zlib.
 """
 QUICK_NOTE = """
 This was a quick run: fewer rounds, smaller corpora.
