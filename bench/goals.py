@@ -61,7 +61,7 @@ GOALS = [
     _at_most('removal-wine-many', 'Silent removal of 1000 small files under Wine against NSIS', '',
              1.1, 1),
     _at_most('check-wine-many', 'Dialog under Wine that checks 1000 files, against their install',
-             '', 1, 0.85),
+             '', 1.3, 1),
     _at_most('dialog-start', 'Start of the dialog under Wine against an empty dialog', 'times',
              1.2, 1.1),
     _at_most('removal-start', 'Start of the removal program under Wine against an empty program',
