@@ -83,6 +83,10 @@ TEST_F(UninstallEntries, AreStoredWithTheirNulAndFitOrAreLeftOut) {
   EXPECT_EQ(CancelRunOnceCommand(), 1);
   EXPECT_EQ(DeleteUninstallEntry(), 1);
   EXPECT_EQ(DeleteUninstallEntry(), 0);
+
+  FailCall("LoadStringA", 2);  // the removal program's name
+  EXPECT_EQ(WriteUninstallEntry(&context), 0);
+  EXPECT_FALSE(HasRegistryKey(kCurrentVersion + "Uninstall\\Moriv"));
 }
 
 }  // namespace
